@@ -1,0 +1,183 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!DOCTYPE TS>
+<TS version="2.1" language="de_DE">
+<context>
+    <name></name>
+    <message id="Male">
+        <source>Male</source>
+        <translation>Männlich</translation>
+    </message>
+    <message id="Female">
+        <source>Female</source>
+        <translation>Weiblich</translation>
+    </message>
+    <message id="Novelty">
+        <source>Novelty</source>
+        <translation>Neuheit</translation>
+    </message>
+    <message id="Use System Voice">
+        <source>Use System Voice</source>
+        <translation>Systemstimme verwenden</translation>
+    </message>
+    <message id="CustomizeMenuItem">
+        <source>Customize…</source>
+        <translation>Anpassen …</translation>
+    </message>
+    <message id="AddLanguageMenuItem">
+        <source>Add Language…</source>
+        <translation>Sprache hinzufügen …</translation>
+    </message>
+    <message id="DownloadingItemFormat">
+        <source>%1 (Downloading)</source>
+        <translation>%1 (wird geladen)</translation>
+    </message>
+    <message id="DownloadPendingItemFormat">
+        <source>%1 (Waiting)</source>
+        <translation>%1 (wartet)</translation>
+    </message>
+    <message id="LanguageMismatchAlertTitleText">
+        <source>The selected voice does not speak your language.</source>
+        <translation>Die ausgewählte Stimme spricht nicht Ihre Sprache.</translation>
+    </message>
+    <message id="LanguageMismatchAlertTitleTextWithOptions">
+        <source>Use a voice that does not speak your language?</source>
+        <translation>Eine Stimme verwenden, die nicht Ihre Sprache spricht?</translation>
+    </message>
+    <message id="LanguageMismatchAlertMessageText">
+        <source>Text in your language may not be spoken correctly by this voice.</source>
+        <translation>Text in Ihrer Sprache wird von dieser Stimme eventuell nicht richtig gesprochen.</translation>
+    </message>
+    <message id="Use Voice">
+        <source>Use Voice</source>
+        <translation>Stimme verwenden</translation>
+    </message>
+    <message id="Cancel">
+        <source>Cancel</source>
+        <translation>Abbrechen</translation>
+    </message>
+    <message id="OK">
+        <source>OK</source>
+        <translation>OK</translation>
+    </message>
+    <message id="DownloadingStatusStringsWithEmDash">
+        <source>%1 — %2</source>
+        <translation>%1 – %2</translation>
+    </message>
+    <message id="DownloadingStatusStringInstallingItem">
+        <source>Installing %1</source>
+        <translation>%1 wird installiert</translation>
+    </message>
+    <message id="DownloadingStatusStringDownloadingItem">
+        <source>Downloading %1</source>
+        <translation>%1 wird geladen</translation>
+    </message>
+    <message id="DownloadingStatusStringPreparing">
+        <source>Preparing to download…</source>
+        <translation>Laden wird vorbereitet …</translation>
+    </message>
+    <message id="DownloadingStatusStringWaiting">
+        <source>Waiting to download…</source>
+        <translation>Warten auf Laden …</translation>
+    </message>
+    <message id="PlayButtonName">
+        <source>Play</source>
+        <translation>Wiedergeben</translation>
+    </message>
+    <message id="StopButtonName">
+        <source>Stop</source>
+        <translation>Stoppen</translation>
+    </message>
+    <message id="SelectedDownloadSizeFormat">
+        <source>Selected download size: %1</source>
+        <translation>Ausgewählte Downloadgröße: %1</translation>
+    </message>
+    <message id="DownloadStatusTextPendingItemFormat">
+        <source>Waiting</source>
+        <translation>Wartet</translation>
+    </message>
+    <message id="DownloadStatusTextInProgressFormat">
+        <source>Downloading</source>
+        <translation>Wird geladen</translation>
+    </message>
+    <message id="DownloadStatusTextInProgressWithPercentCompleteFormat">
+        <source>Downloading %1 %</source>
+        <translation>Wird geladen: %1 %</translation>
+    </message>
+    <message id="DownloadStatusTextRequiredItemFormat">
+        <source>Required</source>
+        <translation>Erforderlich</translation>
+    </message>
+    <message id="DownloadStatusTextOfflineDictationOnly">
+        <source>Offline dictation only</source>
+        <translation>Nur Offline-Diktat</translation>
+    </message>
+    <message id="DownloadStatusCheckboxTextUpradeItemFormat">
+        <source>Update (%1)</source>
+        <translation>Aktualisieren (%1)</translation>
+    </message>
+    <message id="DeleteDisabledVoiceAlertTitleText">
+        <source>Remove the voices you unchecked from this computer?</source>
+        <translation>Die abgewählten Stimmen von diesem Computer entfernen?</translation>
+    </message>
+    <message id="DeleteDisabledLanguageAlertTitleText">
+        <source>Remove the languages you unchecked from this computer?</source>
+        <translation>Die abgewählten Sprachen von diesem Computer entfernen?</translation>
+    </message>
+    <message id="DeleteDisabledItemAlertDeleteButtonText">
+        <source>Remove</source>
+        <translation>Entfernen</translation>
+    </message>
+    <message id="DeleteDisabledItemAlertKeepButtonText">
+        <source>Keep</source>
+        <translation>Behalten</translation>
+    </message>
+    <message id="LanguageWithCountryGroupFormat">
+        <source>%1 (%2)</source>
+        <translation>%1 (%2)</translation>
+    </message>
+    <message id="LanguageWithGenderGroupFormat">
+        <source>%1 — %2</source>
+        <translation>%1 – %2</translation>
+    </message>
+    <message id="ByteSize">
+        <source>%1 bytes</source>
+        <translation>%1 Byte</translation>
+    </message>
+    <message id="KBSize">
+        <source>%1 KB</source>
+        <translation>%1 KB</translation>
+    </message>
+    <message id="MBSize">
+        <source>%1 MB</source>
+        <translation>%1 MB</translation>
+    </message>
+    <message id="GBSize">
+        <source>%1 GB</source>
+        <translation>%1 GB</translation>
+    </message>
+    <message id="DownloadingProgressTimeRemainingLessThanAMinute">
+        <source>Less than a minute remaining</source>
+        <translation>Weniger als eine Minute verbleibend</translation>
+    </message>
+    <message id="DownloadingProgressTimeRemainingNMinutes">
+        <source>About %1 minutes remaining</source>
+        <translation>Noch etwa %1 Minuten</translation>
+    </message>
+    <message id="DownloadingProgressTimeRemainingAboutAnHour">
+        <source>About an hour remaining</source>
+        <translation>Noch etwa eine Stunde</translation>
+    </message>
+    <message id="DownloadingProgressTimeRemainingNHours">
+        <source>About %1 hours remaining</source>
+        <translation>Noch etwa %1 Stunden</translation>
+    </message>
+    <message id="EnhancedDictation">
+        <source>Enhanced Dictation</source>
+        <translation>Erweitertes Diktat</translation>
+    </message>
+    <message id="DisplayLanguageQualifiedTemplate">
+        <source>%1 (%2)</source>
+        <translation>%1 (%2)</translation>
+    </message>
+</context>
+</TS>

@@ -1,0 +1,183 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!DOCTYPE TS>
+<TS version="2.1" language="en_US">
+<context>
+    <name></name>
+    <message id="Male">
+        <source>Male</source>
+        <translation>Male</translation>
+    </message>
+    <message id="Female">
+        <source>Female</source>
+        <translation>Female</translation>
+    </message>
+    <message id="Novelty">
+        <source>Novelty</source>
+        <translation>Novelty</translation>
+    </message>
+    <message id="Use System Voice">
+        <source>Use System Voice</source>
+        <translation>Use System Voice</translation>
+    </message>
+    <message id="CustomizeMenuItem">
+        <source>Customize…</source>
+        <translation>Customize…</translation>
+    </message>
+    <message id="AddLanguageMenuItem">
+        <source>Add Language…</source>
+        <translation>Add Language…</translation>
+    </message>
+    <message id="DownloadingItemFormat">
+        <source>%1 (Downloading)</source>
+        <translation>%1 (Downloading)</translation>
+    </message>
+    <message id="DownloadPendingItemFormat">
+        <source>%1 (Waiting)</source>
+        <translation>%1 (Waiting)</translation>
+    </message>
+    <message id="LanguageMismatchAlertTitleText">
+        <source>The selected voice does not speak your language.</source>
+        <translation>The selected voice does not speak your language.</translation>
+    </message>
+    <message id="LanguageMismatchAlertTitleTextWithOptions">
+        <source>Use a voice that does not speak your language?</source>
+        <translation>Use a voice that does not speak your language?</translation>
+    </message>
+    <message id="LanguageMismatchAlertMessageText">
+        <source>Text in your language may not be spoken correctly by this voice.</source>
+        <translation>Text in your language may not be spoken correctly by this voice.</translation>
+    </message>
+    <message id="Use Voice">
+        <source>Use Voice</source>
+        <translation>Use Voice</translation>
+    </message>
+    <message id="Cancel">
+        <source>Cancel</source>
+        <translation>Cancel</translation>
+    </message>
+    <message id="OK">
+        <source>OK</source>
+        <translation>OK</translation>
+    </message>
+    <message id="DownloadingStatusStringsWithEmDash">
+        <source>%1 — %2</source>
+        <translation>%1 — %2</translation>
+    </message>
+    <message id="DownloadingStatusStringInstallingItem">
+        <source>Installing %1</source>
+        <translation>Installing %1</translation>
+    </message>
+    <message id="DownloadingStatusStringDownloadingItem">
+        <source>Downloading %1</source>
+        <translation>Downloading %1</translation>
+    </message>
+    <message id="DownloadingStatusStringPreparing">
+        <source>Preparing to download…</source>
+        <translation>Preparing to download…</translation>
+    </message>
+    <message id="DownloadingStatusStringWaiting">
+        <source>Waiting to download…</source>
+        <translation>Waiting to download…</translation>
+    </message>
+    <message id="PlayButtonName">
+        <source>Play</source>
+        <translation>Play</translation>
+    </message>
+    <message id="StopButtonName">
+        <source>Stop</source>
+        <translation>Stop</translation>
+    </message>
+    <message id="SelectedDownloadSizeFormat">
+        <source>Selected download size: %1</source>
+        <translation>Selected download size: %1</translation>
+    </message>
+    <message id="DownloadStatusTextPendingItemFormat">
+        <source>Waiting</source>
+        <translation>Waiting</translation>
+    </message>
+    <message id="DownloadStatusTextInProgressFormat">
+        <source>Downloading</source>
+        <translation>Downloading</translation>
+    </message>
+    <message id="DownloadStatusTextInProgressWithPercentCompleteFormat">
+        <source>Downloading %1 %</source>
+        <translation>Downloading %1 %</translation>
+    </message>
+    <message id="DownloadStatusTextRequiredItemFormat">
+        <source>Required</source>
+        <translation>Required</translation>
+    </message>
+    <message id="DownloadStatusTextOfflineDictationOnly">
+        <source>Offline dictation only</source>
+        <translation>Offline dictation only</translation>
+    </message>
+    <message id="DownloadStatusCheckboxTextUpradeItemFormat">
+        <source>Update (%1)</source>
+        <translation>Update (%1)</translation>
+    </message>
+    <message id="DeleteDisabledVoiceAlertTitleText">
+        <source>Remove the voices you unchecked from this computer?</source>
+        <translation>Remove the voices you unchecked from this computer?</translation>
+    </message>
+    <message id="DeleteDisabledLanguageAlertTitleText">
+        <source>Remove the languages you unchecked from this computer?</source>
+        <translation>Remove the languages you unchecked from this computer?</translation>
+    </message>
+    <message id="DeleteDisabledItemAlertDeleteButtonText">
+        <source>Remove</source>
+        <translation>Remove</translation>
+    </message>
+    <message id="DeleteDisabledItemAlertKeepButtonText">
+        <source>Keep</source>
+        <translation>Keep</translation>
+    </message>
+    <message id="LanguageWithCountryGroupFormat">
+        <source>%1 (%2)</source>
+        <translation>%1 (%2)</translation>
+    </message>
+    <message id="LanguageWithGenderGroupFormat">
+        <source>%1 — %2</source>
+        <translation>%1 — %2</translation>
+    </message>
+    <message id="ByteSize">
+        <source>%1 bytes</source>
+        <translation>%1 bytes</translation>
+    </message>
+    <message id="KBSize">
+        <source>%1 KB</source>
+        <translation>%1 KB</translation>
+    </message>
+    <message id="MBSize">
+        <source>%1 MB</source>
+        <translation>%1 MB</translation>
+    </message>
+    <message id="GBSize">
+        <source>%1 GB</source>
+        <translation>%1 GB</translation>
+    </message>
+    <message id="DownloadingProgressTimeRemainingLessThanAMinute">
+        <source>Less than a minute remaining</source>
+        <translation>Less than a minute remaining</translation>
+    </message>
+    <message id="DownloadingProgressTimeRemainingNMinutes">
+        <source>About %1 minutes remaining</source>
+        <translation>About %1 minutes remaining</translation>
+    </message>
+    <message id="DownloadingProgressTimeRemainingAboutAnHour">
+        <source>About an hour remaining</source>
+        <translation>About an hour remaining</translation>
+    </message>
+    <message id="DownloadingProgressTimeRemainingNHours">
+        <source>About %1 hours remaining</source>
+        <translation>About %1 hours remaining</translation>
+    </message>
+    <message id="EnhancedDictation">
+        <source>Enhanced Dictation</source>
+        <translation>Enhanced Dictation</translation>
+    </message>
+    <message id="DisplayLanguageQualifiedTemplate">
+        <source>%1 (%2)</source>
+        <translation>%1 (%2)</translation>
+    </message>
+</context>
+</TS>

@@ -1,0 +1,28 @@
+#ifndef CADENZA_PLATFORM_FAKEUSERLOCALESERVICE_H
+#define CADENZA_PLATFORM_FAKEUSERLOCALESERVICE_H
+
+#include "UserLocaleService.h"
+
+namespace Cadenza::Platform {
+
+/// Language and region settings that a test sets.
+class CADENZACORE_EXPORT FakeUserLocaleService final : public UserLocaleService
+{
+public:
+    explicit FakeUserLocaleService(QStringList preferredLanguages = {QStringLiteral("en_US")},
+        QString currentLocale = QStringLiteral("en_US"));
+
+    QStringList preferredLanguages() override { return m_preferredLanguages; }
+    QString currentLocaleIdentifier() override { return m_currentLocale; }
+
+    void setPreferredLanguages(const QStringList &languages) { m_preferredLanguages = languages; }
+    void setCurrentLocaleIdentifier(const QString &identifier) { m_currentLocale = identifier; }
+
+private:
+    QStringList m_preferredLanguages;
+    QString m_currentLocale;
+};
+
+} // namespace Cadenza::Platform
+
+#endif

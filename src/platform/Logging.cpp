@@ -1,0 +1,11 @@
+#include "Logging.h"
+
+namespace Cadenza::Platform {
+
+Q_LOGGING_CATEGORY(lcPreferences, "cadenza.preferences", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcVoices, "cadenza.voices", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcSpeech, "cadenza.speech", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcLocale, "cadenza.locale", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcLocalization, "cadenza.localization", QtInfoMsg)
+
+} // namespace Cadenza::Platform

@@ -1,0 +1,78 @@
+#include "Services.h"
+
+#include "BundleSpeechSynthesisService.h"
+#include "EnvironmentUserLocaleService.h"
+#include "FilePreferencesStore.h"
+
+#include <QMutex>
+
+namespace Cadenza::Platform {
+
+namespace {
+
+struct Registry {
+    QMutex mutex;
+    std::shared_ptr<PreferencesStore> preferences;
+    std::shared_ptr<SpeechSynthesisService> speechSynthesis;
+    std::shared_ptr<UserLocaleService> userLocale;
+};
+
+Registry &registry()
+{
+    static Registry instance; // lives until exit, like every process-wide service
+    return instance;
+}
+
+template<typename Service, typename Linux>
+Service &serviceOf(std::shared_ptr<Service> Registry::*member)
+{
+    Registry &r = registry();
+    QMutexLocker locker(&r.mutex);
+    auto &slot = r.*member;
+    if (!slot) {
+        slot = std::make_shared<Linux>();
+    }
+    return *slot;
+}
+
+template<typename Service>
+void replace(std::shared_ptr<Service> Registry::*member, std::shared_ptr<Service> service)
+{
+    Registry &r = registry();
+    QMutexLocker locker(&r.mutex);
+    r.*member = std::move(service);
+}
+
+} // namespace
+
+PreferencesStore &Services::preferences()
+{
+    return serviceOf<PreferencesStore, FilePreferencesStore>(&Registry::preferences);
+}
+
+SpeechSynthesisService &Services::speechSynthesis()
+{
+    return serviceOf<SpeechSynthesisService, BundleSpeechSynthesisService>(&Registry::speechSynthesis);
+}
+
+UserLocaleService &Services::userLocale()
+{
+    return serviceOf<UserLocaleService, EnvironmentUserLocaleService>(&Registry::userLocale);
+}
+
+void Services::setPreferences(std::shared_ptr<PreferencesStore> store)
+{
+    replace(&Registry::preferences, std::move(store));
+}
+
+void Services::setSpeechSynthesis(std::shared_ptr<SpeechSynthesisService> service)
+{
+    replace(&Registry::speechSynthesis, std::move(service));
+}
+
+void Services::setUserLocale(std::shared_ptr<UserLocaleService> service)
+{
+    replace(&Registry::userLocale, std::move(service));
+}
+
+} // namespace Cadenza::Platform

@@ -1,0 +1,33 @@
+#ifndef CADENZA_PLATFORM_SERVICES_H
+#define CADENZA_PLATFORM_SERVICES_H
+
+#include "cadenzacore_export.h"
+
+#include <memory>
+
+namespace Cadenza::Platform {
+
+class PreferencesStore;
+class SpeechSynthesisService;
+class UserLocaleService;
+
+/**
+ * The process's platform services. Each is the Linux implementation, made on first use, unless a
+ * test installed another one with a set…() call before.
+ */
+class CADENZACORE_EXPORT Services
+{
+public:
+    static PreferencesStore &preferences();
+    static SpeechSynthesisService &speechSynthesis();
+    static UserLocaleService &userLocale();
+
+    /// Replaces a service; passing nullptr returns to the Linux implementation.
+    static void setPreferences(std::shared_ptr<PreferencesStore> store);
+    static void setSpeechSynthesis(std::shared_ptr<SpeechSynthesisService> service);
+    static void setUserLocale(std::shared_ptr<UserLocaleService> service);
+};
+
+} // namespace Cadenza::Platform
+
+#endif

@@ -1,0 +1,189 @@
+#include "SpeechSynthesisService.h"
+
+#include "Locale.h"
+#include "PreferencesStore.h"
+#include "Services.h"
+#include "UserLocaleService.h"
+
+#include <QHash>
+
+namespace Cadenza::Platform {
+
+const QString SpeechSynthesisService::DefaultVoiceGroup = QStringLiteral("VoiceGroupDefault");
+const QString SpeechSynthesisService::CompactVoiceGroup = QStringLiteral("VoiceGroupCompact");
+const QString SpeechSynthesisService::FallbackVoiceIdentifier
+    = QStringLiteral("com.vendra.speech.synthesis.voice.Orin");
+const QString SpeechSynthesisService::PreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
+const QString SpeechSynthesisService::SpeechLanguageKey = QStringLiteral("SpeechLanguageLocale");
+
+namespace {
+
+int qualityRank(const QString &identifier)
+{
+    switch (VoiceDescription::qualityOf(identifier)) {
+    case VoiceQuality::Premium:
+        return 2;
+    case VoiceQuality::Default:
+        return 1;
+    case VoiceQuality::Compact:
+        return 0;
+    }
+    return 0;
+}
+
+std::optional<qint32> storedInteger(const QVariant &v)
+{
+    switch (v.typeId()) {
+    case QMetaType::LongLong:
+    case QMetaType::Int:
+    case QMetaType::ULongLong:
+    case QMetaType::Double:
+        return qint32(v.toLongLong());
+    default:
+        return std::nullopt;
+    }
+}
+
+} // namespace
+
+SpeechSynthesisService::SpeechSynthesisService(QObject *parent)
+    : QObject(parent)
+{
+}
+
+SpeechSynthesisService::~SpeechSynthesisService() = default;
+
+QStringList SpeechSynthesisService::voiceIdentifiersInGroups(const QStringList &groups)
+{
+    QStringList result;
+    const auto voices = installedVoices();
+    for (const auto &voice : voices) {
+        for (const QString &group : voice.groups) {
+            if (groups.contains(group)) {
+                result.append(voice.identifier);
+                break;
+            }
+        }
+    }
+    return result;
+}
+
+QStringList SpeechSynthesisService::availableVoices()
+{
+    QStringList result;
+    QHash<QString, qsizetype> positionOfBase;
+    const auto voices = installedVoices();
+    for (const auto &voice : voices) {
+        const QString base = VoiceDescription::baseIdentifierOf(voice.identifier);
+        const auto it = positionOfBase.constFind(base);
+        if (it == positionOfBase.cend()) {
+            positionOfBase.insert(base, result.size());
+            result.append(voice.identifier);
+        } else if (qualityRank(voice.identifier) > qualityRank(result.at(*it))) {
+            result[*it] = voice.identifier;
+        }
+    }
+    return result;
+}
+
+QString SpeechSynthesisService::defaultVoice()
+{
+    const QStringList available = availableVoices();
+    PreferencesStore &preferences = Services::preferences();
+    (void)preferences.synchronize(PreferencesDomain);
+    const auto creator = storedInteger(preferences.value(QStringLiteral("SelectedVoiceCreator"), PreferencesDomain));
+    if (creator) {
+        const auto id = storedInteger(preferences.value(QStringLiteral("SelectedVoiceID"), PreferencesDomain));
+        const QString selected = voiceIdentifierForSpec(*creator, id.value_or(0));
+        if (!selected.isEmpty()) {
+            const QString base = VoiceDescription::baseIdentifierOf(selected);
+            for (const QString &candidate : available) {
+                if (VoiceDescription::baseIdentifierOf(candidate) == base) {
+                    return candidate;
+                }
+            }
+        }
+    }
+    return preferredVoiceForLocale(available, speechLanguageLocale().value_or(QString()));
+}
+
+QVariantMap SpeechSynthesisService::attributesForVoice(const QString &identifier)
+{
+    const auto found = voice(identifier);
+    return found ? found->attributes : QVariantMap();
+}
+
+std::optional<VoiceDescription> SpeechSynthesisService::voice(const QString &identifier)
+{
+    const auto voices = installedVoices();
+    for (const auto &voice : voices) {
+        if (voice.identifier == identifier) {
+            return voice;
+        }
+    }
+    return std::nullopt;
+}
+
+QString SpeechSynthesisService::voiceIdentifierForSpec(qint32 creator, qint32 id)
+{
+    const auto voices = installedVoices();
+    for (const auto &voice : voices) {
+        if (voice.spec && voice.spec->first == creator && voice.spec->second == id) {
+            return voice.identifier;
+        }
+    }
+    return {};
+}
+
+QString SpeechSynthesisService::preferredVoiceForLocale(const QStringList &identifiers, const QString &localeIdentifier)
+{
+    if (identifiers.isEmpty()) {
+        return {};
+    }
+    QString wanted = localeIdentifier;
+    if (wanted.isEmpty()) {
+        const QStringList languages = Services::userLocale().preferredLanguages();
+        wanted = languages.isEmpty() ? QStringLiteral("en_US") : languages.first();
+    }
+    const LocaleComponents target = Locale::componentsFromLocaleIdentifier(wanted);
+
+    QHash<QString, VoiceDescription> byIdentifier;
+    for (auto &voice : installedVoices()) {
+        byIdentifier.insert(voice.identifier, voice);
+    }
+
+    QString best;
+    std::tuple<int, qint64, int> bestScore {0, 0, 0};
+    for (const QString &identifier : identifiers) {
+        const auto it = byIdentifier.constFind(identifier);
+        if (it == byIdentifier.cend()) {
+            continue;
+        }
+        QString voiceLocale = it->attributes.value(VoiceAttribute::LocaleIdentifier).toString();
+        if (voiceLocale.isEmpty()) {
+            voiceLocale = it->attributes.value(VoiceAttribute::Language).toString();
+        }
+        const LocaleComponents components = Locale::componentsFromLocaleIdentifier(voiceLocale);
+        if (components.languageCode.isEmpty()
+            || components.languageCode.compare(target.languageCode, Qt::CaseInsensitive) != 0) {
+            continue;
+        }
+        const int localeScore
+            = components.countryCode.compare(target.countryCode, Qt::CaseInsensitive) == 0 ? 2 : 1;
+        const std::tuple<int, qint64, int> score {localeScore,
+            it->attributes.value(VoiceAttribute::RelativeDesirability).toLongLong(), qualityRank(identifier)};
+        if (best.isEmpty() || score > bestScore) {
+            best = identifier;
+            bestScore = score;
+        }
+    }
+    if (!best.isEmpty()) {
+        return best;
+    }
+    if (identifiers.contains(FallbackVoiceIdentifier)) {
+        return FallbackVoiceIdentifier;
+    }
+    return identifiers.first();
+}
+
+} // namespace Cadenza::Platform

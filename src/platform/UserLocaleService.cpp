@@ -1,0 +1,7 @@
+#include "UserLocaleService.h"
+
+namespace Cadenza::Platform {
+
+UserLocaleService::~UserLocaleService() = default;
+
+} // namespace Cadenza::Platform

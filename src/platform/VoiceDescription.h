@@ -1,0 +1,69 @@
+#ifndef CADENZA_PLATFORM_VOICEDESCRIPTION_H
+#define CADENZA_PLATFORM_VOICEDESCRIPTION_H
+
+#include "cadenzacore_export.h"
+
+#include <QString>
+#include <QStringList>
+#include <QVariantMap>
+
+#include <optional>
+
+namespace Cadenza::Platform {
+
+/// Attribute keys of a voice, as found in the "VoiceAttributes" dictionary of a voice bundle.
+namespace VoiceAttribute {
+inline const QString Identifier = QStringLiteral("VoiceIdentifier");
+inline const QString Name = QStringLiteral("VoiceName");
+inline const QString LocaleIdentifier = QStringLiteral("VoiceLocaleIdentifier");
+inline const QString Language = QStringLiteral("VoiceLanguage");
+inline const QString Gender = QStringLiteral("VoiceGender");
+inline const QString Age = QStringLiteral("VoiceAge");
+inline const QString DemoText = QStringLiteral("VoiceDemoText");
+inline const QString NameRoot = QStringLiteral("VoiceNameRoot");
+inline const QString RelativeDesirability = QStringLiteral("VoiceRelativeDesirability");
+inline const QString ShowInFullListOnly = QStringLiteral("VoiceShowInFullListOnly");
+inline const QString Creator = QStringLiteral("VoiceCreator");
+inline const QString VoiceID = QStringLiteral("VoiceID");
+inline const QString Groups = QStringLiteral("VoiceGroups");
+} // namespace VoiceAttribute
+
+/// The gender values of VoiceAttribute::Gender.
+namespace VoiceGender {
+inline const QString Male = QStringLiteral("VoiceGenderMale");
+inline const QString Female = QStringLiteral("VoiceGenderFemale");
+inline const QString Neuter = QStringLiteral("VoiceGenderNeuter");
+} // namespace VoiceGender
+
+/// The quality of a voice, told by the end of its identifier.
+enum class VoiceQuality { Compact, Default, Premium };
+
+/// One installed voice: its attributes and what the speech engine needs to speak with it.
+struct CADENZACORE_EXPORT VoiceDescription {
+    QString identifier;
+    QString version;
+    QString bundlePath; ///< empty for voices that have no bundle (test voices)
+    QVariantMap attributes; ///< always holds VoiceAttribute::Identifier
+    QStringList groups;
+    std::optional<std::pair<qint32, qint32>> spec; ///< (creator, id)
+    QString engineVoice; ///< espeak-ng voice name, such as "en-us"
+    QString engineVariant; ///< espeak-ng variant, such as "f2"; may be empty
+    int enginePitch = 50; ///< espeak-ng base pitch, 0..100
+    int engineRate = 175; ///< words per minute at normal speed
+
+    [[nodiscard]] static VoiceQuality qualityOf(const QString &identifier);
+    /// The identifier without ".premium" or ".compact".
+    [[nodiscard]] static QString baseIdentifierOf(const QString &identifier);
+    /// The groups a voice belongs to when its bundle does not say: compact voices to the compact group.
+    [[nodiscard]] static QStringList defaultGroupsOf(const QString &identifier);
+
+    /**
+     * Builds a description from an Info.plist dictionary. Returns nothing, with @p error set, when the
+     * dictionary lacks an identifier or a name; values of the wrong type are treated as absent.
+     */
+    [[nodiscard]] static std::optional<VoiceDescription> fromInfo(const QVariantMap &info, QString *error);
+};
+
+} // namespace Cadenza::Platform
+
+#endif

@@ -1,0 +1,38 @@
+#ifndef CADENZA_PLATFORM_WAVEFILE_H
+#define CADENZA_PLATFORM_WAVEFILE_H
+
+#include "cadenzacore_export.h"
+
+#include <QString>
+
+#include <optional>
+#include <vector>
+
+namespace Cadenza::Platform {
+
+/// Mono 16-bit PCM audio.
+struct CADENZACORE_EXPORT PcmAudio {
+    std::vector<qint16> samples;
+    int sampleRate = 22050;
+
+    [[nodiscard]] double durationSeconds() const
+    {
+        return sampleRate > 0 ? double(samples.size()) / sampleRate : 0.0;
+    }
+    /// Root mean square of the samples, 0 for silence, up to 32767.
+    [[nodiscard]] double rootMeanSquare() const;
+};
+
+/// WAV files through libsndfile.
+class CADENZACORE_EXPORT WaveFile
+{
+public:
+    /// Writes @p audio as a 16-bit PCM WAV file, replacing @p path only when the whole file was written.
+    [[nodiscard]] static bool write(const QString &path, const PcmAudio &audio, QString *error);
+    /// Reads a WAV file, mixing channels down to mono.
+    [[nodiscard]] static std::optional<PcmAudio> read(const QString &path, QString *error);
+};
+
+} // namespace Cadenza::Platform
+
+#endif

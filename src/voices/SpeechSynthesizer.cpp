@@ -1,0 +1,90 @@
+#include "SpeechSynthesizer.h"
+
+#include "platform/PreferencesStore.h"
+#include "platform/Services.h"
+#include "platform/SpeechSynthesisService.h"
+
+namespace Cadenza {
+
+using Platform::Services;
+using Platform::SpeechSynthesisService;
+
+namespace {
+const QString VoicePreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
+
+bool isStoredNumber(const QVariant &v)
+{
+    switch (v.typeId()) {
+    case QMetaType::LongLong:
+    case QMetaType::Int:
+    case QMetaType::ULongLong:
+    case QMetaType::Double:
+    case QMetaType::Bool:
+        return true;
+    default:
+        return false;
+    }
+}
+} // namespace
+
+QStringList SpeechSynthesizer::allVoices()
+{
+    return Services::speechSynthesis().voiceIdentifiersInGroups(
+        {SpeechSynthesisService::DefaultVoiceGroup, SpeechSynthesisService::CompactVoiceGroup});
+}
+
+QStringList SpeechSynthesizer::avaliableMainstreamVoices()
+{
+    return Services::speechSynthesis().availableVoices();
+}
+
+QString SpeechSynthesizer::defaultVoiceFromAllVoices()
+{
+    Platform::PreferencesStore &preferences = Services::preferences();
+    (void)preferences.synchronize(VoicePreferencesDomain);
+    const QVariant creator = preferences.value(QStringLiteral("SelectedVoiceCreator"), VoicePreferencesDomain);
+    SpeechSynthesisService &service = Services::speechSynthesis();
+    if (isStoredNumber(creator)) {
+        const QVariant id = preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain);
+        const qint32 idValue = isStoredNumber(id) ? qint32(id.toLongLong()) : 0;
+        const QString identifier = service.voiceIdentifierForSpec(qint32(creator.toLongLong()), idValue);
+        if (!identifier.isEmpty()) {
+            return identifier;
+        }
+    }
+    return service.preferredVoiceForLocale(allVoices(), service.speechLanguageLocale().value_or(QString()));
+}
+
+QString SpeechSynthesizer::defaultVoiceFromMainstreamVoices()
+{
+    return Services::speechSynthesis().defaultVoice();
+}
+
+QString SpeechSynthesizer::resolveVoiceIdentifier(const QString &identifier, const QStringList &usingVoices)
+{
+    if (identifier.isNull()) {
+        return {};
+    }
+    // Short identifiers are too likely to be the start of unrelated voices to match by prefix.
+    const bool prefixMatching = identifier.size() >= 36;
+    QString firstPrefixMatch;
+    QString secondPrefixMatch;
+    for (const QString &voice : usingVoices) {
+        if (voice == identifier) {
+            return voice;
+        }
+        if (prefixMatching && voice.startsWith(identifier)) {
+            if (firstPrefixMatch.isNull()) {
+                firstPrefixMatch = voice;
+            } else if (secondPrefixMatch.isNull()) {
+                secondPrefixMatch = voice;
+            }
+        }
+    }
+    if (!secondPrefixMatch.isNull() && secondPrefixMatch.endsWith(QLatin1String("premium"))) {
+        return secondPrefixMatch;
+    }
+    return firstPrefixMatch;
+}
+
+} // namespace Cadenza
