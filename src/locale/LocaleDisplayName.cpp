@@ -31,7 +31,8 @@ std::atomic<bool> handleCacheEnabled {true};
 // Read once and kept for the life of the process; meant for the main thread.
 QString qualifiedTemplate;
 
-struct HandleCache {
+struct HandleCache
+{
     QHash<QString, ULocaleDisplayNames *> handles;
     ~HandleCache()
     {
@@ -41,8 +42,8 @@ struct HandleCache {
     }
 };
 
-ULocaleDisplayNames *openHandle(const QString &localeIdentifier, UDisplayContext dialect,
-    UDisplayContext capitalization)
+ULocaleDisplayNames *openHandle(
+    const QString &localeIdentifier, UDisplayContext dialect, UDisplayContext capitalization)
 {
     UDisplayContext contexts[] = {dialect, capitalization};
     UErrorCode status = U_ZERO_ERROR;
@@ -58,8 +59,8 @@ ULocaleDisplayNames *openHandle(const QString &localeIdentifier, UDisplayContext
 }
 
 // With the cache on, a handle stays open for the thread's life; the caller must not close it.
-ULocaleDisplayNames *handleFor(const QString &localeIdentifier, UDisplayContext dialect,
-    UDisplayContext capitalization, bool *owned)
+ULocaleDisplayNames *handleFor(
+    const QString &localeIdentifier, UDisplayContext dialect, UDisplayContext capitalization, bool *owned)
 {
     if (!handleCacheEnabled.load(std::memory_order_relaxed)) {
         *owned = true;
@@ -82,7 +83,8 @@ ULocaleDisplayNames *handleFor(const QString &localeIdentifier, UDisplayContext 
 const QString &qualifiedNameTemplate()
 {
     if (qualifiedTemplate.isNull()) {
-        const QString fromTable = Platform::LocalizationTable::shared().text(QStringLiteral("DisplayLanguageQualifiedTemplate"));
+        const QString fromTable
+            = Platform::LocalizationTable::shared().text(QStringLiteral("DisplayLanguageQualifiedTemplate"));
         qualifiedTemplate = fromTable.isEmpty() ? QStringLiteral("%@ (%@)") : fromTable;
     }
     return qualifiedTemplate;
@@ -130,9 +132,9 @@ QString _icuDisplayName(ULocaleDisplayNames *displayNames, const QString &key, c
     }
     const QByteArray utf8 = value.toUtf8();
     auto ask = [&](UChar *buffer, int32_t capacity, UErrorCode *status) {
-        return collation ? uldn_keyValueDisplayName(displayNames, "collation", utf8.constData(), buffer, capacity,
-                               status)
-                         : call(displayNames, utf8.constData(), buffer, capacity, status);
+        return collation
+            ? uldn_keyValueDisplayName(displayNames, "collation", utf8.constData(), buffer, capacity, status)
+            : call(displayNames, utf8.constData(), buffer, capacity, status);
     };
     // Pre-flight for the length; anything but an overflow means there is no name (or an error).
     UErrorCode status = U_ZERO_ERROR;
@@ -149,7 +151,8 @@ QString _icuDisplayName(ULocaleDisplayNames *displayNames, const QString &key, c
     return QString(reinterpret_cast<const QChar *>(buffer.data()), written);
 }
 
-QString displayNameForKey(const Locale &displayLocale, const QVariant &key, const QString &value, quint64 options)
+QString displayNameForKey(
+    const Locale &displayLocale, const QVariant &key, const QString &value, quint64 options)
 {
     static const QString operationName = QStringLiteral("displayNameForKey:value:options:");
     if (key.typeId() != QMetaType::QString) {
@@ -162,8 +165,9 @@ QString displayNameForKey(const Locale &displayLocale, const QVariant &key, cons
     }
     const QString &qualified = qualifiedNameTemplate();
 
-    const UDisplayContext dialect
-        = (options & LocaleDisplayNameOptions::DialectNames) ? UDISPCTX_DIALECT_NAMES : UDISPCTX_STANDARD_NAMES;
+    const UDisplayContext dialect = (options & LocaleDisplayNameOptions::DialectNames)
+        ? UDISPCTX_DIALECT_NAMES
+        : UDISPCTX_STANDARD_NAMES;
     UDisplayContext capitalization = UDISPCTX_CAPITALIZATION_NONE;
     switch (options & 15) {
     case LocaleDisplayNameOptions::CapitalizationNone:
@@ -192,7 +196,8 @@ QString displayNameForKey(const Locale &displayLocale, const QVariant &key, cons
     if (!names) {
         return {};
     }
-    struct Closer {
+    struct Closer
+    {
         ULocaleDisplayNames *names;
         bool owned;
         ~Closer()
@@ -228,8 +233,8 @@ QString displayNameForKey(const Locale &displayLocale, const QVariant &key, cons
     }
 
     if (result == value) {
-        qCInfo(Platform::lcLocale, "%s failed to get display name for \u2018%s/%s\u2019", qPrintable(operationName),
-            qPrintable(keyString), qPrintable(value));
+        qCInfo(Platform::lcLocale, "%s failed to get display name for \u2018%s/%s\u2019",
+            qPrintable(operationName), qPrintable(keyString), qPrintable(value));
         return displayLocale.displayNameForKey(keyString, value);
     }
     return result;

@@ -32,12 +32,12 @@ constexpr quint64 DialectNames = 8;
  * Misuse (a key that is not a string, an unsupported key, an invalid capitalisation, a value without
  * a language name) raises Platform::AssertionFailure.
  */
-[[nodiscard]] CADENZACORE_EXPORT QString displayNameForKey(const Platform::Locale &displayLocale, const QVariant &key,
-    const QString &value, quint64 options);
+[[nodiscard]] CADENZACORE_EXPORT QString displayNameForKey(
+    const Platform::Locale &displayLocale, const QVariant &key, const QString &value, quint64 options);
 
 /// One ICU display-name call for @p key on an open handle; null on failure or an empty name.
-[[nodiscard]] CADENZACORE_EXPORT QString _icuDisplayName(ULocaleDisplayNames *displayNames, const QString &key,
-    const QString &value);
+[[nodiscard]] CADENZACORE_EXPORT QString _icuDisplayName(
+    ULocaleDisplayNames *displayNames, const QString &key, const QString &value);
 
 } // namespace Cadenza
 

@@ -11,14 +11,14 @@ QString report(const QString &function, const QString &file, int line, const QSt
 }
 } // namespace
 
-AssertionFailure::AssertionFailure(const QString &function, const QString &file, int line, const QString &message)
+AssertionFailure::AssertionFailure(
+    const QString &function, const QString &file, int line, const QString &message)
     : std::logic_error(report(function, file, line, message).toStdString())
     , m_function(function)
     , m_file(file)
     , m_line(line)
     , m_message(message)
-{
-}
+{ }
 
 void raiseAssertion(const QString &function, const QString &file, int line, const QString &message)
 {

@@ -31,8 +31,8 @@ private:
  * The assertion handler: logs "Assertion failure in <function>, <file>:<line>: <message>" and raises
  * AssertionFailure.
  */
-[[noreturn]] CADENZACORE_EXPORT void raiseAssertion(const QString &function, const QString &file, int line,
-    const QString &message);
+[[noreturn]] CADENZACORE_EXPORT void raiseAssertion(
+    const QString &function, const QString &file, int line, const QString &message);
 
 } // namespace Cadenza::Platform
 

@@ -29,15 +29,15 @@ const QString BundleSuffix = QStringLiteral(".SpeechVoice");
 
 QString stampKey(const QString &folder, qint64 modifiedNs, quint64 inode)
 {
-    return folder + QLatin1Char('|') + QString::number(modifiedNs) + QLatin1Char('|') + QString::number(inode);
+    return folder + QLatin1Char('|') + QString::number(modifiedNs) + QLatin1Char('|')
+        + QString::number(inode);
 }
 
 } // namespace
 
 BundleSpeechSynthesisService::BundleSpeechSynthesisService(QObject *parent)
     : SpeechSynthesisService(parent)
-{
-}
+{ }
 
 BundleSpeechSynthesisService::~BundleSpeechSynthesisService()
 {
@@ -70,8 +70,8 @@ QList<VoiceDescription> BundleSpeechSynthesisService::scanFolder(const QString &
 {
     QList<VoiceDescription> voices;
     QDir dir(folder);
-    const QStringList entries = dir.entryList({QLatin1Char('*') + BundleSuffix}, QDir::Dirs | QDir::NoDotAndDotDot,
-        QDir::Name);
+    const QStringList entries
+        = dir.entryList({QLatin1Char('*') + BundleSuffix}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Name);
     voices.reserve(entries.size());
     for (const QString &entry : entries) {
         if (auto voice = readBundle(dir.filePath(entry))) {
@@ -88,7 +88,9 @@ QList<VoiceDescription> BundleSpeechSynthesisService::installedVoices()
     QStringList key;
     bool changed = false;
     for (const QString &folder : folders) {
-        struct stat st {};
+        struct stat st
+        {
+        };
         const bool exists = ::stat(QFile::encodeName(folder).constData(), &st) == 0 && S_ISDIR(st.st_mode);
         const qint64 modified = exists ? qint64(st.st_mtim.tv_sec) * 1000000000 + st.st_mtim.tv_nsec : -1;
         const quint64 inode = exists ? quint64(st.st_ino) : 0;
@@ -146,7 +148,8 @@ std::optional<VoiceDescription> BundleSpeechSynthesisService::voiceForRequest(co
     return found;
 }
 
-bool BundleSpeechSynthesisService::renderToFile(const SpeechRequest &request, const QString &wavPath, QString *error)
+bool BundleSpeechSynthesisService::renderToFile(
+    const SpeechRequest &request, const QString &wavPath, QString *error)
 {
     const auto voice = voiceForRequest(request);
     if (!voice) {
@@ -187,8 +190,8 @@ quint64 BundleSpeechSynthesisService::startSpeaking(const SpeechRequest &request
     return requestId;
 }
 
-void BundleSpeechSynthesisService::renderFinished(quint64 requestId, const std::optional<PcmAudio> &audio,
-    const QString &error)
+void BundleSpeechSynthesisService::renderFinished(
+    quint64 requestId, const std::optional<PcmAudio> &audio, const QString &error)
 {
     if (requestId != m_currentRequest) {
         return; // stopped meanwhile; its finish was already reported

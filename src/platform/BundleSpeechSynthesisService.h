@@ -39,7 +39,8 @@ public:
     [[nodiscard]] static std::optional<VoiceDescription> readBundle(const QString &bundlePath);
 
 private:
-    struct FolderScan {
+    struct FolderScan
+    {
         qint64 modifiedNs = -1;
         quint64 inode = 0;
         QList<VoiceDescription> voices;

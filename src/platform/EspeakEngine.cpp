@@ -16,7 +16,8 @@ QMutex &engineMutex()
     return mutex;
 }
 
-struct RenderTarget {
+struct RenderTarget
+{
     std::vector<qint16> *samples = nullptr;
     std::atomic<bool> *cancelled = nullptr;
 };
@@ -58,8 +59,8 @@ bool EspeakEngine::initialise(QString *error)
     return true;
 }
 
-std::optional<PcmAudio> EspeakEngine::render(const VoiceDescription &voice, const SpeechRequest &request,
-    QString *error)
+std::optional<PcmAudio> EspeakEngine::render(
+    const VoiceDescription &voice, const SpeechRequest &request, QString *error)
 {
     QMutexLocker locker(&engineMutex());
     if (!initialise(error)) {
@@ -91,8 +92,8 @@ std::optional<PcmAudio> EspeakEngine::render(const VoiceDescription &voice, cons
     audio.sampleRate = m_sampleRate;
     currentTarget = {&audio.samples, &m_cancelled};
     const QByteArray text = request.text.toUtf8();
-    const espeak_ERROR result = espeak_Synth(text.constData(), size_t(text.size()) + 1, 0, POS_CHARACTER, 0,
-        espeakCHARS_UTF8, nullptr, nullptr);
+    const espeak_ERROR result = espeak_Synth(
+        text.constData(), size_t(text.size()) + 1, 0, POS_CHARACTER, 0, espeakCHARS_UTF8, nullptr, nullptr);
     espeak_Synchronize();
     currentTarget = {};
     if (result != EE_OK) {

@@ -22,8 +22,8 @@ public:
 
     /// Speaks @p request with @p voice; nothing when the engine cannot start or the voice is unknown.
     /// A render cut short by cancel() returns what was rendered so far.
-    [[nodiscard]] std::optional<PcmAudio> render(const VoiceDescription &voice, const SpeechRequest &request,
-        QString *error);
+    [[nodiscard]] std::optional<PcmAudio> render(
+        const VoiceDescription &voice, const SpeechRequest &request, QString *error);
     /// Makes the running render return early.
     void cancel();
 

@@ -12,8 +12,7 @@ namespace Cadenza::Platform {
 
 FakeSpeechSynthesisService::FakeSpeechSynthesisService(QObject *parent)
     : SpeechSynthesisService(parent)
-{
-}
+{ }
 
 void FakeSpeechSynthesisService::addVoice(const VoiceDescription &voice)
 {
@@ -71,7 +70,8 @@ void FakeSpeechSynthesisService::finishHeldRequests(bool completed)
     }
 }
 
-bool FakeSpeechSynthesisService::renderToFile(const SpeechRequest &request, const QString &wavPath, QString *error)
+bool FakeSpeechSynthesisService::renderToFile(
+    const SpeechRequest &request, const QString &wavPath, QString *error)
 {
     const QString identifier = request.voiceIdentifier.isEmpty() ? defaultVoice() : request.voiceIdentifier;
     if (!voice(identifier) || m_speakingFails) {

@@ -5,7 +5,6 @@ namespace Cadenza::Platform {
 FakeUserLocaleService::FakeUserLocaleService(QStringList preferredLanguages, QString currentLocale)
     : m_preferredLanguages(std::move(preferredLanguages))
     , m_currentLocale(std::move(currentLocale))
-{
-}
+{ }
 
 } // namespace Cadenza::Platform

@@ -16,8 +16,7 @@ namespace Cadenza::Platform {
 
 FilePreferencesStore::FilePreferencesStore(const QString &folder)
     : m_folder(folder)
-{
-}
+{ }
 
 FilePreferencesStore::~FilePreferencesStore() = default;
 
@@ -29,11 +28,14 @@ QString FilePreferencesStore::filePath(const QString &domain) const
 
 FilePreferencesStore::FileStamp FilePreferencesStore::stampOf(const QString &path)
 {
-    struct stat st {};
+    struct stat st
+    {
+    };
     if (::stat(QFile::encodeName(path).constData(), &st) != 0) {
         return {};
     }
-    return {qint64(st.st_mtim.tv_sec) * 1000000000 + st.st_mtim.tv_nsec, qint64(st.st_size), quint64(st.st_ino)};
+    return {
+        qint64(st.st_mtim.tv_sec) * 1000000000 + st.st_mtim.tv_nsec, qint64(st.st_size), quint64(st.st_ino)};
 }
 
 QVariantMap FilePreferencesStore::readFileKeepingCorruptAside(const QString &path)
@@ -43,7 +45,8 @@ QVariantMap FilePreferencesStore::readFileKeepingCorruptAside(const QString &pat
         return {};
     }
     if (!file.open(QIODevice::ReadOnly)) {
-        qCWarning(lcPreferences, "Cannot read preferences %s: %s", qPrintable(path), qPrintable(file.errorString()));
+        qCWarning(lcPreferences, "Cannot read preferences %s: %s", qPrintable(path),
+            qPrintable(file.errorString()));
         return {};
     }
     const QByteArray bytes = file.readAll();
@@ -61,10 +64,11 @@ QVariantMap FilePreferencesStore::readFileKeepingCorruptAside(const QString &pat
         + QDateTime::currentDateTimeUtc().toString(QStringLiteral("yyyyMMdd-HHmmss-zzz"));
     if (QFile::rename(path, aside)) {
         qCWarning(lcPreferences, "Preferences %s are damaged (%s); kept aside as %s", qPrintable(path),
-            qPrintable(parsed ? QStringLiteral("the top level is not a dictionary") : error), qPrintable(aside));
+            qPrintable(parsed ? QStringLiteral("the top level is not a dictionary") : error),
+            qPrintable(aside));
     } else {
-        qCWarning(lcPreferences, "Preferences %s are damaged (%s) and could not be kept aside", qPrintable(path),
-            qPrintable(error));
+        qCWarning(lcPreferences, "Preferences %s are damaged (%s) and could not be kept aside",
+            qPrintable(path), qPrintable(error));
     }
     return {};
 }
@@ -148,8 +152,10 @@ bool FilePreferencesStore::synchronize(const QString &domain)
 
     QSaveFile file(path);
     file.setDirectWriteFallback(false);
-    if (!file.open(QIODevice::WriteOnly) || file.write(PropertyList::serialize(state.values)) < 0 || !file.commit()) {
-        qCWarning(lcPreferences, "Cannot write preferences %s: %s", qPrintable(path), qPrintable(file.errorString()));
+    if (!file.open(QIODevice::WriteOnly) || file.write(PropertyList::serialize(state.values)) < 0
+        || !file.commit()) {
+        qCWarning(lcPreferences, "Cannot write preferences %s: %s", qPrintable(path),
+            qPrintable(file.errorString()));
         return false;
     }
     state.pending.clear();

@@ -34,13 +34,15 @@ public:
     [[nodiscard]] QString filePath(const QString &domain) const;
 
 private:
-    struct FileStamp {
+    struct FileStamp
+    {
         qint64 modifiedNs = -1;
         qint64 size = -1;
         quint64 inode = 0;
         bool operator==(const FileStamp &) const = default;
     };
-    struct Domain {
+    struct Domain
+    {
         QVariantMap values; // as last read from disk, with pending changes applied
         QHash<QString, std::optional<QVariant>> pending; // nullopt = removal
         std::optional<FileStamp> stamp; // of the file when last read; nullopt = never read

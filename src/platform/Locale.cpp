@@ -34,8 +34,7 @@ QString component(const QByteArray &identifier, Getter getter)
 
 Locale::Locale(const QString &identifier)
     : m_identifier(canonicalLocaleIdentifier(identifier))
-{
-}
+{ }
 
 QString Locale::canonicalLocaleIdentifier(const QString &identifier)
 {
@@ -58,7 +57,8 @@ QString Locale::canonicalLocaleIdentifier(const QString &identifier)
         status = U_ZERO_ERROR;
         buffer.fill(0);
     }
-    const int32_t length = uloc_canonicalize(input.constData(), buffer.data(), int32_t(buffer.size()), &status);
+    const int32_t length
+        = uloc_canonicalize(input.constData(), buffer.data(), int32_t(buffer.size()), &status);
     if (U_FAILURE(status) || status == U_STRING_NOT_TERMINATED_WARNING) {
         return {};
     }
@@ -107,16 +107,18 @@ QString Locale::displayNameForKey(const QString &key, const QString &value) cons
     if (key == IdentifierKey) {
         length = uldn_localeDisplayName(names, v.constData(), buffer.data(), int32_t(buffer.size()), &status);
     } else if (key == LanguageCodeKey) {
-        length = uldn_languageDisplayName(names, v.constData(), buffer.data(), int32_t(buffer.size()), &status);
+        length
+            = uldn_languageDisplayName(names, v.constData(), buffer.data(), int32_t(buffer.size()), &status);
     } else if (key == CountryCodeKey) {
         length = uldn_regionDisplayName(names, v.constData(), buffer.data(), int32_t(buffer.size()), &status);
     } else if (key == ScriptCodeKey) {
         length = uldn_scriptDisplayName(names, v.constData(), buffer.data(), int32_t(buffer.size()), &status);
     } else if (key == VariantCodeKey) {
-        length = uldn_variantDisplayName(names, v.constData(), buffer.data(), int32_t(buffer.size()), &status);
+        length
+            = uldn_variantDisplayName(names, v.constData(), buffer.data(), int32_t(buffer.size()), &status);
     } else if (key == CollationIdentifierKey) {
-        length = uldn_keyValueDisplayName(names, "collation", v.constData(), buffer.data(), int32_t(buffer.size()),
-            &status);
+        length = uldn_keyValueDisplayName(
+            names, "collation", v.constData(), buffer.data(), int32_t(buffer.size()), &status);
     } else {
         status = U_ILLEGAL_ARGUMENT_ERROR;
     }

@@ -8,7 +8,8 @@
 namespace Cadenza::Platform {
 
 /// The parts of a locale identifier such as "zh_Hans_CN"; absent parts are empty.
-struct CADENZACORE_EXPORT LocaleComponents {
+struct CADENZACORE_EXPORT LocaleComponents
+{
     QString languageCode;
     QString scriptCode;
     QString countryCode;

@@ -12,7 +12,8 @@ namespace Cadenza::Platform {
 
 namespace {
 
-struct SharedTable {
+struct SharedTable
+{
     QMutex mutex;
     std::unique_ptr<LocalizationTable> table;
 };

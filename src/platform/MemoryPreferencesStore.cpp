@@ -4,13 +4,11 @@ namespace Cadenza::Platform {
 
 MemoryPreferencesStore::MemoryPreferencesStore()
     : MemoryPreferencesStore(std::make_shared<Backing>())
-{
-}
+{ }
 
 MemoryPreferencesStore::MemoryPreferencesStore(std::shared_ptr<Backing> backing)
     : m_backing(std::move(backing))
-{
-}
+{ }
 
 QVariant MemoryPreferencesStore::value(const QString &key, const QString &domain)
 {

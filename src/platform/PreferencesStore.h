@@ -24,7 +24,8 @@ public:
     [[nodiscard]] virtual QVariant value(const QString &key, const QString &domain) = 0;
     /// Sets @p key; an invalid @p value removes it.
     virtual void setValue(const QString &key, const QVariant &value, const QString &domain) = 0;
-    /// Writes this process's changes and reads other processes' ones. False when the domain could not be written.
+    /// Writes this process's changes and reads other processes' ones. False when the domain could not be
+    /// written.
     [[nodiscard]] virtual bool synchronize(const QString &domain) = 0;
 
     /// A domain name is a reverse-domain word: it becomes a file name, so nothing else is accepted.

@@ -15,8 +15,7 @@ class Reader
 public:
     explicit Reader(const QByteArray &bytes)
         : m_xml(bytes)
-    {
-    }
+    { }
 
     std::optional<QVariant> document(QString *error)
     {
@@ -177,8 +176,12 @@ private:
         }
         if (name == u"data") {
             QString t = text();
-            t.remove(QLatin1Char(' ')).remove(QLatin1Char('\n')).remove(QLatin1Char('\t')).remove(QLatin1Char('\r'));
-            auto decoded = QByteArray::fromBase64Encoding(t.toLatin1(), QByteArray::AbortOnBase64DecodingErrors);
+            t.remove(QLatin1Char(' '))
+                .remove(QLatin1Char('\n'))
+                .remove(QLatin1Char('\t'))
+                .remove(QLatin1Char('\r'));
+            auto decoded
+                = QByteArray::fromBase64Encoding(t.toLatin1(), QByteArray::AbortOnBase64DecodingErrors);
             if (!decoded) {
                 fail(QStringLiteral("bad base64 data"));
                 return {};
@@ -304,8 +307,8 @@ QByteArray PropertyList::serialize(const QVariant &value)
     xml.setAutoFormatting(true);
     xml.setAutoFormattingIndent(1);
     xml.writeStartDocument();
-    xml.writeDTD(QStringLiteral(
-        "<!DOCTYPE plist PUBLIC \"-//Cadenza//DTD PLIST 1.0//EN\" \"https://cadenza.invalid/PropertyList-1.0.dtd\">"));
+    xml.writeDTD(QStringLiteral("<!DOCTYPE plist PUBLIC \"-//Cadenza//DTD PLIST 1.0//EN\" "
+                                "\"https://cadenza.invalid/PropertyList-1.0.dtd\">"));
     xml.writeStartElement(QStringLiteral("plist"));
     xml.writeAttribute(QStringLiteral("version"), QStringLiteral("1.0"));
     writeValue(xml, value);

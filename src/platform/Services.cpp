@@ -10,7 +10,8 @@ namespace Cadenza::Platform {
 
 namespace {
 
-struct Registry {
+struct Registry
+{
     QMutex mutex;
     std::shared_ptr<PreferencesStore> preferences;
     std::shared_ptr<SpeechSynthesisService> speechSynthesis;

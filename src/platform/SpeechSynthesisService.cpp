@@ -48,8 +48,7 @@ std::optional<qint32> storedInteger(const QVariant &v)
 
 SpeechSynthesisService::SpeechSynthesisService(QObject *parent)
     : QObject(parent)
-{
-}
+{ }
 
 SpeechSynthesisService::~SpeechSynthesisService() = default;
 
@@ -91,9 +90,11 @@ QString SpeechSynthesisService::defaultVoice()
     const QStringList available = availableVoices();
     PreferencesStore &preferences = Services::preferences();
     (void)preferences.synchronize(PreferencesDomain);
-    const auto creator = storedInteger(preferences.value(QStringLiteral("SelectedVoiceCreator"), PreferencesDomain));
+    const auto creator
+        = storedInteger(preferences.value(QStringLiteral("SelectedVoiceCreator"), PreferencesDomain));
     if (creator) {
-        const auto id = storedInteger(preferences.value(QStringLiteral("SelectedVoiceID"), PreferencesDomain));
+        const auto id
+            = storedInteger(preferences.value(QStringLiteral("SelectedVoiceID"), PreferencesDomain));
         const QString selected = voiceIdentifierForSpec(*creator, id.value_or(0));
         if (!selected.isEmpty()) {
             const QString base = VoiceDescription::baseIdentifierOf(selected);
@@ -135,7 +136,8 @@ QString SpeechSynthesisService::voiceIdentifierForSpec(qint32 creator, qint32 id
     return {};
 }
 
-QString SpeechSynthesisService::preferredVoiceForLocale(const QStringList &identifiers, const QString &localeIdentifier)
+QString SpeechSynthesisService::preferredVoiceForLocale(
+    const QStringList &identifiers, const QString &localeIdentifier)
 {
     if (identifiers.isEmpty()) {
         return {};

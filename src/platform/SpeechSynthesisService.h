@@ -13,7 +13,8 @@
 namespace Cadenza::Platform {
 
 /// What to say and how.
-struct CADENZACORE_EXPORT SpeechRequest {
+struct CADENZACORE_EXPORT SpeechRequest
+{
     QString text;
     QString voiceIdentifier; ///< empty: the ordinary default voice
     double wordsPerMinute = 0; ///< 0: the voice's normal rate
@@ -55,7 +56,9 @@ public:
     virtual void stopSpeaking() = 0;
     [[nodiscard]] virtual bool isSpeaking() const = 0;
     /// Renders @p request into a 16-bit mono WAV file; blocks until done.
-    [[nodiscard]] virtual bool renderToFile(const SpeechRequest &request, const QString &wavPath, QString *error) = 0;
+    [[nodiscard]] virtual bool renderToFile(
+        const SpeechRequest &request, const QString &wavPath, QString *error)
+        = 0;
 
     /// The identifiers of the voices in any of @p groups, in installedVoices() order.
     [[nodiscard]] QStringList voiceIdentifiersInGroups(const QStringList &groups);
@@ -74,7 +77,8 @@ public:
      * empty): same language and country first, then same language, higher desirability and better
      * quality breaking ties; without a voice of the language, the fallback voice or the first one.
      */
-    [[nodiscard]] QString preferredVoiceForLocale(const QStringList &identifiers, const QString &localeIdentifier);
+    [[nodiscard]] QString preferredVoiceForLocale(
+        const QStringList &identifiers, const QString &localeIdentifier);
 
 Q_SIGNALS:
     void speakingFinished(quint64 requestId, bool completed);

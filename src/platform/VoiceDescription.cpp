@@ -102,8 +102,10 @@ std::optional<VoiceDescription> VoiceDescription::fromInfo(const QVariantMap &in
     const QVariantMap engineMap = engine.typeId() == QMetaType::QVariantMap ? engine.toMap() : QVariantMap();
     voice.engineVoice = stringValue(engineMap, QStringLiteral("Voice"));
     voice.engineVariant = stringValue(engineMap, QStringLiteral("Variant"));
-    voice.enginePitch = int(std::clamp<qint64>(integerValue(engineMap, QStringLiteral("Pitch")).value_or(50), 0, 100));
-    voice.engineRate = int(std::clamp<qint64>(integerValue(engineMap, QStringLiteral("Rate")).value_or(175), 80, 450));
+    voice.enginePitch
+        = int(std::clamp<qint64>(integerValue(engineMap, QStringLiteral("Pitch")).value_or(50), 0, 100));
+    voice.engineRate
+        = int(std::clamp<qint64>(integerValue(engineMap, QStringLiteral("Rate")).value_or(175), 80, 450));
     if (voice.engineVoice.isEmpty()) {
         voice.engineVoice = QStringLiteral("en");
     }

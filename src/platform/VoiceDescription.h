@@ -39,7 +39,8 @@ inline const QString Neuter = QStringLiteral("VoiceGenderNeuter");
 enum class VoiceQuality { Compact, Default, Premium };
 
 /// One installed voice: its attributes and what the speech engine needs to speak with it.
-struct CADENZACORE_EXPORT VoiceDescription {
+struct CADENZACORE_EXPORT VoiceDescription
+{
     QString identifier;
     QString version;
     QString bundlePath; ///< empty for voices that have no bundle (test voices)

@@ -30,7 +30,8 @@ bool WaveFile::write(const QString &path, const PcmAudio &audio, QString *error)
     SNDFILE *file = sf_open(QFile::encodeName(temporary).constData(), SFM_WRITE, &info);
     if (!file) {
         if (error) {
-            *error = QStringLiteral("cannot create %1: %2").arg(path, QString::fromUtf8(sf_strerror(nullptr)));
+            *error
+                = QStringLiteral("cannot create %1: %2").arg(path, QString::fromUtf8(sf_strerror(nullptr)));
         }
         return false;
     }

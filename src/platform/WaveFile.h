@@ -11,7 +11,8 @@
 namespace Cadenza::Platform {
 
 /// Mono 16-bit PCM audio.
-struct CADENZACORE_EXPORT PcmAudio {
+struct CADENZACORE_EXPORT PcmAudio
+{
     std::vector<qint16> samples;
     int sampleRate = 22050;
 

@@ -42,7 +42,8 @@ QString SpeechSynthesizer::defaultVoiceFromAllVoices()
 {
     Platform::PreferencesStore &preferences = Services::preferences();
     (void)preferences.synchronize(VoicePreferencesDomain);
-    const QVariant creator = preferences.value(QStringLiteral("SelectedVoiceCreator"), VoicePreferencesDomain);
+    const QVariant creator
+        = preferences.value(QStringLiteral("SelectedVoiceCreator"), VoicePreferencesDomain);
     SpeechSynthesisService &service = Services::speechSynthesis();
     if (isStoredNumber(creator)) {
         const QVariant id = preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain);

@@ -29,7 +29,8 @@ public:
      * identifiers of 36 characters or more, the second voice beginning with it when that one ends in
      * "premium", else the first such voice. Null when none.
      */
-    [[nodiscard]] static QString resolveVoiceIdentifier(const QString &identifier, const QStringList &usingVoices);
+    [[nodiscard]] static QString resolveVoiceIdentifier(
+        const QString &identifier, const QStringList &usingVoices);
 };
 
 } // namespace Cadenza

@@ -1,0 +1,146 @@
+#include "VoicesCommand.h"
+
+#include "locale/LocaleDisplayName.h"
+#include "platform/Locale.h"
+#include "platform/LocalizationTable.h"
+#include "platform/Services.h"
+#include "platform/SpeechSynthesisService.h"
+#include "voices/SpeechSynthesizer.h"
+
+#include <QCommandLineParser>
+#include <QJsonArray>
+#include <QJsonDocument>
+#include <QJsonObject>
+
+#include <cstdio>
+
+using namespace Cadenza;
+using namespace Cadenza::Platform;
+
+namespace {
+
+struct VoiceLine
+{
+    QString identifier, name, locale, language, country, gender;
+    bool isDefault = false;
+};
+
+QString genderText(const QString &gender, const LocalizationTable &table)
+{
+    if (gender == VoiceGender::Male) {
+        return table.text(QStringLiteral("Male"));
+    }
+    if (gender == VoiceGender::Female) {
+        return table.text(QStringLiteral("Female"));
+    }
+    if (gender == VoiceGender::Neuter) {
+        return table.text(QStringLiteral("Novelty"));
+    }
+    return {};
+}
+
+QString displayName(const Platform::Locale &in, const QString &key, const QString &code)
+{
+    if (code.isEmpty()) {
+        return {};
+    }
+    return displayNameForKey(in, key, code, LocaleDisplayNameOptions::CapitalizationForListOrMenu);
+}
+
+} // namespace
+
+int VoicesCommand::run(const QStringList &arguments)
+{
+    QCommandLineParser parser;
+    parser.setApplicationDescription(QStringLiteral(
+        "Lists the installed voices: identifier, name, locale, language, country and gender, with names in "
+        "your language. The default voice is marked with '*'."));
+    parser.addHelpOption();
+    const QCommandLineOption all(QStringLiteral("all"),
+        QStringLiteral("List every voice of every quality, not only the best quality of each voice."));
+    const QCommandLineOption json(
+        QStringLiteral("json"), QStringLiteral("Print a JSON array instead of a table."));
+    parser.addOptions({all, json});
+    if (!parser.parse(arguments)) {
+        std::fprintf(stderr, "%s: %s\n", qPrintable(arguments.first()), qPrintable(parser.errorText()));
+        return 2;
+    }
+    if (parser.isSet(QStringLiteral("help"))) {
+        std::fputs(qPrintable(parser.helpText()), stdout);
+        return 0;
+    }
+    if (!parser.positionalArguments().isEmpty()) {
+        std::fprintf(stderr, "%s: unexpected argument '%s'\n", qPrintable(arguments.first()),
+            qPrintable(parser.positionalArguments().first()));
+        return 2;
+    }
+
+    const bool everyQuality = parser.isSet(all);
+    const QStringList identifiers
+        = everyQuality ? SpeechSynthesizer::allVoices() : SpeechSynthesizer::avaliableMainstreamVoices();
+    const QString defaultVoice = everyQuality ? SpeechSynthesizer::defaultVoiceFromAllVoices()
+                                              : SpeechSynthesizer::defaultVoiceFromMainstreamVoices();
+    const LocalizationTable &table = LocalizationTable::shared();
+    const Platform::Locale displayLocale(table.language());
+    SpeechSynthesisService &service = Services::speechSynthesis();
+
+    QList<VoiceLine> lines;
+    for (const QString &identifier : identifiers) {
+        const QVariantMap attributes = service.attributesForVoice(identifier);
+        VoiceLine line;
+        line.identifier = identifier;
+        line.name = attributes.value(VoiceAttribute::Name).toString();
+        QString locale = attributes.value(VoiceAttribute::LocaleIdentifier).toString();
+        if (locale.isEmpty()) {
+            locale = attributes.value(VoiceAttribute::Language).toString();
+        }
+        line.locale = Platform::Locale::canonicalLocaleIdentifier(
+            locale.isEmpty() ? QStringLiteral("en_US") : locale);
+        const LocaleComponents parts = Platform::Locale::componentsFromLocaleIdentifier(line.locale);
+        line.language = displayName(displayLocale, Platform::Locale::LanguageCodeKey, parts.languageCode);
+        line.country = displayName(displayLocale, Platform::Locale::CountryCodeKey, parts.countryCode);
+        line.gender = genderText(attributes.value(VoiceAttribute::Gender).toString(), table);
+        line.isDefault = identifier == defaultVoice;
+        lines.append(line);
+    }
+
+    if (parser.isSet(json)) {
+        QJsonArray array;
+        for (const auto &line : lines) {
+            array.append(QJsonObject {{QStringLiteral("identifier"), line.identifier},
+                {QStringLiteral("name"), line.name}, {QStringLiteral("locale"), line.locale},
+                {QStringLiteral("language"), line.language}, {QStringLiteral("country"), line.country},
+                {QStringLiteral("gender"), line.gender}, {QStringLiteral("default"), line.isDefault}});
+        }
+        std::fputs(QJsonDocument(array).toJson(QJsonDocument::Indented).constData(), stdout);
+        return 0;
+    }
+
+    if (lines.isEmpty()) {
+        std::fputs("No voices are installed.\n", stderr);
+        return 0;
+    }
+    qsizetype widths[5] = {0, 0, 0, 0, 0};
+    for (const auto &line : lines) {
+        const QString cells[5] = {line.identifier, line.name, line.locale, line.language, line.country};
+        for (int i = 0; i < 5; ++i) {
+            widths[i] = qMax(widths[i], cells[i].size());
+        }
+    }
+    for (const auto &line : lines) {
+        const QString row = QStringLiteral("%1 %2  %3  %4  %5  %6  %7")
+                                .arg(line.isDefault ? QStringLiteral("*") : QStringLiteral(" "))
+                                .arg(line.identifier, -int(widths[0]))
+                                .arg(line.name, -int(widths[1]))
+                                .arg(line.locale, -int(widths[2]))
+                                .arg(line.language, -int(widths[3]))
+                                .arg(line.country, -int(widths[4]))
+                                .arg(line.gender);
+        QString text = row;
+        while (text.endsWith(QLatin1Char(' '))) {
+            text.chop(1);
+        }
+        std::fputs(qPrintable(text + QLatin1Char('\n')), stdout);
+    }
+    return 0;
+}

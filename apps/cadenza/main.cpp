@@ -1,0 +1,53 @@
+// cadenza: Cadenza's command-line tool.
+
+#include "SayCommand.h"
+#include "VoicesCommand.h"
+
+#include <QCoreApplication>
+#include <QTextStream>
+
+#include <cstdio>
+
+namespace {
+
+void printUsage(FILE *to)
+{
+    std::fputs("Usage: cadenza COMMAND [OPTIONS]\n"
+               "\n"
+               "Commands:\n"
+               "  voices   list the installed voices\n"
+               "  say      speak a text, or write it to a WAV file\n"
+               "\n"
+               "Run 'cadenza COMMAND --help' for the options of a command.\n",
+        to);
+}
+
+} // namespace
+
+int main(int argc, char *argv[])
+{
+    QCoreApplication app(argc, argv);
+    QCoreApplication::setApplicationName(QStringLiteral("cadenza"));
+    QStringList arguments = QCoreApplication::arguments();
+    if (arguments.size() < 2) {
+        printUsage(stderr);
+        return 2;
+    }
+    const QString command = arguments.at(1);
+    if (command == u"-h" || command == u"--help" || command == u"help") {
+        printUsage(stdout);
+        return 0;
+    }
+    // Each command parses "cadenza COMMAND ..." as its own program name and options.
+    arguments.removeAt(1);
+    arguments[0] = QStringLiteral("cadenza ") + command;
+    if (command == u"voices") {
+        return VoicesCommand::run(arguments);
+    }
+    if (command == u"say") {
+        return SayCommand::run(arguments);
+    }
+    std::fprintf(stderr, "cadenza: unknown command '%s'\n\n", qPrintable(command));
+    printUsage(stderr);
+    return 2;
+}
