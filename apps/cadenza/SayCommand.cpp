@@ -1,5 +1,7 @@
 #include "SayCommand.h"
 
+#include "CommandLine.h"
+
 #include "platform/Services.h"
 #include "platform/SpeechSynthesisService.h"
 #include "voices/SpeechSynthesizer.h"
@@ -20,7 +22,6 @@ int SayCommand::run(const QStringList &arguments)
     parser.setApplicationDescription(QStringLiteral(
         "Speaks TEXT (or standard input when no TEXT is given) with the default voice or the one chosen "
         "with --voice, on the audio output or into a WAV file."));
-    parser.addHelpOption();
     const QCommandLineOption voice(QStringLiteral("voice"),
         QStringLiteral(
             "Speak with the voice ID (an identifier, or the start of one of 36 characters or more)."),
@@ -34,13 +35,8 @@ int SayCommand::run(const QStringList &arguments)
     parser.addPositionalArgument(
         QStringLiteral("TEXT"), QStringLiteral("What to say."), QStringLiteral("[TEXT...]"));
     const QString program = arguments.first();
-    if (!parser.parse(arguments)) {
-        std::fprintf(stderr, "%s: %s\n", qPrintable(program), qPrintable(parser.errorText()));
-        return 2;
-    }
-    if (parser.isSet(QStringLiteral("help"))) {
-        std::fputs(qPrintable(parser.helpText()), stdout);
-        return 0;
+    if (const auto done = CommandLine::parse(parser, arguments)) {
+        return *done;
     }
 
     SpeechRequest request;

@@ -1,5 +1,7 @@
 #include "VoicesCommand.h"
 
+#include "CommandLine.h"
+
 #include "locale/LocaleDisplayName.h"
 #include "platform/Locale.h"
 #include "platform/LocalizationTable.h"
@@ -55,23 +57,17 @@ int VoicesCommand::run(const QStringList &arguments)
     parser.setApplicationDescription(QStringLiteral(
         "Lists the installed voices: identifier, name, locale, language, country and gender, with names in "
         "your language. The default voice is marked with '*'."));
-    parser.addHelpOption();
     const QCommandLineOption all(QStringLiteral("all"),
         QStringLiteral("List every voice of every quality, not only the best quality of each voice."));
     const QCommandLineOption json(
         QStringLiteral("json"), QStringLiteral("Print a JSON array instead of a table."));
     parser.addOptions({all, json});
-    if (!parser.parse(arguments)) {
-        std::fprintf(stderr, "%s: %s\n", qPrintable(arguments.first()), qPrintable(parser.errorText()));
-        return 2;
-    }
-    if (parser.isSet(QStringLiteral("help"))) {
-        std::fputs(qPrintable(parser.helpText()), stdout);
-        return 0;
+    if (const auto done = CommandLine::parse(parser, arguments)) {
+        return *done;
     }
     if (!parser.positionalArguments().isEmpty()) {
-        std::fprintf(stderr, "%s: unexpected argument '%s'\n", qPrintable(arguments.first()),
-            qPrintable(parser.positionalArguments().first()));
+        CommandLine::fail(
+            arguments, QStringLiteral("unexpected argument '%1'").arg(parser.positionalArguments().first()));
         return 2;
     }
 

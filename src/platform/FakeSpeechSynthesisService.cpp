@@ -1,5 +1,6 @@
 #include "FakeSpeechSynthesisService.h"
 
+#include "Logging.h"
 #include "WaveFile.h"
 
 #include <QTimer>
@@ -41,6 +42,7 @@ quint64 FakeSpeechSynthesisService::startSpeaking(const SpeechRequest &request)
 {
     const QString identifier = request.voiceIdentifier.isEmpty() ? defaultVoice() : request.voiceIdentifier;
     if (!voice(identifier)) {
+        qCWarning(lcSpeech, "No installed voice '%s' to speak with", qPrintable(identifier));
         return 0;
     }
     stopSpeaking();

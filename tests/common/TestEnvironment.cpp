@@ -1,0 +1,97 @@
+#include "TestEnvironment.h"
+
+#include "locale/LocaleDisplayName_p.h"
+#include "platform/LocalizationTable.h"
+#include "platform/Paths.h"
+#include "platform/PropertyList.h"
+#include "platform/Services.h"
+
+#include <QDir>
+#include <QDirIterator>
+#include <QFile>
+#include <QTest>
+
+namespace Cadenza::Testing {
+
+namespace {
+const QByteArray Variables[]
+    = {"CADENZA_ROOT", "XDG_CONFIG_HOME", "XDG_DATA_HOME", "XDG_RUNTIME_DIR", "XDG_CACHE_HOME"};
+
+void resetServices()
+{
+    Platform::Services::setPreferences(nullptr);
+    Platform::Services::setSpeechSynthesis(nullptr);
+    Platform::Services::setUserLocale(nullptr);
+    Platform::LocalizationTable::resetShared();
+    LocaleDisplayNamePrivate::resetQualifiedTemplate();
+}
+} // namespace
+
+TestEnvironment::TestEnvironment()
+{
+    QVERIFY2(m_dir.isValid(), "cannot make a temporary folder");
+    for (const QByteArray &name : Variables) {
+        m_saved.insert(name, qgetenv(name.constData()));
+    }
+    const QString base = m_dir.path();
+    qputenv("CADENZA_ROOT", QFile::encodeName(base + QStringLiteral("/root")));
+    qputenv("XDG_CONFIG_HOME", QFile::encodeName(base + QStringLiteral("/config")));
+    qputenv("XDG_DATA_HOME", QFile::encodeName(base + QStringLiteral("/data")));
+    qputenv("XDG_RUNTIME_DIR", QFile::encodeName(base + QStringLiteral("/runtime")));
+    qputenv("XDG_CACHE_HOME", QFile::encodeName(base + QStringLiteral("/cache")));
+    QDir().mkpath(base + QStringLiteral("/runtime"));
+    QFile::setPermissions(
+        base + QStringLiteral("/runtime"), QFile::ReadOwner | QFile::WriteOwner | QFile::ExeOwner);
+    resetServices();
+}
+
+TestEnvironment::~TestEnvironment()
+{
+    resetServices();
+    for (auto it = m_saved.cbegin(); it != m_saved.cend(); ++it) {
+        if (it.value().isEmpty()) {
+            qunsetenv(it.key().constData());
+        } else {
+            qputenv(it.key().constData(), it.value());
+        }
+    }
+}
+
+QVariantMap TestEnvironment::voiceAttributes(
+    const QString &identifier, const QString &name, const QString &locale, const QString &gender)
+{
+    return {{QStringLiteral("VoiceIdentifier"), identifier}, {QStringLiteral("VoiceName"), name},
+        {QStringLiteral("VoiceLocaleIdentifier"), locale}, {QStringLiteral("VoiceGender"), gender}};
+}
+
+QString TestEnvironment::writeVoiceBundle(
+    const QString &folder, const QString &name, const QVariantMap &attributes, const QString &engineVoice)
+{
+    const QString bundle = folder + QLatin1Char('/') + name + QStringLiteral(".SpeechVoice");
+    QDir().mkpath(bundle + QStringLiteral("/Resources"));
+    const QVariantMap info {
+        {QStringLiteral("BundleIdentifier"), attributes.value(QStringLiteral("VoiceIdentifier"))},
+        {QStringLiteral("BundleVersion"), QStringLiteral("1.0")},
+        {QStringLiteral("Engine"), QVariantMap {{QStringLiteral("Voice"), engineVoice}}},
+        {QStringLiteral("VoiceAttributes"), attributes}};
+    QFile file(bundle + QStringLiteral("/Info.plist"));
+    if (!file.open(QIODevice::WriteOnly) || file.write(Platform::PropertyList::serialize(info)) < 0) {
+        qFatal("cannot write %s", qPrintable(file.fileName()));
+    }
+    return bundle;
+}
+
+void TestEnvironment::installSampleVoices() const
+{
+    const QString source = QStringLiteral(CADENZA_SOURCE_DIR "/data/sample-voices");
+    const QString target = Platform::Paths::systemVoicesFolder();
+    QDirIterator it(source, QDir::Files, QDirIterator::Subdirectories);
+    while (it.hasNext()) {
+        const QString file = it.next();
+        const QString destination = target + file.mid(source.size());
+        QDir().mkpath(QFileInfo(destination).absolutePath());
+        QFile::copy(file, destination);
+    }
+}
+
+} // namespace Cadenza::Testing

@@ -1,0 +1,45 @@
+#ifndef CADENZA_TESTS_TESTENVIRONMENT_H
+#define CADENZA_TESTS_TESTENVIRONMENT_H
+
+#include <QString>
+#include <QTemporaryDir>
+#include <QVariantMap>
+
+#include <memory>
+
+namespace Cadenza::Testing {
+
+/**
+ * A private world for one test: CADENZA_ROOT and every XDG folder point into a new temporary
+ * folder, the platform services go back to their Linux implementations (or the fakes a test
+ * installs), and the shared localisation table is chosen again. Undone on destruction.
+ */
+class TestEnvironment
+{
+public:
+    TestEnvironment();
+    ~TestEnvironment();
+
+    [[nodiscard]] QString root() const { return m_dir.path(); }
+    [[nodiscard]] QString path(const QString &relative) const { return m_dir.filePath(relative); }
+
+    /// Writes a voice bundle "<folder>/<name>.SpeechVoice" with @p attributes (and English espeak-ng
+    /// settings).
+    static QString writeVoiceBundle(const QString &folder, const QString &name, const QVariantMap &attributes,
+        const QString &engineVoice = QStringLiteral("en-us"));
+
+    /// Attributes of a test voice.
+    static QVariantMap voiceAttributes(const QString &identifier, const QString &name, const QString &locale,
+        const QString &gender = QStringLiteral("VoiceGenderFemale"));
+
+    /// Copies the shipped sample voices into the system voice folder of this world.
+    void installSampleVoices() const;
+
+private:
+    QTemporaryDir m_dir;
+    QHash<QByteArray, QByteArray> m_saved;
+};
+
+} // namespace Cadenza::Testing
+
+#endif
