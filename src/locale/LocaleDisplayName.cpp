@@ -28,6 +28,19 @@ constexpr int MissingLanguageLine = 119;
 
 std::atomic<bool> handleCacheEnabled {true};
 
+// Answers already given, per thread. Names that took the fallback are not kept, so their log line
+// appears on every call as before.
+struct ResultCache
+{
+    static constexpr qsizetype Capacity = 4096;
+    QHash<QString, QString> results;
+};
+ResultCache &resultCache()
+{
+    thread_local ResultCache cache;
+    return cache;
+}
+
 // Read once and kept for the life of the process; meant for the main thread.
 QString qualifiedTemplate;
 
@@ -102,6 +115,7 @@ void setHandleCacheEnabled(bool enabled)
 void resetQualifiedTemplate()
 {
     qualifiedTemplate = QString();
+    resultCache().results.clear();
 }
 
 } // namespace LocaleDisplayNamePrivate
@@ -191,6 +205,19 @@ QString displayNameForKey(
             QStringLiteral("Invalid capitalization LocaleDisplayNameOptions %1").arg(options & 15));
     }
 
+    const bool caching = handleCacheEnabled.load(std::memory_order_relaxed);
+    const QString keyString = key.toString();
+    QString cacheKey;
+    if (caching) {
+        cacheKey = displayLocale.identifier() + QLatin1Char('|') + QString::number(int(dialect))
+            + QLatin1Char('|') + QString::number(int(capitalization)) + QLatin1Char('|') + keyString
+            + QLatin1Char('|') + value;
+        const auto &results = resultCache().results;
+        if (auto it = results.constFind(cacheKey); it != results.cend()) {
+            return *it;
+        }
+    }
+
     bool owned = false;
     ULocaleDisplayNames *names = handleFor(displayLocale.identifier(), dialect, capitalization, &owned);
     if (!names) {
@@ -208,7 +235,6 @@ QString displayNameForKey(
         }
     } closer {names, owned};
 
-    const QString keyString = key.toString();
     QString result;
     if (keyString == Locale::LanguageCodeKey) {
         const Platform::LocaleComponents parts = Locale::componentsFromLocaleIdentifier(value);
@@ -236,6 +262,13 @@ QString displayNameForKey(
         qCInfo(Platform::lcLocale, "%s failed to get display name for \u2018%s/%s\u2019",
             qPrintable(operationName), qPrintable(keyString), qPrintable(value));
         return displayLocale.displayNameForKey(keyString, value);
+    }
+    if (caching) {
+        auto &results = resultCache().results;
+        if (results.size() >= ResultCache::Capacity) {
+            results.clear();
+        }
+        results.insert(cacheKey, result);
     }
     return result;
 }

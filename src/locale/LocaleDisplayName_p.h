@@ -5,7 +5,8 @@
 
 namespace Cadenza::LocaleDisplayNamePrivate {
 
-/// Open ICU handles are kept per display locale and context; off, every call opens its own (benchmarks).
+/// Open ICU handles and given answers are kept per display locale and context; off, every call asks ICU
+/// with a handle of its own (benchmarks).
 CADENZACORE_EXPORT void setHandleCacheEnabled(bool enabled);
 /// Forgets the qualified-name template, so the next call reads it from the current localisation table.
 CADENZACORE_EXPORT void resetQualifiedTemplate();

@@ -13,9 +13,11 @@
 #include <QAudioSink>
 #include <QBuffer>
 #include <QDir>
+#include <QElapsedTimer>
 #include <QFile>
 #include <QMediaDevices>
 #include <QThreadPool>
+#include <QtConcurrent/QtConcurrentMap>
 
 #include <sys/stat.h>
 
@@ -68,14 +70,17 @@ std::optional<VoiceDescription> BundleSpeechSynthesisService::readBundle(const Q
 
 QList<VoiceDescription> BundleSpeechSynthesisService::scanFolder(const QString &folder)
 {
+    const QStringList entries = QDir(folder).entryList(
+        {QLatin1Char('*') + BundleSuffix}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Unsorted);
+    const QString prefix = folder + QLatin1Char('/');
+    // Bundles are independent: parse them on every core.
+    const QList<std::optional<VoiceDescription>> parsed = QtConcurrent::blockingMapped(
+        entries, [&prefix](const QString &entry) { return readBundle(prefix + entry); });
     QList<VoiceDescription> voices;
-    QDir dir(folder);
-    const QStringList entries
-        = dir.entryList({QLatin1Char('*') + BundleSuffix}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Name);
-    voices.reserve(entries.size());
-    for (const QString &entry : entries) {
-        if (auto voice = readBundle(dir.filePath(entry))) {
-            voices.append(std::move(*voice));
+    voices.reserve(parsed.size());
+    for (const auto &voice : parsed) {
+        if (voice) {
+            voices.append(*voice);
         }
     }
     return voices;
@@ -120,7 +125,14 @@ QList<VoiceDescription> BundleSpeechSynthesisService::installedVoices()
         [](const VoiceDescription &a, const VoiceDescription &b) { return a.identifier < b.identifier; });
     m_merged = merged;
     m_mergedKey = key;
+    ++m_generation;
     return m_merged;
+}
+
+quint64 BundleSpeechSynthesisService::voicesGeneration() const
+{
+    QMutexLocker locker(&m_scanMutex);
+    return m_generation;
 }
 
 std::optional<QString> BundleSpeechSynthesisService::speechLanguageLocale()

@@ -29,6 +29,7 @@ public:
     ~BundleSpeechSynthesisService() override;
 
     QList<VoiceDescription> installedVoices() override;
+    quint64 voicesGeneration() const override;
     std::optional<QString> speechLanguageLocale() override;
     quint64 startSpeaking(const SpeechRequest &request) override;
     void stopSpeaking() override;
@@ -51,10 +52,11 @@ private:
     void renderFinished(quint64 requestId, const std::optional<PcmAudio> &audio, const QString &error);
     void finishCurrent(bool completed);
 
-    QMutex m_scanMutex;
+    mutable QMutex m_scanMutex;
     QHash<QString, FolderScan> m_folders;
     QList<VoiceDescription> m_merged;
     QStringList m_mergedKey;
+    quint64 m_generation = 0;
 
     quint64 m_nextRequest = 1;
     quint64 m_currentRequest = 0;

@@ -21,6 +21,7 @@ void FakeSpeechSynthesisService::addVoice(const VoiceDescription &voice)
     const auto at = std::lower_bound(m_voices.begin(), m_voices.end(), voice.identifier,
         [](const VoiceDescription &v, const QString &id) { return v.identifier < id; });
     m_voices.insert(at, voice);
+    ++m_generation;
 }
 
 void FakeSpeechSynthesisService::addVoice(const QVariantMap &attributes)
@@ -35,7 +36,9 @@ void FakeSpeechSynthesisService::addVoice(const QVariantMap &attributes)
 
 void FakeSpeechSynthesisService::removeVoice(const QString &identifier)
 {
-    m_voices.removeIf([&](const VoiceDescription &v) { return v.identifier == identifier; });
+    if (m_voices.removeIf([&](const VoiceDescription &v) { return v.identifier == identifier; }) > 0) {
+        ++m_generation;
+    }
 }
 
 quint64 FakeSpeechSynthesisService::startSpeaking(const SpeechRequest &request)

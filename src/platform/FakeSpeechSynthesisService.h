@@ -18,6 +18,7 @@ public:
     explicit FakeSpeechSynthesisService(QObject *parent = nullptr);
 
     QList<VoiceDescription> installedVoices() override { return m_voices; }
+    quint64 voicesGeneration() const override { return m_generation; }
     std::optional<QString> speechLanguageLocale() override { return m_speechLanguage; }
     quint64 startSpeaking(const SpeechRequest &request) override;
     void stopSpeaking() override;
@@ -39,6 +40,7 @@ public:
 
 private:
     QList<VoiceDescription> m_voices;
+    quint64 m_generation = 1;
     std::optional<QString> m_speechLanguage;
     QList<quint64> m_pending;
     QList<SpeechRequest> m_requests;

@@ -46,6 +46,51 @@ std::optional<qint32> storedInteger(const QVariant &v)
 
 } // namespace
 
+struct SpeechSynthesisService::Catalog
+{
+    quint64 generation = 0;
+    QList<VoiceDescription> voices;
+    QHash<QString, qsizetype> positionOf;
+    QList<LocaleComponents> locales; // parallel to voices
+    QStringList available;
+};
+
+std::shared_ptr<const SpeechSynthesisService::Catalog> SpeechSynthesisService::catalog()
+{
+    QList<VoiceDescription> voices = installedVoices();
+    const quint64 generation = voicesGeneration();
+    QMutexLocker locker(&m_catalogMutex);
+    if (m_catalog && m_catalog->generation == generation) {
+        return m_catalog;
+    }
+    auto made = std::make_shared<Catalog>();
+    made->generation = generation;
+    made->voices = std::move(voices);
+    made->positionOf.reserve(made->voices.size());
+    made->locales.reserve(made->voices.size());
+    QHash<QString, qsizetype> positionOfBase;
+    for (qsizetype i = 0; i < made->voices.size(); ++i) {
+        const VoiceDescription &voice = made->voices.at(i);
+        made->positionOf.insert(voice.identifier, i);
+        QString locale = voice.attributes.value(VoiceAttribute::LocaleIdentifier).toString();
+        if (locale.isEmpty()) {
+            locale = voice.attributes.value(VoiceAttribute::Language).toString();
+        }
+        made->locales.append(Locale::componentsFromLocaleIdentifier(locale));
+
+        const QString base = VoiceDescription::baseIdentifierOf(voice.identifier);
+        const auto it = positionOfBase.constFind(base);
+        if (it == positionOfBase.cend()) {
+            positionOfBase.insert(base, made->available.size());
+            made->available.append(voice.identifier);
+        } else if (qualityRank(voice.identifier) > qualityRank(made->available.at(*it))) {
+            made->available[*it] = voice.identifier;
+        }
+    }
+    m_catalog = made;
+    return made;
+}
+
 SpeechSynthesisService::SpeechSynthesisService(QObject *parent)
     : QObject(parent)
 { }
@@ -55,8 +100,9 @@ SpeechSynthesisService::~SpeechSynthesisService() = default;
 QStringList SpeechSynthesisService::voiceIdentifiersInGroups(const QStringList &groups)
 {
     QStringList result;
-    const auto voices = installedVoices();
-    for (const auto &voice : voices) {
+    const auto snapshot = catalog();
+    result.reserve(snapshot->voices.size());
+    for (const auto &voice : snapshot->voices) {
         for (const QString &group : voice.groups) {
             if (groups.contains(group)) {
                 result.append(voice.identifier);
@@ -69,20 +115,7 @@ QStringList SpeechSynthesisService::voiceIdentifiersInGroups(const QStringList &
 
 QStringList SpeechSynthesisService::availableVoices()
 {
-    QStringList result;
-    QHash<QString, qsizetype> positionOfBase;
-    const auto voices = installedVoices();
-    for (const auto &voice : voices) {
-        const QString base = VoiceDescription::baseIdentifierOf(voice.identifier);
-        const auto it = positionOfBase.constFind(base);
-        if (it == positionOfBase.cend()) {
-            positionOfBase.insert(base, result.size());
-            result.append(voice.identifier);
-        } else if (qualityRank(voice.identifier) > qualityRank(result.at(*it))) {
-            result[*it] = voice.identifier;
-        }
-    }
-    return result;
+    return catalog()->available;
 }
 
 QString SpeechSynthesisService::defaultVoice()
@@ -116,19 +149,18 @@ QVariantMap SpeechSynthesisService::attributesForVoice(const QString &identifier
 
 std::optional<VoiceDescription> SpeechSynthesisService::voice(const QString &identifier)
 {
-    const auto voices = installedVoices();
-    for (const auto &voice : voices) {
-        if (voice.identifier == identifier) {
-            return voice;
-        }
+    const auto snapshot = catalog();
+    const auto it = snapshot->positionOf.constFind(identifier);
+    if (it == snapshot->positionOf.cend()) {
+        return std::nullopt;
     }
-    return std::nullopt;
+    return snapshot->voices.at(*it);
 }
 
 QString SpeechSynthesisService::voiceIdentifierForSpec(qint32 creator, qint32 id)
 {
-    const auto voices = installedVoices();
-    for (const auto &voice : voices) {
+    const auto snapshot = catalog();
+    for (const auto &voice : snapshot->voices) {
         if (voice.spec && voice.spec->first == creator && voice.spec->second == id) {
             return voice.identifier;
         }
@@ -149,23 +181,16 @@ QString SpeechSynthesisService::preferredVoiceForLocale(
     }
     const LocaleComponents target = Locale::componentsFromLocaleIdentifier(wanted);
 
-    QHash<QString, VoiceDescription> byIdentifier;
-    for (auto &voice : installedVoices()) {
-        byIdentifier.insert(voice.identifier, voice);
-    }
-
+    const auto snapshot = catalog();
     QString best;
     std::tuple<int, qint64, int> bestScore {0, 0, 0};
     for (const QString &identifier : identifiers) {
-        const auto it = byIdentifier.constFind(identifier);
-        if (it == byIdentifier.cend()) {
+        const auto position = snapshot->positionOf.constFind(identifier);
+        if (position == snapshot->positionOf.cend()) {
             continue;
         }
-        QString voiceLocale = it->attributes.value(VoiceAttribute::LocaleIdentifier).toString();
-        if (voiceLocale.isEmpty()) {
-            voiceLocale = it->attributes.value(VoiceAttribute::Language).toString();
-        }
-        const LocaleComponents components = Locale::componentsFromLocaleIdentifier(voiceLocale);
+        const VoiceDescription &voice = snapshot->voices.at(*position);
+        const LocaleComponents &components = snapshot->locales.at(*position);
         if (components.languageCode.isEmpty()
             || components.languageCode.compare(target.languageCode, Qt::CaseInsensitive) != 0) {
             continue;
@@ -173,7 +198,8 @@ QString SpeechSynthesisService::preferredVoiceForLocale(
         const int localeScore
             = components.countryCode.compare(target.countryCode, Qt::CaseInsensitive) == 0 ? 2 : 1;
         const std::tuple<int, qint64, int> score {localeScore,
-            it->attributes.value(VoiceAttribute::RelativeDesirability).toLongLong(), qualityRank(identifier)};
+            voice.attributes.value(VoiceAttribute::RelativeDesirability).toLongLong(),
+            qualityRank(identifier)};
         if (best.isEmpty() || score > bestScore) {
             best = identifier;
             bestScore = score;

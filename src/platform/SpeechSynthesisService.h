@@ -5,9 +5,11 @@
 
 #include "VoiceDescription.h"
 
+#include <QMutex>
 #include <QObject>
 #include <QStringList>
 
+#include <memory>
 #include <optional>
 
 namespace Cadenza::Platform {
@@ -46,6 +48,8 @@ public:
 
     /// Every installed voice, each identifier once, ordered by identifier.
     [[nodiscard]] virtual QList<VoiceDescription> installedVoices() = 0;
+    /// Changes whenever installedVoices() answers differently; lets the choices below be kept.
+    [[nodiscard]] virtual quint64 voicesGeneration() const = 0;
     /// The locale speech should use, when the user chose one.
     [[nodiscard]] virtual std::optional<QString> speechLanguageLocale() = 0;
 
@@ -82,6 +86,14 @@ public:
 
 Q_SIGNALS:
     void speakingFinished(quint64 requestId, bool completed);
+
+private:
+    struct Catalog;
+    /// The installed voices with what is derived from them, made again only when they change.
+    std::shared_ptr<const Catalog> catalog();
+
+    QMutex m_catalogMutex;
+    std::shared_ptr<const Catalog> m_catalog;
 };
 
 } // namespace Cadenza::Platform
