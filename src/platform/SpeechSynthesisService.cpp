@@ -52,7 +52,10 @@ struct SpeechSynthesisService::Catalog
     QList<VoiceDescription> voices;
     QHash<QString, qsizetype> positionOf;
     QList<LocaleComponents> locales; // parallel to voices
+    QList<qint64> desirability; // parallel to voices
     QStringList available;
+    // Answers of voiceIdentifiersInGroups(), filled on demand; guarded by m_catalogMutex.
+    mutable QHash<QStringList, QStringList> byGroups;
 };
 
 std::shared_ptr<const SpeechSynthesisService::Catalog> SpeechSynthesisService::catalog()
@@ -77,6 +80,7 @@ std::shared_ptr<const SpeechSynthesisService::Catalog> SpeechSynthesisService::c
             locale = voice.attributes.value(VoiceAttribute::Language).toString();
         }
         made->locales.append(Locale::componentsFromLocaleIdentifier(locale));
+        made->desirability.append(voice.attributes.value(VoiceAttribute::RelativeDesirability).toLongLong());
 
         const QString base = VoiceDescription::baseIdentifierOf(voice.identifier);
         const auto it = positionOfBase.constFind(base);
@@ -99,8 +103,14 @@ SpeechSynthesisService::~SpeechSynthesisService() = default;
 
 QStringList SpeechSynthesisService::voiceIdentifiersInGroups(const QStringList &groups)
 {
-    QStringList result;
     const auto snapshot = catalog();
+    {
+        QMutexLocker locker(&m_catalogMutex);
+        if (auto it = snapshot->byGroups.constFind(groups); it != snapshot->byGroups.cend()) {
+            return *it;
+        }
+    }
+    QStringList result;
     result.reserve(snapshot->voices.size());
     for (const auto &voice : snapshot->voices) {
         for (const QString &group : voice.groups) {
@@ -110,6 +120,8 @@ QStringList SpeechSynthesisService::voiceIdentifiersInGroups(const QStringList &
             }
         }
     }
+    QMutexLocker locker(&m_catalogMutex);
+    snapshot->byGroups.insert(groups, result);
     return result;
 }
 
@@ -189,7 +201,6 @@ QString SpeechSynthesisService::preferredVoiceForLocale(
         if (position == snapshot->positionOf.cend()) {
             continue;
         }
-        const VoiceDescription &voice = snapshot->voices.at(*position);
         const LocaleComponents &components = snapshot->locales.at(*position);
         if (components.languageCode.isEmpty()
             || components.languageCode.compare(target.languageCode, Qt::CaseInsensitive) != 0) {
@@ -197,9 +208,8 @@ QString SpeechSynthesisService::preferredVoiceForLocale(
         }
         const int localeScore
             = components.countryCode.compare(target.countryCode, Qt::CaseInsensitive) == 0 ? 2 : 1;
-        const std::tuple<int, qint64, int> score {localeScore,
-            voice.attributes.value(VoiceAttribute::RelativeDesirability).toLongLong(),
-            qualityRank(identifier)};
+        const std::tuple<int, qint64, int> score {
+            localeScore, snapshot->desirability.at(*position), qualityRank(identifier)};
         if (best.isEmpty() || score > bestScore) {
             best = identifier;
             bestScore = score;
