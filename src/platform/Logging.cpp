@@ -7,5 +7,7 @@ Q_LOGGING_CATEGORY(lcVoices, "cadenza.voices", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcSpeech, "cadenza.speech", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcLocale, "cadenza.locale", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcLocalization, "cadenza.localization", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcNotifications, "cadenza.notifications", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcPorts, "cadenza.ports", QtInfoMsg)
 
 } // namespace Cadenza::Platform

@@ -1,6 +1,8 @@
 #include "Services.h"
 
 #include "BundleSpeechSynthesisService.h"
+#include "DBusNotificationCenter.h"
+#include "UnixMessagePortService.h"
 #include "EnvironmentUserLocaleService.h"
 #include "FilePreferencesStore.h"
 
@@ -16,6 +18,8 @@ struct Registry
     std::shared_ptr<PreferencesStore> preferences;
     std::shared_ptr<SpeechSynthesisService> speechSynthesis;
     std::shared_ptr<UserLocaleService> userLocale;
+    std::shared_ptr<MessagePortService> messagePorts;
+    std::shared_ptr<DistributedNotificationCenter> notifications;
 };
 
 Registry &registry()
@@ -61,6 +65,16 @@ UserLocaleService &Services::userLocale()
     return serviceOf<UserLocaleService, EnvironmentUserLocaleService>(&Registry::userLocale);
 }
 
+MessagePortService &Services::messagePorts()
+{
+    return serviceOf<MessagePortService, UnixMessagePortService>(&Registry::messagePorts);
+}
+
+DistributedNotificationCenter &Services::notifications()
+{
+    return serviceOf<DistributedNotificationCenter, DBusNotificationCenter>(&Registry::notifications);
+}
+
 void Services::setPreferences(std::shared_ptr<PreferencesStore> store)
 {
     replace(&Registry::preferences, std::move(store));
@@ -74,6 +88,20 @@ void Services::setSpeechSynthesis(std::shared_ptr<SpeechSynthesisService> servic
 void Services::setUserLocale(std::shared_ptr<UserLocaleService> service)
 {
     replace(&Registry::userLocale, std::move(service));
+}
+
+} // namespace Cadenza::Platform
+
+namespace Cadenza::Platform {
+
+void Services::setMessagePorts(std::shared_ptr<MessagePortService> service)
+{
+    replace(&Registry::messagePorts, std::move(service));
+}
+
+void Services::setNotifications(std::shared_ptr<DistributedNotificationCenter> center)
+{
+    replace(&Registry::notifications, std::move(center));
 }
 
 } // namespace Cadenza::Platform

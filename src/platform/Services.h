@@ -7,6 +7,8 @@
 
 namespace Cadenza::Platform {
 
+class DistributedNotificationCenter;
+class MessagePortService;
 class PreferencesStore;
 class SpeechSynthesisService;
 class UserLocaleService;
@@ -21,11 +23,15 @@ public:
     static PreferencesStore &preferences();
     static SpeechSynthesisService &speechSynthesis();
     static UserLocaleService &userLocale();
+    static MessagePortService &messagePorts();
+    static DistributedNotificationCenter &notifications();
 
     /// Replaces a service; passing nullptr returns to the Linux implementation.
     static void setPreferences(std::shared_ptr<PreferencesStore> store);
     static void setSpeechSynthesis(std::shared_ptr<SpeechSynthesisService> service);
     static void setUserLocale(std::shared_ptr<UserLocaleService> service);
+    static void setMessagePorts(std::shared_ptr<MessagePortService> service);
+    static void setNotifications(std::shared_ptr<DistributedNotificationCenter> center);
 };
 
 } // namespace Cadenza::Platform

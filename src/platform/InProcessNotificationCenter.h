@@ -1,0 +1,35 @@
+#ifndef CADENZA_PLATFORM_INPROCESSNOTIFICATIONCENTER_H
+#define CADENZA_PLATFORM_INPROCESSNOTIFICATIONCENTER_H
+
+#include "DistributedNotificationCenter.h"
+
+namespace Cadenza::Platform {
+
+/// Notifications within this process only, for tests; it remembers what was posted.
+class CADENZACORE_EXPORT InProcessNotificationCenter final : public DistributedNotificationCenter
+{
+    Q_OBJECT
+public:
+    struct Posted {
+        QString name;
+        QString object;
+        QVariantMap userInfo;
+    };
+
+    using DistributedNotificationCenter::DistributedNotificationCenter;
+
+    void postNotification(const QString &name, const QString &object = QString(),
+        const QVariantMap &userInfo = QVariantMap()) override;
+
+    /// Delivers a notification as if another process had posted it.
+    void receiveFromOtherProcess(const QString &name, const QString &object = QString(),
+        const QVariantMap &userInfo = QVariantMap());
+    [[nodiscard]] QList<Posted> posted() const { return m_posted; }
+
+private:
+    QList<Posted> m_posted;
+};
+
+} // namespace Cadenza::Platform
+
+#endif

@@ -1,0 +1,417 @@
+#include "KeyedArchive.h"
+
+#include <QCborStreamReader>
+#include <QCborStreamWriter>
+#include <QDateTime>
+#include <QTimeZone>
+
+namespace Cadenza::Platform {
+
+const QString KeyedArchive::RootKey = QStringLiteral("root");
+
+namespace {
+
+constexpr quint64 EpochDateTag = 1;
+
+class Writer
+{
+public:
+    explicit Writer(QByteArray *out)
+        : m_cbor(out)
+    {
+    }
+
+    bool archive(const QVariant &root, QString *error)
+    {
+        m_cbor.startMap(1);
+        m_cbor.append(KeyedArchive::RootKey);
+        if (!write(root, error)) {
+            return false;
+        }
+        m_cbor.endMap();
+        return true;
+    }
+
+    bool write(const QVariant &value, QString *error, int depth = 0)
+    {
+        if (depth > 64) {
+            *error = QStringLiteral("value nested too deeply to archive");
+            return false;
+        }
+        switch (value.typeId()) {
+        case QMetaType::Bool:
+            m_cbor.append(value.toBool());
+            return true;
+        case QMetaType::Int:
+        case QMetaType::LongLong:
+        case QMetaType::Long:
+        case QMetaType::Short:
+            m_cbor.append(qint64(value.toLongLong()));
+            return true;
+        case QMetaType::UInt:
+        case QMetaType::ULongLong:
+        case QMetaType::ULong:
+        case QMetaType::UShort:
+            m_cbor.append(quint64(value.toULongLong()));
+            return true;
+        case QMetaType::Double:
+        case QMetaType::Float:
+            m_cbor.append(value.toDouble());
+            return true;
+        case QMetaType::QString:
+            m_cbor.append(value.toString());
+            return true;
+        case QMetaType::QByteArray:
+            m_cbor.append(value.toByteArray());
+            return true;
+        case QMetaType::QDateTime:
+            m_cbor.append(QCborTag(EpochDateTag));
+            m_cbor.append(double(value.toDateTime().toMSecsSinceEpoch()) / 1000.0);
+            return true;
+        case QMetaType::QStringList:
+        case QMetaType::QVariantList: {
+            const QVariantList list = value.toList();
+            m_cbor.startArray(quint64(list.size()));
+            for (const QVariant &item : list) {
+                if (!write(item, error, depth + 1)) {
+                    return false;
+                }
+            }
+            m_cbor.endArray();
+            return true;
+        }
+        case QMetaType::QVariantMap:
+        case QMetaType::QVariantHash: {
+            const QVariantMap map = value.toMap();
+            m_cbor.startMap(quint64(map.size()));
+            for (auto it = map.cbegin(); it != map.cend(); ++it) {
+                m_cbor.append(it.key());
+                if (!write(it.value(), error, depth + 1)) {
+                    return false;
+                }
+            }
+            m_cbor.endMap();
+            return true;
+        }
+        default:
+            *error = QStringLiteral("cannot archive a value of type %1")
+                         .arg(value.isValid() ? QString::fromLatin1(value.typeName()) : QStringLiteral("null"));
+            return false;
+        }
+    }
+
+private:
+    QCborStreamWriter m_cbor;
+};
+
+class Reader
+{
+public:
+    Reader(const QByteArray &bytes, ArchiveClasses allowed, const KeyedArchive::Limits &limits)
+        : m_cbor(bytes)
+        , m_allowed(allowed)
+        , m_limits(limits)
+    {
+    }
+
+    std::optional<QVariant> document(QString *error)
+    {
+        std::optional<QVariant> root;
+        if (m_cbor.type() != QCborStreamReader::Map) {
+            return fail(error, QStringLiteral("the archive is not a keyed archive"));
+        }
+        if (m_cbor.isLengthKnown() && m_cbor.length() > 16) {
+            return fail(error, QStringLiteral("the archive has too many top-level keys"));
+        }
+        m_cbor.enterContainer();
+        while (m_cbor.lastError() == QCborError::NoError && m_cbor.hasNext()) {
+            const auto key = readText(error);
+            if (!key) {
+                return std::nullopt;
+            }
+            if (*key == KeyedArchive::RootKey && !root) {
+                root = value(1, error);
+                if (!root) {
+                    return std::nullopt;
+                }
+            } else if (!skip(error)) {
+                return std::nullopt;
+            }
+        }
+        if (m_cbor.lastError() != QCborError::NoError) {
+            return fail(error, m_cbor.lastError().toString());
+        }
+        m_cbor.leaveContainer();
+        if (m_cbor.lastError() != QCborError::NoError) {
+            return fail(error, m_cbor.lastError().toString());
+        }
+        if (!root) {
+            return fail(error, QStringLiteral("the archive has no root object"));
+        }
+        return root;
+    }
+
+private:
+    std::optional<QVariant> fail(QString *error, const QString &message)
+    {
+        if (error && error->isEmpty()) {
+            *error = message;
+        }
+        return std::nullopt;
+    }
+
+    bool count(QString *error)
+    {
+        if (++m_items > m_limits.maximumItems) {
+            fail(error, QStringLiteral("the archive holds more than %1 values").arg(m_limits.maximumItems));
+            return false;
+        }
+        return true;
+    }
+
+    bool allowed(ArchiveClass kind, const char *name, QString *error)
+    {
+        if (!m_allowed.testFlag(kind)) {
+            fail(error, QStringLiteral("value of class '%1' is not allowed").arg(QLatin1String(name)));
+            return false;
+        }
+        return true;
+    }
+
+    // Reads a text or byte string in chunks, refusing it as soon as it grows past the limit.
+    template<typename Result, typename ReadChunk>
+    std::optional<Result> readChunks(ReadChunk readChunk, QString *error)
+    {
+        if (m_cbor.isLengthKnown() && m_cbor.length() > quint64(m_limits.maximumStringBytes)) {
+            fail(error, QStringLiteral("a string is longer than %1 bytes").arg(m_limits.maximumStringBytes));
+            return std::nullopt;
+        }
+        Result result;
+        auto chunk = readChunk();
+        while (chunk.status == QCborStreamReader::Ok) {
+            result += chunk.data;
+            if (result.size() > m_limits.maximumStringBytes) {
+                fail(error, QStringLiteral("a string is longer than %1 bytes").arg(m_limits.maximumStringBytes));
+                return std::nullopt;
+            }
+            chunk = readChunk();
+        }
+        if (chunk.status == QCborStreamReader::Error) {
+            fail(error, m_cbor.lastError().toString());
+            return std::nullopt;
+        }
+        return result;
+    }
+
+    std::optional<QString> readText(QString *error)
+    {
+        if (m_cbor.type() != QCborStreamReader::String) {
+            fail(error, QStringLiteral("a dictionary key is not a string"));
+            return std::nullopt;
+        }
+        return readChunks<QString>([this] { return m_cbor.readString(); }, error);
+    }
+
+    bool skip(QString *error)
+    {
+        // Unknown top-level entries are checked like the root, then dropped.
+        return value(1, error).has_value();
+    }
+
+    std::optional<QVariant> value(int depth, QString *error)
+    {
+        if (depth > m_limits.maximumDepth) {
+            return fail(error, QStringLiteral("the archive is nested deeper than %1").arg(m_limits.maximumDepth));
+        }
+        if (!count(error)) {
+            return std::nullopt;
+        }
+        switch (m_cbor.type()) {
+        case QCborStreamReader::UnsignedInteger: {
+            if (!allowed(ArchiveClass::Number, "number", error)) {
+                return std::nullopt;
+            }
+            const quint64 v = m_cbor.toUnsignedInteger();
+            m_cbor.next();
+            if (v <= quint64(std::numeric_limits<qint64>::max())) {
+                return QVariant::fromValue(qint64(v));
+            }
+            return QVariant::fromValue(v);
+        }
+        case QCborStreamReader::NegativeInteger: {
+            if (!allowed(ArchiveClass::Number, "number", error)) {
+                return std::nullopt;
+            }
+            const quint64 magnitude = quint64(m_cbor.toNegativeInteger());
+            m_cbor.next();
+            if (magnitude == 0 || magnitude > quint64(std::numeric_limits<qint64>::max()) + 1) {
+                return fail(error, QStringLiteral("an integer is out of range"));
+            }
+            return QVariant::fromValue(qint64(0 - magnitude));
+        }
+        case QCborStreamReader::Float16:
+        case QCborStreamReader::Float:
+        case QCborStreamReader::Double: {
+            if (!allowed(ArchiveClass::Number, "number", error)) {
+                return std::nullopt;
+            }
+            double v = 0;
+            if (m_cbor.isFloat16()) {
+                v = double(float(m_cbor.toFloat16()));
+            } else if (m_cbor.isFloat()) {
+                v = double(m_cbor.toFloat());
+            } else {
+                v = m_cbor.toDouble();
+            }
+            m_cbor.next();
+            return v;
+        }
+        case QCborStreamReader::SimpleType: {
+            const QCborSimpleType simple = m_cbor.toSimpleType();
+            if (simple != QCborSimpleType::True && simple != QCborSimpleType::False) {
+                return fail(error, QStringLiteral("null and undefined values are not allowed"));
+            }
+            if (!allowed(ArchiveClass::Number, "number", error)) {
+                return std::nullopt;
+            }
+            m_cbor.next();
+            return simple == QCborSimpleType::True;
+        }
+        case QCborStreamReader::String: {
+            if (!allowed(ArchiveClass::String, "string", error)) {
+                return std::nullopt;
+            }
+            auto s = readText(error);
+            return s ? std::optional<QVariant>(*s) : std::nullopt;
+        }
+        case QCborStreamReader::ByteArray: {
+            if (!allowed(ArchiveClass::Data, "data", error)) {
+                return std::nullopt;
+            }
+            auto d = readChunks<QByteArray>([this] { return m_cbor.readByteArray(); }, error);
+            return d ? std::optional<QVariant>(*d) : std::nullopt;
+        }
+        case QCborStreamReader::Tag: {
+            if (quint64(m_cbor.toTag()) != EpochDateTag) {
+                return fail(error, QStringLiteral("tagged values other than dates are not allowed"));
+            }
+            if (!allowed(ArchiveClass::Date, "date", error)) {
+                return std::nullopt;
+            }
+            m_cbor.next();
+            double seconds = 0;
+            if (m_cbor.isDouble()) {
+                seconds = m_cbor.toDouble();
+            } else if (m_cbor.isUnsignedInteger()) {
+                seconds = double(m_cbor.toUnsignedInteger());
+            } else {
+                return fail(error, QStringLiteral("a date is not a number of seconds"));
+            }
+            m_cbor.next();
+            if (!(seconds > -1e12 && seconds < 1e12)) {
+                return fail(error, QStringLiteral("a date is out of range"));
+            }
+            return QDateTime::fromMSecsSinceEpoch(qint64(seconds * 1000.0), Qt::UTC);
+        }
+        case QCborStreamReader::Array: {
+            if (!allowed(ArchiveClass::Array, "array", error)) {
+                return std::nullopt;
+            }
+            if (m_cbor.isLengthKnown() && m_cbor.length() > quint64(m_limits.maximumItems)) {
+                return fail(error, QStringLiteral("an array is longer than %1").arg(m_limits.maximumItems));
+            }
+            QVariantList list;
+            if (m_cbor.isLengthKnown()) {
+                list.reserve(qsizetype(qMin<quint64>(m_cbor.length(), 1024)));
+            }
+            if (!m_cbor.enterContainer()) {
+                return fail(error, m_cbor.lastError().toString());
+            }
+            while (m_cbor.lastError() == QCborError::NoError && m_cbor.hasNext()) {
+                auto item = value(depth + 1, error);
+                if (!item) {
+                    return std::nullopt;
+                }
+                list.append(*item);
+            }
+            if (m_cbor.lastError() != QCborError::NoError || !m_cbor.leaveContainer()) {
+                return fail(error, m_cbor.lastError().toString());
+            }
+            return list;
+        }
+        case QCborStreamReader::Map: {
+            if (!allowed(ArchiveClass::Dictionary, "dictionary", error)) {
+                return std::nullopt;
+            }
+            if (m_cbor.isLengthKnown() && m_cbor.length() > quint64(m_limits.maximumItems)) {
+                return fail(error, QStringLiteral("a dictionary is larger than %1").arg(m_limits.maximumItems));
+            }
+            QVariantMap map;
+            if (!m_cbor.enterContainer()) {
+                return fail(error, m_cbor.lastError().toString());
+            }
+            while (m_cbor.lastError() == QCborError::NoError && m_cbor.hasNext()) {
+                if (!count(error)) {
+                    return std::nullopt;
+                }
+                auto key = readText(error);
+                if (!key) {
+                    return std::nullopt;
+                }
+                auto item = value(depth + 1, error);
+                if (!item) {
+                    return std::nullopt;
+                }
+                map.insert(*key, *item);
+            }
+            if (m_cbor.lastError() != QCborError::NoError || !m_cbor.leaveContainer()) {
+                return fail(error, m_cbor.lastError().toString());
+            }
+            return map;
+        }
+        case QCborStreamReader::Invalid:
+            return fail(error,
+                m_cbor.lastError() == QCborError::NoError ? QStringLiteral("the archive ends early")
+                                                          : m_cbor.lastError().toString());
+        }
+        return fail(error, QStringLiteral("unknown value in the archive"));
+    }
+
+    QCborStreamReader m_cbor;
+    ArchiveClasses m_allowed;
+    KeyedArchive::Limits m_limits;
+    qsizetype m_items = 0;
+};
+
+} // namespace
+
+std::optional<QByteArray> KeyedArchive::encode(const QVariant &root, QString *error)
+{
+    QByteArray out;
+    QString message;
+    {
+        Writer writer(&out);
+        if (!writer.archive(root, &message)) {
+            if (error) {
+                *error = message;
+            }
+            return std::nullopt;
+        }
+    }
+    return out;
+}
+
+std::optional<QVariant> KeyedArchive::decode(const QByteArray &bytes, ArchiveClasses allowed, QString *error,
+    const Limits &limits)
+{
+    if (bytes.isEmpty()) {
+        if (error) {
+            *error = QStringLiteral("the archive is empty");
+        }
+        return std::nullopt;
+    }
+    Reader reader(bytes, allowed, limits);
+    return reader.document(error);
+}
+
+} // namespace Cadenza::Platform

@@ -1,0 +1,32 @@
+#ifndef CADENZA_PLATFORM_UNIXMESSAGEPORTSERVICE_H
+#define CADENZA_PLATFORM_UNIXMESSAGEPORTSERVICE_H
+
+#include "MessagePort.h"
+
+namespace Cadenza::Platform {
+
+/**
+ * Message ports as Unix domain sockets in Paths::runtimeFolder() (mode 0700), one socket per port
+ * name. A remote port keeps one connection open; it is valid while that connection stands. A local
+ * port serves only processes of its own user, each on a connection of its own.
+ */
+class CADENZACORE_EXPORT UnixMessagePortService final : public MessagePortService
+{
+public:
+    std::unique_ptr<RemoteMessagePort> createRemotePort(const QString &name) override;
+    std::unique_ptr<LocalMessagePort> createLocalPort(const QString &name, LocalMessagePort::Handler handler,
+        const LocalPortLimits &limits = LocalPortLimits()) override;
+
+    /// A local port on a listening socket handed over by the service manager (socket activation).
+    [[nodiscard]] std::unique_ptr<LocalMessagePort> adoptLocalPort(const QString &name, int listeningDescriptor,
+        LocalMessagePort::Handler handler, const LocalPortLimits &limits = LocalPortLimits());
+
+    /// The socket file of the port named @p name.
+    [[nodiscard]] static QString socketPath(const QString &name);
+    /// Makes the runtime folder with mode 0700; false when it cannot be made private.
+    [[nodiscard]] static bool ensureRuntimeFolder();
+};
+
+} // namespace Cadenza::Platform
+
+#endif
