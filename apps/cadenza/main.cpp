@@ -1,5 +1,6 @@
 // cadenza: Cadenza's command-line tool.
 
+#include "PostCommand.h"
 #include "SayCommand.h"
 #include "VoicesCommand.h"
 
@@ -17,6 +18,7 @@ void printUsage(FILE *to)
                "Commands:\n"
                "  voices   list the installed voices\n"
                "  say      speak a text, or write it to a WAV file\n"
+               "  post     post a notification to every process of the session\n"
                "\n"
                "Run 'cadenza COMMAND --help' for the options of a command.\n",
         to);
@@ -46,6 +48,9 @@ int main(int argc, char *argv[])
     }
     if (command == u"say") {
         return SayCommand::run(arguments);
+    }
+    if (command == u"post") {
+        return PostCommand::run(arguments);
     }
     std::fprintf(stderr, "cadenza: unknown command '%s'\n\n", qPrintable(command));
     printUsage(stderr);

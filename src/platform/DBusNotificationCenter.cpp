@@ -42,7 +42,8 @@ DBusNotificationCenter::~DBusNotificationCenter()
     }
 }
 
-void DBusNotificationCenter::postNotification(const QString &name, const QString &object, const QVariantMap &userInfo)
+void DBusNotificationCenter::postNotification(
+    const QString &name, const QString &object, const QVariantMap &userInfo)
 {
     // This process hears its own notifications from here; its own signals coming back are dropped.
     QMetaObject::invokeMethod(
@@ -73,8 +74,10 @@ void DBusNotificationCenter::receive(const QDBusMessage &message)
     }
     const QVariantList arguments = message.arguments();
     if (arguments.size() != 3 || arguments.at(0).typeId() != QMetaType::QString
-        || arguments.at(1).typeId() != QMetaType::QString || arguments.at(2).typeId() != QMetaType::QByteArray) {
-        qCWarning(lcNotifications, "Ignoring a malformed notification from %s", qPrintable(message.service()));
+        || arguments.at(1).typeId() != QMetaType::QString
+        || arguments.at(2).typeId() != QMetaType::QByteArray) {
+        qCWarning(
+            lcNotifications, "Ignoring a malformed notification from %s", qPrintable(message.service()));
         return;
     }
     QVariantMap userInfo;
@@ -85,8 +88,9 @@ void DBusNotificationCenter::receive(const QDBusMessage &message)
             ArchiveClasses(ArchiveClass::Dictionary) | ArchiveClass::Array | PropertyListLeaves, &error,
             notificationLimits());
         if (!decoded || decoded->typeId() != QMetaType::QVariantMap) {
-            qCWarning(lcNotifications, "Ignoring notification %s from %s: %s", qPrintable(arguments.at(0).toString()),
-                qPrintable(message.service()), qPrintable(decoded ? QStringLiteral("not a dictionary") : error));
+            qCWarning(lcNotifications, "Ignoring notification %s from %s: %s",
+                qPrintable(arguments.at(0).toString()), qPrintable(message.service()),
+                qPrintable(decoded ? QStringLiteral("not a dictionary") : error));
             return;
         }
         userInfo = decoded->toMap();

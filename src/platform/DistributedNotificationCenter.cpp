@@ -4,8 +4,7 @@ namespace Cadenza::Platform {
 
 DistributedNotificationCenter::DistributedNotificationCenter(QObject *parent)
     : QObject(parent)
-{
-}
+{ }
 
 DistributedNotificationCenter::~DistributedNotificationCenter() = default;
 

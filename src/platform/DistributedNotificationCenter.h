@@ -22,8 +22,8 @@ public:
     ~DistributedNotificationCenter() override;
 
     /// Posts @p name; @p userInfo holds property-list values.
-    virtual void postNotification(const QString &name, const QString &object = QString(),
-        const QVariantMap &userInfo = QVariantMap())
+    virtual void postNotification(
+        const QString &name, const QString &object = QString(), const QVariantMap &userInfo = QVariantMap())
         = 0;
 
 Q_SIGNALS:

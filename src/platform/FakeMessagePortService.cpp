@@ -2,7 +2,8 @@
 
 namespace Cadenza::Platform {
 
-struct FakeMessagePortService::State {
+struct FakeMessagePortService::State
+{
     QHash<QString, LocalMessagePort::Handler *> ports;
     QList<SentMessage> sent;
     int sendStatus = MessagePortStatus::Success;
@@ -45,8 +46,7 @@ public:
         : m_name(name)
         , m_target(state->ports.value(name))
         , m_state(std::move(state))
-    {
-    }
+    { }
 
     QString name() const override { return m_name; }
     bool isValid() override { return m_target && m_state->ports.value(m_name) == m_target; }
@@ -79,8 +79,7 @@ private:
 
 FakeMessagePortService::FakeMessagePortService()
     : m_state(std::make_shared<State>())
-{
-}
+{ }
 
 FakeMessagePortService::~FakeMessagePortService() = default;
 
@@ -92,8 +91,8 @@ std::unique_ptr<RemoteMessagePort> FakeMessagePortService::createRemotePort(cons
     return std::make_unique<FakeRemotePort>(name, m_state);
 }
 
-std::unique_ptr<LocalMessagePort> FakeMessagePortService::createLocalPort(const QString &name,
-    LocalMessagePort::Handler handler, const LocalPortLimits &)
+std::unique_ptr<LocalMessagePort> FakeMessagePortService::createLocalPort(
+    const QString &name, LocalMessagePort::Handler handler, const LocalPortLimits &)
 {
     if (!isValidPortName(name) || m_state->ports.contains(name)) {
         return nullptr;

@@ -15,7 +15,8 @@ namespace Cadenza::Platform {
 class CADENZACORE_EXPORT FakeMessagePortService final : public MessagePortService
 {
 public:
-    struct SentMessage {
+    struct SentMessage
+    {
         QString portName;
         qint32 messageId;
         QByteArray data;

@@ -4,15 +4,15 @@
 
 namespace Cadenza::Platform {
 
-void InProcessNotificationCenter::postNotification(const QString &name, const QString &object,
-    const QVariantMap &userInfo)
+void InProcessNotificationCenter::postNotification(
+    const QString &name, const QString &object, const QVariantMap &userInfo)
 {
     m_posted.append({name, object, userInfo});
     receiveFromOtherProcess(name, object, userInfo);
 }
 
-void InProcessNotificationCenter::receiveFromOtherProcess(const QString &name, const QString &object,
-    const QVariantMap &userInfo)
+void InProcessNotificationCenter::receiveFromOtherProcess(
+    const QString &name, const QString &object, const QVariantMap &userInfo)
 {
     QMetaObject::invokeMethod(
         this, [this, name, object, userInfo] { Q_EMIT notificationPosted(name, object, userInfo); },

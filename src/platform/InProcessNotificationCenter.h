@@ -10,7 +10,8 @@ class CADENZACORE_EXPORT InProcessNotificationCenter final : public DistributedN
 {
     Q_OBJECT
 public:
-    struct Posted {
+    struct Posted
+    {
         QString name;
         QString object;
         QVariantMap userInfo;
@@ -22,8 +23,8 @@ public:
         const QVariantMap &userInfo = QVariantMap()) override;
 
     /// Delivers a notification as if another process had posted it.
-    void receiveFromOtherProcess(const QString &name, const QString &object = QString(),
-        const QVariantMap &userInfo = QVariantMap());
+    void receiveFromOtherProcess(
+        const QString &name, const QString &object = QString(), const QVariantMap &userInfo = QVariantMap());
     [[nodiscard]] QList<Posted> posted() const { return m_posted; }
 
 private:

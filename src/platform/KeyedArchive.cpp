@@ -18,8 +18,7 @@ class Writer
 public:
     explicit Writer(QByteArray *out)
         : m_cbor(out)
-    {
-    }
+    { }
 
     bool archive(const QVariant &root, QString *error)
     {
@@ -94,8 +93,9 @@ public:
             return true;
         }
         default:
-            *error = QStringLiteral("cannot archive a value of type %1")
-                         .arg(value.isValid() ? QString::fromLatin1(value.typeName()) : QStringLiteral("null"));
+            *error
+                = QStringLiteral("cannot archive a value of type %1")
+                      .arg(value.isValid() ? QString::fromLatin1(value.typeName()) : QStringLiteral("null"));
             return false;
         }
     }
@@ -111,8 +111,7 @@ public:
         : m_cbor(bytes)
         , m_allowed(allowed)
         , m_limits(limits)
-    {
-    }
+    { }
 
     std::optional<QVariant> document(QString *error)
     {
@@ -191,7 +190,8 @@ private:
         while (chunk.status == QCborStreamReader::Ok) {
             result += chunk.data;
             if (result.size() > m_limits.maximumStringBytes) {
-                fail(error, QStringLiteral("a string is longer than %1 bytes").arg(m_limits.maximumStringBytes));
+                fail(error,
+                    QStringLiteral("a string is longer than %1 bytes").arg(m_limits.maximumStringBytes));
                 return std::nullopt;
             }
             chunk = readChunk();
@@ -221,7 +221,8 @@ private:
     std::optional<QVariant> value(int depth, QString *error)
     {
         if (depth > m_limits.maximumDepth) {
-            return fail(error, QStringLiteral("the archive is nested deeper than %1").arg(m_limits.maximumDepth));
+            return fail(
+                error, QStringLiteral("the archive is nested deeper than %1").arg(m_limits.maximumDepth));
         }
         if (!count(error)) {
             return std::nullopt;
@@ -344,7 +345,8 @@ private:
                 return std::nullopt;
             }
             if (m_cbor.isLengthKnown() && m_cbor.length() > quint64(m_limits.maximumItems)) {
-                return fail(error, QStringLiteral("a dictionary is larger than %1").arg(m_limits.maximumItems));
+                return fail(
+                    error, QStringLiteral("a dictionary is larger than %1").arg(m_limits.maximumItems));
             }
             QVariantMap map;
             if (!m_cbor.enterContainer()) {
@@ -401,8 +403,8 @@ std::optional<QByteArray> KeyedArchive::encode(const QVariant &root, QString *er
     return out;
 }
 
-std::optional<QVariant> KeyedArchive::decode(const QByteArray &bytes, ArchiveClasses allowed, QString *error,
-    const Limits &limits)
+std::optional<QVariant> KeyedArchive::decode(
+    const QByteArray &bytes, ArchiveClasses allowed, QString *error, const Limits &limits)
 {
     if (bytes.isEmpty()) {
         if (error) {

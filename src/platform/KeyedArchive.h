@@ -28,7 +28,8 @@ constexpr ArchiveClasses PropertyListLeaves
     = ArchiveClasses(ArchiveClass::String) | ArchiveClass::Number | ArchiveClass::Data | ArchiveClass::Date;
 
 /// What a decoder accepts at most.
-struct CADENZACORE_EXPORT ArchiveLimits {
+struct CADENZACORE_EXPORT ArchiveLimits
+{
     int maximumDepth = 32;
     qsizetype maximumItems = 100000; ///< values in the whole archive
     qsizetype maximumStringBytes = 1 << 20; ///< per string or data value

@@ -20,8 +20,7 @@ QByteArray MessageFrame::encode() const
 
 MessageFrameReader::MessageFrameReader(qsizetype maximumPayload)
     : m_maximumPayload(maximumPayload)
-{
-}
+{ }
 
 bool MessageFrameReader::checkHeader()
 {

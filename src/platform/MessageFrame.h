@@ -13,7 +13,8 @@ namespace Cadenza::Platform {
  * One message on a message-port connection: a 12-byte header (message id, flags, payload length;
  * each 32 bits, big-endian) and the payload.
  */
-struct CADENZACORE_EXPORT MessageFrame {
+struct CADENZACORE_EXPORT MessageFrame
+{
     enum Flag : quint32 {
         ReplyWanted = 1u << 0, ///< the sender waits for a frame with IsReply
         IsReply = 1u << 1,

@@ -24,7 +24,8 @@ constexpr int BecameInvalid = -5;
 } // namespace MessagePortStatus
 
 /// Who sent a message to a local port.
-struct CADENZACORE_EXPORT MessagePeer {
+struct CADENZACORE_EXPORT MessagePeer
+{
     qint64 processId = -1;
     qint64 userId = -1;
 };
@@ -33,7 +34,8 @@ struct CADENZACORE_EXPORT MessagePeer {
 class CADENZACORE_EXPORT RemoteMessagePort
 {
 public:
-    struct Result {
+    struct Result
+    {
         int status = MessagePortStatus::IsInvalid;
         std::optional<QByteArray> reply;
     };
@@ -46,8 +48,8 @@ public:
      * Sends a message and, when @p replyWanted, waits for the answer. Blocks for at most
      * @p sendTimeout seconds to send and @p receiveTimeout seconds for the answer.
      */
-    [[nodiscard]] virtual Result sendRequest(qint32 messageId, const QByteArray &data, double sendTimeout,
-        double receiveTimeout, bool replyWanted)
+    [[nodiscard]] virtual Result sendRequest(
+        qint32 messageId, const QByteArray &data, double sendTimeout, double receiveTimeout, bool replyWanted)
         = 0;
     virtual void invalidate() = 0;
 };
@@ -57,8 +59,8 @@ class CADENZACORE_EXPORT LocalMessagePort
 {
 public:
     /// Answers a message; the answer is sent back only when the sender wants one.
-    using Handler = std::function<std::optional<QByteArray>(qint32 messageId, const QByteArray &data,
-        const MessagePeer &peer)>;
+    using Handler = std::function<std::optional<QByteArray>(
+        qint32 messageId, const QByteArray &data, const MessagePeer &peer)>;
 
     virtual ~LocalMessagePort();
     [[nodiscard]] virtual QString name() const = 0;
@@ -68,7 +70,8 @@ public:
 };
 
 /// Limits a local port keeps against its peers.
-struct CADENZACORE_EXPORT LocalPortLimits {
+struct CADENZACORE_EXPORT LocalPortLimits
+{
     qsizetype maximumFrameBytes = 16 * 1024 * 1024;
     int maximumConnections = 64;
     int maximumPendingRequests = 256; ///< per connection; beyond it the connection is closed

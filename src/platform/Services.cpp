@@ -2,9 +2,9 @@
 
 #include "BundleSpeechSynthesisService.h"
 #include "DBusNotificationCenter.h"
-#include "UnixMessagePortService.h"
 #include "EnvironmentUserLocaleService.h"
 #include "FilePreferencesStore.h"
+#include "UnixMessagePortService.h"
 
 #include <QMutex>
 

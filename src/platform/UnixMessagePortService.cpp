@@ -33,8 +33,7 @@ public:
     UnixRemotePort(const QString &name, std::unique_ptr<QLocalSocket> socket)
         : m_name(name)
         , m_socket(std::move(socket))
-    {
-    }
+    { }
 
     QString name() const override { return m_name; }
 
@@ -72,7 +71,8 @@ public:
             if (m_socket->state() != QLocalSocket::ConnectedState) {
                 return {MessagePortStatus::BecameInvalid, std::nullopt};
             }
-            if (sendDeadline.hasExpired() || !m_socket->waitForBytesWritten(int(sendDeadline.remainingTime()))) {
+            if (sendDeadline.hasExpired()
+                || !m_socket->waitForBytesWritten(int(sendDeadline.remainingTime()))) {
                 if (m_socket->state() != QLocalSocket::ConnectedState) {
                     return {MessagePortStatus::BecameInvalid, std::nullopt};
                 }
@@ -107,7 +107,8 @@ public:
             if (m_socket->state() != QLocalSocket::ConnectedState) {
                 return {MessagePortStatus::BecameInvalid, std::nullopt};
             }
-            if (receiveDeadline.hasExpired() || !m_socket->waitForReadyRead(int(receiveDeadline.remainingTime()))) {
+            if (receiveDeadline.hasExpired()
+                || !m_socket->waitForReadyRead(int(receiveDeadline.remainingTime()))) {
                 if (m_socket->state() != QLocalSocket::ConnectedState) {
                     return {MessagePortStatus::BecameInvalid, std::nullopt};
                 }
@@ -176,7 +177,8 @@ public:
     }
 
 private:
-    struct Connection {
+    struct Connection
+    {
         MessageFrameReader reader;
         MessagePeer peer;
     };
@@ -196,14 +198,15 @@ private:
                 continue;
             }
             if (m_connections.size() >= m_limits.maximumConnections) {
-                qCWarning(lcPorts, "Port %s refused a connection: %d connections are open", qPrintable(m_name),
-                    m_limits.maximumConnections);
+                qCWarning(lcPorts, "Port %s refused a connection: %d connections are open",
+                    qPrintable(m_name), m_limits.maximumConnections);
                 socket->abort();
                 socket->deleteLater();
                 continue;
             }
-            m_connections.insert(socket, {MessageFrameReader(m_limits.maximumFrameBytes),
-                                             {qint64(credentials.pid), qint64(credentials.uid)}});
+            m_connections.insert(socket,
+                {MessageFrameReader(m_limits.maximumFrameBytes),
+                    {qint64(credentials.pid), qint64(credentials.uid)}});
             connect(socket, &QLocalSocket::readyRead, this, [this, socket] { receive(socket); });
             connect(socket, &QLocalSocket::disconnected, this, [this, socket] { drop(socket); });
             if (socket->bytesAvailable() > 0) {
@@ -248,7 +251,8 @@ private:
                 continue; // nobody here asked
             }
             if (++handled > m_limits.maximumPendingRequests) {
-                qCWarning(lcPorts, "Port %s closed a connection that sent too many requests at once", qPrintable(m_name));
+                qCWarning(lcPorts, "Port %s closed a connection that sent too many requests at once",
+                    qPrintable(m_name));
                 socket->abort();
                 drop(socket);
                 return;
@@ -261,12 +265,15 @@ private:
             if ((frame->flags & MessageFrame::ReplyWanted) && m_connections.contains(socket)) {
                 // A client that never reads its answers must not make us hold them without end.
                 if (socket->bytesToWrite() > m_limits.maximumFrameBytes) {
-                    qCWarning(lcPorts, "Port %s closed a connection that does not read its replies", qPrintable(m_name));
+                    qCWarning(lcPorts, "Port %s closed a connection that does not read its replies",
+                        qPrintable(m_name));
                     socket->abort();
                     drop(socket);
                     return;
                 }
-                socket->write(MessageFrame {frame->messageId, MessageFrame::IsReply, reply.value_or(QByteArray())}.encode());
+                socket->write(
+                    MessageFrame {frame->messageId, MessageFrame::IsReply, reply.value_or(QByteArray())}
+                        .encode());
             }
         }
     }
@@ -294,7 +301,9 @@ bool UnixMessagePortService::ensureRuntimeFolder()
         return false;
     }
     const QByteArray path = QFile::encodeName(folder);
-    struct stat st {};
+    struct stat st
+    {
+    };
     if (::lstat(path.constData(), &st) != 0 || !S_ISDIR(st.st_mode) || st.st_uid != ::geteuid()) {
         qCWarning(lcPorts, "The runtime folder %s is not a folder of this user", qPrintable(folder));
         return false;
@@ -323,8 +332,8 @@ std::unique_ptr<RemoteMessagePort> UnixMessagePortService::createRemotePort(cons
     return std::make_unique<UnixRemotePort>(name, std::move(socket));
 }
 
-std::unique_ptr<LocalMessagePort> UnixMessagePortService::createLocalPort(const QString &name,
-    LocalMessagePort::Handler handler, const LocalPortLimits &limits)
+std::unique_ptr<LocalMessagePort> UnixMessagePortService::createLocalPort(
+    const QString &name, LocalMessagePort::Handler handler, const LocalPortLimits &limits)
 {
     if (!isValidPortName(name) || !ensureRuntimeFolder()) {
         return nullptr;
@@ -350,8 +359,8 @@ std::unique_ptr<LocalMessagePort> UnixMessagePortService::createLocalPort(const 
     return port;
 }
 
-std::unique_ptr<LocalMessagePort> UnixMessagePortService::adoptLocalPort(const QString &name, int listeningDescriptor,
-    LocalMessagePort::Handler handler, const LocalPortLimits &limits)
+std::unique_ptr<LocalMessagePort> UnixMessagePortService::adoptLocalPort(const QString &name,
+    int listeningDescriptor, LocalMessagePort::Handler handler, const LocalPortLimits &limits)
 {
     auto port = std::make_unique<UnixLocalPort>(name, std::move(handler), limits);
     if (!port->adopt(listeningDescriptor)) {

@@ -18,8 +18,9 @@ public:
         const LocalPortLimits &limits = LocalPortLimits()) override;
 
     /// A local port on a listening socket handed over by the service manager (socket activation).
-    [[nodiscard]] std::unique_ptr<LocalMessagePort> adoptLocalPort(const QString &name, int listeningDescriptor,
-        LocalMessagePort::Handler handler, const LocalPortLimits &limits = LocalPortLimits());
+    [[nodiscard]] std::unique_ptr<LocalMessagePort> adoptLocalPort(const QString &name,
+        int listeningDescriptor, LocalMessagePort::Handler handler,
+        const LocalPortLimits &limits = LocalPortLimits());
 
     /// The socket file of the port named @p name.
     [[nodiscard]] static QString socketPath(const QString &name);

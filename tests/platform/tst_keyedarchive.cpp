@@ -64,12 +64,16 @@ private Q_SLOTS:
         const auto array = KeyedArchive::encode(QVariantList {1, 2});
         const auto nested = KeyedArchive::encode(QVariantMap {{QStringLiteral("a"), QVariantList {1}}});
         QString error;
-        QVERIFY(KeyedArchive::decode(*array, ArchiveClasses(ArchiveClass::Array) | PropertyListLeaves, &error));
-        QVERIFY(!KeyedArchive::decode(*array, ArchiveClasses(ArchiveClass::Dictionary) | PropertyListLeaves, &error));
+        QVERIFY(
+            KeyedArchive::decode(*array, ArchiveClasses(ArchiveClass::Array) | PropertyListLeaves, &error));
+        QVERIFY(!KeyedArchive::decode(
+            *array, ArchiveClasses(ArchiveClass::Dictionary) | PropertyListLeaves, &error));
         QVERIFY(error.contains(QStringLiteral("'array' is not allowed")));
         error.clear();
-        QVERIFY(!KeyedArchive::decode(*nested, ArchiveClasses(ArchiveClass::Dictionary) | PropertyListLeaves, &error));
-        QVERIFY(!KeyedArchive::decode(*array, ArchiveClasses(ArchiveClass::Array), &error)); // numbers not allowed
+        QVERIFY(!KeyedArchive::decode(
+            *nested, ArchiveClasses(ArchiveClass::Dictionary) | PropertyListLeaves, &error));
+        QVERIFY(!KeyedArchive::decode(
+            *array, ArchiveClasses(ArchiveClass::Array), &error)); // numbers not allowed
     }
 
     void damagedArchivesAreRefused_data()
@@ -79,10 +83,12 @@ private Q_SLOTS:
         QTest::newRow("not cbor") << QByteArray("hello world");
         QTest::newRow("not a map") << QByteArray("\x83\x01\x02\x03", 4);
         QTest::newRow("no root") << rawArchive([](QCborStreamWriter &) {}).replace("root", "ruut");
-        QTest::newRow("truncated") << rawArchive([](QCborStreamWriter &c) { c.append(QStringLiteral("abcdef")); })
-                                          .chopped(3);
+        QTest::newRow("truncated") << rawArchive([](QCborStreamWriter &c) {
+            c.append(QStringLiteral("abcdef"));
+        }).chopped(3);
         QTest::newRow("null root") << rawArchive([](QCborStreamWriter &c) { c.append(nullptr); });
-        QTest::newRow("undefined") << rawArchive([](QCborStreamWriter &c) { c.append(QCborSimpleType::Undefined); });
+        QTest::newRow("undefined") << rawArchive(
+            [](QCborStreamWriter &c) { c.append(QCborSimpleType::Undefined); });
         QTest::newRow("foreign tag") << rawArchive([](QCborStreamWriter &c) {
             c.append(QCborTag(32));
             c.append(QStringLiteral("http://x"));
@@ -103,7 +109,8 @@ private Q_SLOTS:
         }
         deep += '\x01';
         QTest::newRow("too deep") << deep;
-        QTest::newRow("negative overflow") << QByteArray("\xa1\x64root\x3b\xff\xff\xff\xff\xff\xff\xff\xff", 14);
+        QTest::newRow("negative overflow")
+            << QByteArray("\xa1\x64root\x3b\xff\xff\xff\xff\xff\xff\xff\xff", 14);
     }
     void damagedArchivesAreRefused()
     {
@@ -119,13 +126,19 @@ private Q_SLOTS:
         limits.maximumItems = 10;
         limits.maximumStringBytes = 8;
         QString error;
-        QVERIFY(!KeyedArchive::decode(*KeyedArchive::encode(QVariantList(20, 1)), Everything, &error, limits));
-        QVERIFY(!KeyedArchive::decode(*KeyedArchive::encode(QString(9, QLatin1Char('x'))), Everything, &error, limits));
-        QVERIFY(KeyedArchive::decode(*KeyedArchive::encode(QString(8, QLatin1Char('x'))), Everything, &error, limits));
+        QVERIFY(
+            !KeyedArchive::decode(*KeyedArchive::encode(QVariantList(20, 1)), Everything, &error, limits));
+        QVERIFY(!KeyedArchive::decode(
+            *KeyedArchive::encode(QString(9, QLatin1Char('x'))), Everything, &error, limits));
+        QVERIFY(KeyedArchive::decode(
+            *KeyedArchive::encode(QString(8, QLatin1Char('x'))), Everything, &error, limits));
         // Chunked strings are counted as they arrive.
-        const QByteArray indefinite = QByteArray("\xa1\x64root\x7f\x65xxxxx\x65xxxxx\xff", 19);
+        const QByteArray indefinite = QByteArray("\xa1\x64root\x7f\x65xxxxx\x65xxxxx\xff", 20);
+        error.clear();
         QVERIFY(!KeyedArchive::decode(indefinite, Everything, &error, limits));
+        QVERIFY(error.contains(QStringLiteral("longer than 8 bytes")));
         limits.maximumStringBytes = 100;
+        error.clear();
         const auto joined = KeyedArchive::decode(indefinite, Everything, &error, limits);
         QVERIFY2(joined, qPrintable(error));
         QCOMPARE(joined->toString(), QStringLiteral("xxxxxxxxxx"));
@@ -140,7 +153,8 @@ private Q_SLOTS:
     {
         QByteArray stream;
         for (int i = 0; i < 5; ++i) {
-            stream += MessageFrame {i, MessageFrame::ReplyWanted, QByteArray(i * 1000, char('a' + i))}.encode();
+            stream
+                += MessageFrame {i, MessageFrame::ReplyWanted, QByteArray(i * 1000, char('a' + i))}.encode();
         }
         for (int step : {1, 7, 12, 13, 4096, int(stream.size())}) {
             MessageFrameReader reader;
