@@ -9,5 +9,6 @@ Q_LOGGING_CATEGORY(lcLocale, "cadenza.locale", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcLocalization, "cadenza.localization", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcNotifications, "cadenza.notifications", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcPorts, "cadenza.ports", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcInstallation, "cadenza.installation", QtInfoMsg)
 
 } // namespace Cadenza::Platform
