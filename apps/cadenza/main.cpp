@@ -1,5 +1,6 @@
 // cadenza: Cadenza's command-line tool.
 
+#include "InstallerCommands.h"
 #include "PostCommand.h"
 #include "SayCommand.h"
 #include "VoicesCommand.h"
@@ -19,6 +20,9 @@ void printUsage(FILE *to)
                "  voices   list the installed voices\n"
                "  say      speak a text, or write it to a WAV file\n"
                "  post     post a notification to every process of the session\n"
+               "  status   show what the installer daemon is installing\n"
+               "  install  install a voice or recognition language by its tag\n"
+               "  cancel   cancel every installation\n"
                "\n"
                "Run 'cadenza COMMAND --help' for the options of a command.\n",
         to);
@@ -51,6 +55,15 @@ int main(int argc, char *argv[])
     }
     if (command == u"post") {
         return PostCommand::run(arguments);
+    }
+    if (command == u"status") {
+        return InstallerCommands::status(arguments);
+    }
+    if (command == u"install") {
+        return InstallerCommands::install(arguments);
+    }
+    if (command == u"cancel") {
+        return InstallerCommands::cancel(arguments);
     }
     std::fprintf(stderr, "cadenza: unknown command '%s'\n\n", qPrintable(command));
     printUsage(stderr);

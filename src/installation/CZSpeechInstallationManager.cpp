@@ -203,6 +203,7 @@ std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port, qi
         if (const auto delegate = info->delegate()) {
             delegate->speechItemTags({tag}, messageId);
         }
+        Q_EMIT info->installationFinished(tag, messageId, record.value_or(QVariantMap()));
         info->releaseLocalPort(port->name());
     }
     return std::nullopt;

@@ -69,6 +69,11 @@ public:
     /// Names of the local ports still waiting for their completion.
     [[nodiscard]] QStringList pendingLocalPortNames() const;
 
+Q_SIGNALS:
+    /// Emitted with each completion, after the delegate: the whole answer, which may carry
+    /// "QLNDFailureReason".
+    void installationFinished(const QString &tagName, qint32 message, const QVariantMap &answer);
+
 private:
     friend std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port, qint32 messageId,
         const QByteArray &data, CZSpeechInstallationManager *info);

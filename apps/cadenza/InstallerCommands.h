@@ -1,0 +1,15 @@
+#ifndef CADENZA_APPS_INSTALLERCOMMANDS_H
+#define CADENZA_APPS_INSTALLERCOMMANDS_H
+
+#include <QStringList>
+
+/// "cadenza status", "cadenza install" and "cadenza cancel": the installer daemon from the command line.
+class InstallerCommands
+{
+public:
+    static int status(const QStringList &arguments);
+    static int install(const QStringList &arguments);
+    static int cancel(const QStringList &arguments);
+};
+
+#endif

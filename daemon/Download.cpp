@@ -1,0 +1,267 @@
+#include "Download.h"
+
+#include <QFutureWatcher>
+#include <QLoggingCategory>
+#include <QNetworkAccessManager>
+#include <QNetworkReply>
+#include <QNetworkRequest>
+#include <QtConcurrent/QtConcurrentRun>
+
+Q_LOGGING_CATEGORY(lcDownload, "quillond.download", QtInfoMsg)
+
+namespace Quillond {
+
+namespace {
+constexpr qint64 ChunkSize = 1 << 20;
+}
+
+Download::Download(QList<QUrl> sources, QString destination, quint64 expectedSize,
+    QNetworkAccessManager *network, QObject *parent)
+    : QObject(parent)
+    , m_sources(std::move(sources))
+    , m_destination(std::move(destination))
+    , m_expectedSize(expectedSize)
+    , m_network(network)
+    , m_cancelled(std::make_shared<std::atomic<bool>>(false))
+{
+    m_progressTimer.setInterval(100);
+    connect(&m_progressTimer, &QTimer::timeout, this, [this] { Q_EMIT progressed(m_received.load()); });
+}
+
+Download::~Download()
+{
+    m_cancelled->store(true);
+    if (m_reply) {
+        m_reply->abort();
+    }
+    m_copy.waitForFinished();
+}
+
+void Download::start()
+{
+    tryNextSource();
+}
+
+void Download::cancel()
+{
+    m_cancelled->store(true);
+    if (m_reply) {
+        m_reply->abort();
+    }
+}
+
+void Download::tryNextSource()
+{
+    if (m_cancelled->load()) {
+        fail(Failure::Cancelled, QStringLiteral("cancelled"));
+        return;
+    }
+    if (m_nextSource >= m_sources.size()) {
+        fail(Failure::Network,
+            QStringLiteral("network: no source delivered the file (%1)")
+                .arg(m_lastSourceError.isEmpty() ? QStringLiteral("no sources") : m_lastSourceError));
+        return;
+    }
+    m_current = m_sources.at(m_nextSource++);
+    m_received = 0;
+    m_resumes = 0;
+    m_hash = std::make_unique<QCryptographicHash>(QCryptographicHash::Sha256);
+    m_file.close();
+    m_file.setFileName(m_destination);
+    if (!m_file.open(QIODevice::WriteOnly | QIODevice::Truncate)) {
+        fail(Failure::Disk,
+            QStringLiteral("disk: cannot write %1: %2").arg(m_destination, m_file.errorString()));
+        return;
+    }
+    if (m_current.isLocalFile()) {
+        copyLocalFile(m_current.toLocalFile());
+    } else if (m_current.scheme() == u"http" || m_current.scheme() == u"https") {
+        fetch(false);
+    } else {
+        m_lastSourceError = QStringLiteral("unsupported source %1").arg(m_current.toDisplayString());
+        tryNextSource();
+    }
+}
+
+void Download::copyLocalFile(const QString &path)
+{
+    m_file.close(); // the worker opens its own handles
+    m_progressTimer.start();
+    auto cancelled = m_cancelled;
+    const QString destination = m_destination;
+    const quint64 limit = m_expectedSize;
+    auto *received = &m_received;
+    auto *hash = m_hash.get();
+    auto result = std::make_shared<std::pair<Failure, QString>>(Failure::None, QString());
+    m_copy = QtConcurrent::run([=] {
+        QFile in(path);
+        QFile out(destination);
+        if (!in.open(QIODevice::ReadOnly)) {
+            *result = {Failure::Network, QStringLiteral("cannot read %1: %2").arg(path, in.errorString())};
+            return;
+        }
+        if (!out.open(QIODevice::WriteOnly | QIODevice::Truncate)) {
+            *result = {Failure::Disk,
+                QStringLiteral("disk: cannot write %1: %2").arg(destination, out.errorString())};
+            return;
+        }
+        QByteArray buffer(ChunkSize, Qt::Uninitialized);
+        while (true) {
+            if (cancelled->load()) {
+                *result = {Failure::Cancelled, QStringLiteral("cancelled")};
+                return;
+            }
+            const qint64 n = in.read(buffer.data(), buffer.size());
+            if (n < 0) {
+                *result
+                    = {Failure::Network, QStringLiteral("cannot read %1: %2").arg(path, in.errorString())};
+                return;
+            }
+            if (n == 0) {
+                break;
+            }
+            if (received->load() + quint64(n) > limit) {
+                *result
+                    = {Failure::TooLarge, QStringLiteral("size: the file is larger than the catalogue says")};
+                return;
+            }
+            hash->addData(QByteArrayView(buffer.constData(), n));
+            if (out.write(buffer.constData(), n) != n) {
+                *result = {Failure::Disk,
+                    QStringLiteral("disk: cannot write %1: %2").arg(destination, out.errorString())};
+                return;
+            }
+            received->fetch_add(quint64(n));
+        }
+        if (!out.flush()) {
+            *result = {Failure::Disk, QStringLiteral("disk: cannot write %1").arg(destination)};
+        }
+    });
+    auto *watcher = new QFutureWatcher<void>(this);
+    connect(watcher, &QFutureWatcher<void>::finished, this, [this, watcher, result, path] {
+        watcher->deleteLater();
+        m_progressTimer.stop();
+        Q_EMIT progressed(m_received.load());
+        if (result->first == Failure::None) {
+            succeed();
+        } else if (result->first == Failure::Network) {
+            m_lastSourceError = result->second;
+            tryNextSource();
+        } else {
+            fail(result->first, result->second);
+        }
+    });
+    watcher->setFuture(m_copy);
+}
+
+void Download::fetch(bool resume)
+{
+    QNetworkRequest request(m_current);
+    request.setAttribute(QNetworkRequest::RedirectPolicyAttribute, QNetworkRequest::NoLessSafeRedirectPolicy);
+    request.setTransferTimeout(30000);
+    if (resume && m_received.load() > 0) {
+        request.setRawHeader("Range", "bytes=" + QByteArray::number(m_received.load()) + '-');
+    }
+    m_reply = m_network->get(request);
+    connect(m_reply, &QNetworkReply::readyRead, this, &Download::onReadyRead);
+    connect(m_reply, &QNetworkReply::finished, this, &Download::onReplyFinished);
+}
+
+void Download::onReadyRead()
+{
+    if (!m_reply) {
+        return;
+    }
+    const int status = m_reply->attribute(QNetworkRequest::HttpStatusCodeAttribute).toInt();
+    if (status == 200 && m_received.load() > 0) {
+        // The server ignored the range: start the file again.
+        m_file.resize(0);
+        m_file.seek(0);
+        m_hash->reset();
+        m_received = 0;
+    }
+    if (status != 200 && status != 206) {
+        return; // an error page; onReplyFinished deals with it
+    }
+    const QByteArray data = m_reply->readAll();
+    if (m_received.load() + quint64(data.size()) > m_expectedSize) {
+        fail(Failure::TooLarge, QStringLiteral("size: the file is larger than the catalogue says"));
+        return;
+    }
+    m_hash->addData(data);
+    if (m_file.write(data) != data.size()) {
+        fail(Failure::Disk,
+            QStringLiteral("disk: cannot write %1: %2").arg(m_destination, m_file.errorString()));
+        return;
+    }
+    m_received.fetch_add(quint64(data.size()));
+    Q_EMIT progressed(m_received.load());
+}
+
+void Download::onReplyFinished()
+{
+    QNetworkReply *reply = m_reply;
+    if (!reply || m_done) {
+        return;
+    }
+    m_reply = nullptr;
+    reply->deleteLater();
+    if (m_cancelled->load()) {
+        fail(Failure::Cancelled, QStringLiteral("cancelled"));
+        return;
+    }
+    const int status = reply->attribute(QNetworkRequest::HttpStatusCodeAttribute).toInt();
+    if (reply->error() == QNetworkReply::NoError && (status == 200 || status == 206)) {
+        succeed();
+        return;
+    }
+    // A dropped connection after some data is resumed where it stopped; anything else moves on.
+    const bool transient = status == 0 || status >= 500;
+    if (transient && m_received.load() > 0 && m_resumes < MaximumResumes) {
+        ++m_resumes;
+        qCInfo(lcDownload, "Resuming %s at byte %llu", qPrintable(m_current.toDisplayString()),
+            static_cast<unsigned long long>(m_received.load()));
+        fetch(true);
+        return;
+    }
+    m_lastSourceError = status
+        ? QStringLiteral("%1 answered HTTP %2").arg(m_current.toDisplayString()).arg(status)
+        : QStringLiteral("%1: %2").arg(m_current.toDisplayString(), reply->errorString());
+    tryNextSource();
+}
+
+void Download::fail(Failure failure, const QString &text)
+{
+    if (m_done) {
+        return;
+    }
+    m_done = true;
+    m_failure = failure;
+    m_error = text;
+    m_progressTimer.stop();
+    if (m_reply) {
+        m_reply->disconnect(this);
+        m_reply->abort();
+    }
+    m_file.close();
+    QFile::remove(m_destination);
+    Q_EMIT finished(false);
+}
+
+void Download::succeed()
+{
+    if (m_done) {
+        return;
+    }
+    m_done = true;
+    if (m_file.isOpen() && !m_file.flush()) {
+        m_done = false;
+        fail(Failure::Disk, QStringLiteral("disk: cannot write %1").arg(m_destination));
+        return;
+    }
+    m_file.close();
+    m_digest = m_hash->result();
+    Q_EMIT finished(true);
+}
+
+} // namespace Quillond
