@@ -20,12 +20,13 @@ public:
         , m_handler(std::move(handler))
         , m_state(std::move(state))
     {
-        m_state->ports.insert(m_name, &m_handler);
+        m_serial = m_state->nextSerial++;
+        m_state->ports.insert(m_name, {&m_handler, m_serial});
     }
     ~FakeLocalPort() override { invalidate(); }
 
     QString name() const override { return m_name; }
-    bool isValid() const override { return m_state->ports.value(m_name) == &m_handler; }
+    bool isValid() const override { return m_state->ports.value(m_name).serial == m_serial; }
     void invalidate() override
     {
         if (isValid()) {
@@ -37,6 +38,7 @@ private:
     QString m_name;
     LocalMessagePort::Handler m_handler;
     std::shared_ptr<FakeMessagePortService::State> m_state;
+    quint64 m_serial = 0;
 };
 
 class FakeRemotePort final : public RemoteMessagePort
@@ -49,7 +51,7 @@ public:
     { }
 
     QString name() const override { return m_name; }
-    bool isValid() override { return m_target && m_state->ports.value(m_name) == m_target; }
+    bool isValid() override { return m_target.serial != 0 && m_state->ports.value(m_name).serial == m_target.serial; }
     Result sendRequest(qint32 messageId, const QByteArray &data, double, double, bool replyWanted) override
     {
         if (!isValid()) {
@@ -60,18 +62,18 @@ public:
             return {m_state->sendStatus, std::nullopt};
         }
         // Copy the handler: it may release its own port while it runs.
-        const LocalMessagePort::Handler handler = *m_target;
+        const LocalMessagePort::Handler handler = *m_target.handler;
         std::optional<QByteArray> reply = handler(messageId, data, {qint64(0), qint64(0)});
         if (!replyWanted || !reply || reply->isEmpty()) {
             return {MessagePortStatus::Success, std::nullopt};
         }
         return {MessagePortStatus::Success, reply};
     }
-    void invalidate() override { m_target = nullptr; }
+    void invalidate() override { m_target = {}; }
 
 private:
     QString m_name;
-    LocalMessagePort::Handler *m_target;
+    FakeMessagePortService::State::Entry m_target;
     std::shared_ptr<FakeMessagePortService::State> m_state;
 };
 
@@ -117,7 +119,7 @@ QList<FakeMessagePortService::SentMessage> FakeMessagePortService::sentMessages(
 
 bool FakeMessagePortService::deliver(const QString &portName, qint32 messageId, const QByteArray &data)
 {
-    const auto *handler = m_state->ports.value(portName);
+    const auto *handler = m_state->ports.value(portName).handler;
     if (!handler) {
         return false;
     }

@@ -1,0 +1,199 @@
+#include "TestEnvironment.h"
+
+#include "installation/CZSpeechInstallationManager.h"
+#include "installation/InstallerProtocol.h"
+#include "installation/SecureArchiving.h"
+#include "platform/FakeMessagePortService.h"
+#include "platform/Services.h"
+
+#include <QRegularExpression>
+#include <QTest>
+
+using namespace Cadenza;
+using namespace Cadenza::InstallerProtocol;
+using Platform::FakeMessagePortService;
+
+namespace {
+
+class RecordingDelegate : public CZSpeechInstallationManagerDelegate
+{
+public:
+    void speechItemTags(const QStringList &tags, qint32 message) override { calls.append({tags, message}); }
+    QList<std::pair<QStringList, qint32>> calls;
+};
+
+/// A daemon made of fake ports: records requests, answers message 3 with what the test sets.
+struct FakeDaemon {
+    explicit FakeDaemon(FakeMessagePortService &ports)
+    {
+        requestPort = ports.createLocalPort(ServicePortName,
+            [this](qint32 id, const QByteArray &data, const Platform::MessagePeer &) -> std::optional<QByteArray> {
+                requests.append({id, data});
+                if (id == ActiveInstallationsMessage) {
+                    return answer;
+                }
+                return std::nullopt;
+            });
+        livenessPort = ports.createLocalPort(LivenessPortName,
+            [](qint32, const QByteArray &, const Platform::MessagePeer &) { return std::optional<QByteArray>(); });
+    }
+    std::unique_ptr<Platform::LocalMessagePort> requestPort;
+    std::unique_ptr<Platform::LocalMessagePort> livenessPort;
+    QList<std::pair<qint32, QByteArray>> requests;
+    std::optional<QByteArray> answer;
+};
+
+} // namespace
+
+class InstallerProtocolTest : public QObject
+{
+    Q_OBJECT
+private Q_SLOTS:
+    void init()
+    {
+        m_environment = std::make_unique<Testing::TestEnvironment>();
+        m_ports = std::make_shared<FakeMessagePortService>();
+        Platform::Services::setMessagePorts(m_ports);
+        m_manager = std::make_unique<CZSpeechInstallationManager>();
+        m_delegate = std::make_shared<RecordingDelegate>();
+        m_manager->setDelegate(m_delegate);
+    }
+    void cleanup()
+    {
+        m_manager.reset();
+        m_environment.reset();
+    }
+
+    void archivesRoundTripAndRefuseTheWrongShape()
+    {
+        const QVariantMap record {{TagNameKey, QStringLiteral("VOICEID:x")}};
+        QCOMPARE(CZDecodeSecureDictionary(CZEncodeSecureObject(record)).value_or(QVariantMap()), record);
+        QCOMPARE(CZDecodeSecureArray(CZEncodeSecureObject(QVariantList {record})).value_or(QVariantList()).size(), 1);
+        // An array where a dictionary belongs is refused with the decoder's words in the log.
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("'array' is not allowed")));
+        QVERIFY(!CZDecodeSecureDictionary(CZEncodeSecureObject(QVariantList {1})));
+        // A dictionary where an array belongs decodes, and is not an array.
+        QVERIFY(!CZDecodeSecureArray(CZEncodeSecureObject(record)));
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("cannot archive")));
+        QVERIFY(CZEncodeSecureObject(QVariant::fromValue(QPoint())).isNull());
+    }
+
+    void withoutADaemonNothingIsSent()
+    {
+        QVERIFY(!m_manager->_serverIsRunning());
+        QVERIFY(m_manager->activeInstallations().isEmpty());
+        m_manager->showProgressWindow();
+        m_manager->cancelAllInstallations();
+        QVERIFY(m_ports->sentMessages().isEmpty());
+    }
+
+    void aRequestCarriesEightEntriesAndItsOwnPort()
+    {
+        FakeDaemon daemon(*m_ports);
+        QVERIFY(m_manager->_requestInstallation(QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1234,
+            QStringLiteral("v.premium"), 1));
+        QVERIFY(m_manager->_requestInstallation(QStringLiteral("VOICEID:w.premium"), QStringLiteral("W"), 99,
+            QStringLiteral("w.premium"), 1));
+        QCOMPARE(daemon.requests.size(), 2);
+        const QVariantMap first = CZDecodeSecureDictionary(daemon.requests.at(0).second).value_or(QVariantMap());
+        const QVariantMap second = CZDecodeSecureDictionary(daemon.requests.at(1).second).value_or(QVariantMap());
+        QCOMPARE(daemon.requests.at(0).first, qint32(StartInstallingMessage));
+        QCOMPARE(first.size(), 8);
+        QCOMPARE(first.value(ItemDownloadStatusKey).toLongLong(), 4);
+        QCOMPARE(first.value(ItemByteSizeKey).toULongLong(), 1234u);
+        QCOMPARE(first.value(ClientProcessIDKey).toLongLong(), QCoreApplication::applicationPid());
+        static const QRegularExpression name(QStringLiteral("^com\\.vendra\\.speech\\.quillond-(\\d+)$"));
+        const auto match = name.match(first.value(ClientPortNameKey).toString());
+        QVERIFY(match.hasMatch());
+        QVERIFY(match.captured(1).toInt() <= 65535);
+        QVERIFY(first.value(ClientPortNameKey) != second.value(ClientPortNameKey));
+        QCOMPARE(m_manager->pendingLocalPortNames().size(), 2);
+
+        // Each completion closes its own port and reaches the delegate with its tag.
+        const QString firstPort = first.value(ClientPortNameKey).toString();
+        QVERIFY(m_ports->deliver(firstPort, InstalledCompletion, CZEncodeSecureObject(QVariantMap {{TagNameKey, first.value(TagNameKey)}})));
+        QCOMPARE(m_delegate->calls.size(), 1);
+        QCOMPARE(m_delegate->calls.first().first, QStringList {QStringLiteral("VOICEID:v.premium")});
+        QCOMPARE(m_delegate->calls.first().second, qint32(InstalledCompletion));
+        QCOMPARE(m_manager->pendingLocalPortNames(), QStringList {second.value(ClientPortNameKey).toString()});
+        QVERIFY(!m_ports->localPortNames().contains(firstPort));
+    }
+
+    void incompleteItemsAreSkipped()
+    {
+        FakeDaemon daemon(*m_ports);
+        QVERIFY(!m_manager->_requestInstallation(QString(), QStringLiteral("V"), 1, QStringLiteral("v"), 0));
+        QVERIFY(!m_manager->_requestInstallation(QStringLiteral("VOICEID:v"), QString(), 1, QStringLiteral("v"), 0));
+        QVERIFY(!m_manager->_requestInstallation(QStringLiteral("VOICEID:v"), QStringLiteral("V"), 1, QString(), 0));
+        QVERIFY(daemon.requests.isEmpty());
+    }
+
+    void otherCompletionIdsLeaveThePortOpen()
+    {
+        FakeDaemon daemon(*m_ports);
+        QVERIFY(m_manager->_requestInstallation(QStringLiteral("SRCLANGID:de_DE"), QStringLiteral("German"), 1,
+            QStringLiteral("de_DE"), 0));
+        const QString port = m_manager->pendingLocalPortNames().value(0);
+        const QByteArray answer = CZEncodeSecureObject(QVariantMap {{TagNameKey, QStringLiteral("SRCLANGID:de_DE")}});
+        QVERIFY(m_ports->deliver(port, 0, answer));
+        QVERIFY(m_ports->deliver(port, 4, answer));
+        QTest::ignoreMessage(QtWarningMsg,
+            QRegularExpression(QStringLiteral("^Quillond returned nil data to port com\\.vendra\\.speech\\.quillond-\\d+$")));
+        QVERIFY(m_ports->deliver(port, 1, QByteArray()));
+        QVERIFY(m_delegate->calls.isEmpty());
+        QCOMPARE(m_manager->pendingLocalPortNames(), QStringList {port});
+        QVERIFY(m_ports->deliver(port, FailedCompletion, answer));
+        QCOMPARE(m_delegate->calls.size(), 1);
+        QCOMPARE(m_delegate->calls.first().second, qint32(FailedCompletion));
+        QVERIFY(m_manager->pendingLocalPortNames().isEmpty());
+    }
+
+    void activeInstallationsDecodeOnlyArrays()
+    {
+        FakeDaemon daemon(*m_ports);
+        const QVariantMap record {{TagNameKey, QStringLiteral("VOICEID:x")}, {ItemPercentCompleteKey, 12.5}};
+        daemon.answer = CZEncodeSecureObject(QVariantList {record, record});
+        QCOMPARE(m_manager->activeInstallations().size(), 2);
+        QCOMPARE(daemon.requests.last().first, qint32(ActiveInstallationsMessage));
+        QCOMPARE(CZDecodeSecureDictionary(daemon.requests.last().second).value_or(QVariantMap()).keys(),
+            QStringList {ClientProcessIDKey});
+        daemon.answer = CZEncodeSecureObject(record); // a dictionary, not an array
+        QVERIFY(m_manager->activeInstallations().isEmpty());
+        daemon.answer = std::nullopt;
+        QTest::ignoreMessage(QtWarningMsg, "client got NULL return data\n");
+        QVERIFY(m_manager->activeInstallations().isEmpty());
+    }
+
+    void failedSendsAreLogged()
+    {
+        FakeDaemon daemon(*m_ports);
+        m_ports->setSendStatus(Platform::MessagePortStatus::SendTimeout);
+        QTest::ignoreMessage(QtWarningMsg, "failed to send request 2: -1\n");
+        m_manager->cancelAllInstallations();
+        QTest::ignoreMessage(QtWarningMsg, "failed to send request 3: -1\n");
+        QVERIFY(m_manager->activeInstallations().isEmpty());
+    }
+
+    void aRestartedDaemonIsFoundAgain()
+    {
+        auto daemon = std::make_unique<FakeDaemon>(*m_ports);
+        daemon->answer = CZEncodeSecureObject(QVariantList());
+        QVERIFY(m_manager->_createServerPortIfNeeded());
+        daemon.reset();
+        QVERIFY(!m_manager->_createServerPortIfNeeded());
+        daemon = std::make_unique<FakeDaemon>(*m_ports);
+        QVERIFY(m_manager->_createServerPortIfNeeded());
+        m_manager->cancelAllInstallations();
+        QCOMPARE(daemon->requests.size(), 1);
+        QCOMPARE(daemon->requests.first().first, qint32(CancelAllMessage));
+    }
+
+private:
+    std::unique_ptr<Testing::TestEnvironment> m_environment;
+    std::shared_ptr<FakeMessagePortService> m_ports;
+    std::unique_ptr<CZSpeechInstallationManager> m_manager;
+    std::shared_ptr<RecordingDelegate> m_delegate;
+};
+
+QTEST_GUILESS_MAIN(InstallerProtocolTest)
+#include "tst_installerprotocol.moc"
