@@ -4,7 +4,13 @@ namespace Cadenza::Platform {
 
 struct FakeMessagePortService::State
 {
-    QHash<QString, LocalMessagePort::Handler *> ports;
+    struct Entry
+    {
+        LocalMessagePort::Handler *handler = nullptr;
+        quint64 serial = 0; ///< tells a port from a later one at the same address
+    };
+    QHash<QString, Entry> ports;
+    quint64 nextSerial = 1;
     QList<SentMessage> sent;
     int sendStatus = MessagePortStatus::Success;
 };
