@@ -159,7 +159,8 @@ void Download::fetch(bool resume)
     QNetworkRequest request(m_current);
     request.setAttribute(QNetworkRequest::RedirectPolicyAttribute, QNetworkRequest::NoLessSafeRedirectPolicy);
     request.setTransferTimeout(30000);
-    if (resume && m_received.load() > 0) {
+    m_rangeRequested = resume && m_received.load() > 0;
+    if (m_rangeRequested) {
         request.setRawHeader("Range", "bytes=" + QByteArray::number(m_received.load()) + '-');
     }
     m_reply = m_network->get(request);
@@ -173,13 +174,14 @@ void Download::onReadyRead()
         return;
     }
     const int status = m_reply->attribute(QNetworkRequest::HttpStatusCodeAttribute).toInt();
-    if (status == 200 && m_received.load() > 0) {
+    if (m_rangeRequested && status == 200) {
         // The server ignored the range: start the file again.
         m_file.resize(0);
         m_file.seek(0);
         m_hash->reset();
         m_received = 0;
     }
+    m_rangeRequested = false;
     if (status != 200 && status != 206) {
         return; // an error page; onReplyFinished deals with it
     }
@@ -204,6 +206,11 @@ void Download::onReplyFinished()
     if (!reply || m_done) {
         return;
     }
+    // The last bytes may still sit in the reply: finished() does not wait for readyRead().
+    onReadyRead();
+    if (m_done) {
+        return;
+    }
     m_reply = nullptr;
     reply->deleteLater();
     if (m_cancelled->load()) {
@@ -216,7 +223,9 @@ void Download::onReplyFinished()
         return;
     }
     // A dropped connection after some data is resumed where it stopped; anything else moves on.
-    const bool transient = status == 0 || status >= 500;
+    const bool connectionLost
+        = reply->error() != QNetworkReply::NoError && reply->error() < QNetworkReply::ContentAccessDenied;
+    const bool transient = connectionLost || status >= 500;
     if (transient && m_received.load() > 0 && m_resumes < MaximumResumes) {
         ++m_resumes;
         qCInfo(lcDownload, "Resuming %s at byte %llu", qPrintable(m_current.toDisplayString()),

@@ -75,6 +75,7 @@ private:
     QString m_lastSourceError;
     Failure m_failure = Failure::None;
     int m_resumes = 0;
+    bool m_rangeRequested = false; ///< until the first answer to a resumed request
     bool m_done = false;
 };
 

@@ -57,7 +57,10 @@ public:
     { }
 
     QString name() const override { return m_name; }
-    bool isValid() override { return m_target.serial != 0 && m_state->ports.value(m_name).serial == m_target.serial; }
+    bool isValid() override
+    {
+        return m_target.serial != 0 && m_state->ports.value(m_name).serial == m_target.serial;
+    }
     Result sendRequest(qint32 messageId, const QByteArray &data, double, double, bool replyWanted) override
     {
         if (!isValid()) {

@@ -23,19 +23,23 @@ public:
 };
 
 /// A daemon made of fake ports: records requests, answers message 3 with what the test sets.
-struct FakeDaemon {
+struct FakeDaemon
+{
     explicit FakeDaemon(FakeMessagePortService &ports)
     {
         requestPort = ports.createLocalPort(ServicePortName,
-            [this](qint32 id, const QByteArray &data, const Platform::MessagePeer &) -> std::optional<QByteArray> {
+            [this](qint32 id, const QByteArray &data,
+                const Platform::MessagePeer &) -> std::optional<QByteArray> {
                 requests.append({id, data});
                 if (id == ActiveInstallationsMessage) {
                     return answer;
                 }
                 return std::nullopt;
             });
-        livenessPort = ports.createLocalPort(LivenessPortName,
-            [](qint32, const QByteArray &, const Platform::MessagePeer &) { return std::optional<QByteArray>(); });
+        livenessPort = ports.createLocalPort(
+            LivenessPortName, [](qint32, const QByteArray &, const Platform::MessagePeer &) {
+                return std::optional<QByteArray>();
+            });
     }
     std::unique_ptr<Platform::LocalMessagePort> requestPort;
     std::unique_ptr<Platform::LocalMessagePort> livenessPort;
@@ -68,7 +72,9 @@ private Q_SLOTS:
     {
         const QVariantMap record {{TagNameKey, QStringLiteral("VOICEID:x")}};
         QCOMPARE(CZDecodeSecureDictionary(CZEncodeSecureObject(record)).value_or(QVariantMap()), record);
-        QCOMPARE(CZDecodeSecureArray(CZEncodeSecureObject(QVariantList {record})).value_or(QVariantList()).size(), 1);
+        QCOMPARE(
+            CZDecodeSecureArray(CZEncodeSecureObject(QVariantList {record})).value_or(QVariantList()).size(),
+            1);
         // An array where a dictionary belongs is refused with the decoder's words in the log.
         QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("'array' is not allowed")));
         QVERIFY(!CZDecodeSecureDictionary(CZEncodeSecureObject(QVariantList {1})));
@@ -90,13 +96,15 @@ private Q_SLOTS:
     void aRequestCarriesEightEntriesAndItsOwnPort()
     {
         FakeDaemon daemon(*m_ports);
-        QVERIFY(m_manager->_requestInstallation(QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1234,
-            QStringLiteral("v.premium"), 1));
-        QVERIFY(m_manager->_requestInstallation(QStringLiteral("VOICEID:w.premium"), QStringLiteral("W"), 99,
-            QStringLiteral("w.premium"), 1));
+        QVERIFY(m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1234, QStringLiteral("v.premium"), 1));
+        QVERIFY(m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:w.premium"), QStringLiteral("W"), 99, QStringLiteral("w.premium"), 1));
         QCOMPARE(daemon.requests.size(), 2);
-        const QVariantMap first = CZDecodeSecureDictionary(daemon.requests.at(0).second).value_or(QVariantMap());
-        const QVariantMap second = CZDecodeSecureDictionary(daemon.requests.at(1).second).value_or(QVariantMap());
+        const QVariantMap first
+            = CZDecodeSecureDictionary(daemon.requests.at(0).second).value_or(QVariantMap());
+        const QVariantMap second
+            = CZDecodeSecureDictionary(daemon.requests.at(1).second).value_or(QVariantMap());
         QCOMPARE(daemon.requests.at(0).first, qint32(StartInstallingMessage));
         QCOMPARE(first.size(), 8);
         QCOMPARE(first.value(ItemDownloadStatusKey).toLongLong(), 4);
@@ -111,11 +119,13 @@ private Q_SLOTS:
 
         // Each completion closes its own port and reaches the delegate with its tag.
         const QString firstPort = first.value(ClientPortNameKey).toString();
-        QVERIFY(m_ports->deliver(firstPort, InstalledCompletion, CZEncodeSecureObject(QVariantMap {{TagNameKey, first.value(TagNameKey)}})));
+        QVERIFY(m_ports->deliver(firstPort, InstalledCompletion,
+            CZEncodeSecureObject(QVariantMap {{TagNameKey, first.value(TagNameKey)}})));
         QCOMPARE(m_delegate->calls.size(), 1);
         QCOMPARE(m_delegate->calls.first().first, QStringList {QStringLiteral("VOICEID:v.premium")});
         QCOMPARE(m_delegate->calls.first().second, qint32(InstalledCompletion));
-        QCOMPARE(m_manager->pendingLocalPortNames(), QStringList {second.value(ClientPortNameKey).toString()});
+        QCOMPARE(
+            m_manager->pendingLocalPortNames(), QStringList {second.value(ClientPortNameKey).toString()});
         QVERIFY(!m_ports->localPortNames().contains(firstPort));
     }
 
@@ -123,22 +133,26 @@ private Q_SLOTS:
     {
         FakeDaemon daemon(*m_ports);
         QVERIFY(!m_manager->_requestInstallation(QString(), QStringLiteral("V"), 1, QStringLiteral("v"), 0));
-        QVERIFY(!m_manager->_requestInstallation(QStringLiteral("VOICEID:v"), QString(), 1, QStringLiteral("v"), 0));
-        QVERIFY(!m_manager->_requestInstallation(QStringLiteral("VOICEID:v"), QStringLiteral("V"), 1, QString(), 0));
+        QVERIFY(!m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:v"), QString(), 1, QStringLiteral("v"), 0));
+        QVERIFY(!m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:v"), QStringLiteral("V"), 1, QString(), 0));
         QVERIFY(daemon.requests.isEmpty());
     }
 
     void otherCompletionIdsLeaveThePortOpen()
     {
         FakeDaemon daemon(*m_ports);
-        QVERIFY(m_manager->_requestInstallation(QStringLiteral("SRCLANGID:de_DE"), QStringLiteral("German"), 1,
-            QStringLiteral("de_DE"), 0));
+        QVERIFY(m_manager->_requestInstallation(
+            QStringLiteral("SRCLANGID:de_DE"), QStringLiteral("German"), 1, QStringLiteral("de_DE"), 0));
         const QString port = m_manager->pendingLocalPortNames().value(0);
-        const QByteArray answer = CZEncodeSecureObject(QVariantMap {{TagNameKey, QStringLiteral("SRCLANGID:de_DE")}});
+        const QByteArray answer
+            = CZEncodeSecureObject(QVariantMap {{TagNameKey, QStringLiteral("SRCLANGID:de_DE")}});
         QVERIFY(m_ports->deliver(port, 0, answer));
         QVERIFY(m_ports->deliver(port, 4, answer));
         QTest::ignoreMessage(QtWarningMsg,
-            QRegularExpression(QStringLiteral("^Quillond returned nil data to port com\\.vendra\\.speech\\.quillond-\\d+$")));
+            QRegularExpression(QStringLiteral(
+                "^Quillond returned nil data to port com\\.vendra\\.speech\\.quillond-\\d+$")));
         QVERIFY(m_ports->deliver(port, 1, QByteArray()));
         QVERIFY(m_delegate->calls.isEmpty());
         QCOMPARE(m_manager->pendingLocalPortNames(), QStringList {port});

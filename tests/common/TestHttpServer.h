@@ -1,0 +1,45 @@
+#ifndef CADENZA_TESTS_TESTHTTPSERVER_H
+#define CADENZA_TESTS_TESTHTTPSERVER_H
+
+#include <QObject>
+#include <QString>
+#include <QTcpServer>
+#include <QUrl>
+
+namespace Cadenza::Testing {
+
+/**
+ * A small HTTP/1.1 file server on 127.0.0.1 for tests: GET with byte ranges, an optional speed limit,
+ * and an optional dropped connection part-way through, to exercise resuming.
+ */
+class TestHttpServer : public QObject
+{
+    Q_OBJECT
+public:
+    explicit TestHttpServer(QString root, QObject *parent = nullptr);
+
+    [[nodiscard]] bool listen();
+    [[nodiscard]] QUrl baseUrl() const;
+
+    /// Sends at most @p bytes per second (0: as fast as possible).
+    void setBytesPerSecond(qint64 bytes) { m_bytesPerSecond = bytes; }
+    /// Drops the next transfer after @p bytes of its body.
+    void dropNextTransferAfter(qint64 bytes) { m_dropAfter = bytes; }
+
+    [[nodiscard]] int requestCount() const { return m_requests; }
+    [[nodiscard]] int rangeRequestCount() const { return m_rangeRequests; }
+
+private:
+    void serve(QTcpSocket *socket);
+
+    QString m_root;
+    QTcpServer m_server;
+    qint64 m_bytesPerSecond = 0;
+    qint64 m_dropAfter = -1;
+    int m_requests = 0;
+    int m_rangeRequests = 0;
+};
+
+} // namespace Cadenza::Testing
+
+#endif

@@ -1,0 +1,429 @@
+#include "TestEnvironment.h"
+#include "TestHttpServer.h"
+
+#include "installation/CZSpeechInstallationManager.h"
+#include "installation/InstallerProtocol.h"
+#include "platform/DistributedNotificationCenter.h"
+#include "platform/Paths.h"
+#include "platform/PropertyList.h"
+#include "platform/Services.h"
+#include "platform/UnixMessagePortService.h"
+
+#include <QCryptographicHash>
+#include <QDBusConnection>
+#include <QDir>
+#include <QDirIterator>
+#include <QLocalSocket>
+#include <QProcess>
+#include <QRandomGenerator>
+#include <QSignalSpy>
+#include <QTest>
+
+#include <csignal>
+
+using namespace Cadenza;
+using namespace Cadenza::InstallerProtocol;
+using Cadenza::Testing::TestEnvironment;
+using Cadenza::Testing::TestHttpServer;
+
+namespace {
+
+const QString BigTag = QStringLiteral("VOICEID:com.vendra.test.big.premium");
+const QString SmallTag = QStringLiteral("VOICEID:com.vendra.test.small.premium");
+const QString BadSumTag = QStringLiteral("VOICEID:com.vendra.test.badsum.premium");
+const QString MissingTag = QStringLiteral("VOICEID:com.vendra.test.missing.premium");
+
+/// A real quillond, started and stopped by the test.
+class Daemon
+{
+public:
+    bool start(const QStringList &arguments)
+    {
+        m_process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
+        m_process.start(QStringLiteral(QUILLOND_PATH), arguments);
+        if (!m_process.waitForStarted(5000)) {
+            return false;
+        }
+        Platform::UnixMessagePortService ports;
+        for (int i = 0; i < 100; ++i) {
+            if (ports.createRemotePort(LivenessPortName)) {
+                return true;
+            }
+            QTest::qWait(50);
+        }
+        return false;
+    }
+    void kill()
+    {
+        ::kill(pid_t(m_process.processId()), SIGKILL);
+        m_process.waitForFinished(5000);
+    }
+    void terminate()
+    {
+        if (m_process.state() != QProcess::NotRunning) {
+            m_process.terminate();
+            m_process.waitForFinished(5000);
+        }
+    }
+    ~Daemon() { terminate(); }
+
+private:
+    QProcess m_process;
+};
+
+QString voicesFolder()
+{
+    return Platform::Paths::userVoicesFolder();
+}
+
+/// Files that an installation may leave only while it runs.
+QStringList leftovers()
+{
+    QStringList found;
+    for (const QString &folder : {Platform::Paths::userVoicesFolder(),
+             Platform::Paths::userRecognizersFolder(), Platform::Paths::cacheFolder()}) {
+        QDirIterator it(
+            folder, QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot, QDirIterator::Subdirectories);
+        while (it.hasNext()) {
+            const QString path = it.next();
+            if (path.contains(QStringLiteral(".quillond-staging-"))
+                || path.endsWith(QStringLiteral(".part"))) {
+                found.append(path);
+            }
+        }
+    }
+    return found;
+}
+
+} // namespace
+
+class QuillondTest : public QObject
+{
+    Q_OBJECT
+private Q_SLOTS:
+    void init()
+    {
+        m_environment = std::make_unique<TestEnvironment>();
+        makeRepository();
+        m_http = std::make_unique<TestHttpServer>(m_environment->path(QStringLiteral("repository")));
+        QVERIFY(m_http->listen());
+        m_manager = std::make_unique<CZSpeechInstallationManager>();
+        m_finished = std::make_unique<QSignalSpy>(
+            m_manager.get(), &CZSpeechInstallationManager::installationFinished);
+    }
+    void cleanup()
+    {
+        m_daemon.reset();
+        m_finished.reset();
+        m_manager.reset();
+        m_http.reset();
+        m_environment.reset();
+    }
+
+    void installsFromTheSampleRepository()
+    {
+        startDaemon({QStringLiteral("--repository"),
+            QUrl::fromLocalFile(QStringLiteral(CADENZA_SAMPLE_REPOSITORY)).toString()});
+        QSignalSpy notifications(&Platform::Services::notifications(),
+            &Platform::DistributedNotificationCenter::notificationPosted);
+        const QString voice = QStringLiteral("com.vendra.speech.synthesis.voice.jonas.premium");
+        QVERIFY(m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:") + voice, QStringLiteral("Jonas"), 1, voice, 0));
+        QVERIFY(waitForCompletion(InstalledCompletion));
+        QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/JonasPremium.SpeechVoice/Info.plist")));
+        QVERIFY(m_manager->pendingLocalPortNames().isEmpty());
+        if (QDBusConnection::sessionBus().isConnected()) {
+            QTRY_VERIFY_WITH_TIMEOUT(notifications.size() >= 2, 5000);
+            QStringList names;
+            for (const auto &n : notifications) {
+                names.append(n.at(0).toString());
+                QCOMPARE(n.at(2).toMap().value(ObjectIDKey).toString(), voice);
+            }
+            QCOMPARE(names, QStringList({StartedInstallationNotification, FinishedInstallationNotification}));
+        }
+        QVERIFY(leftovers().isEmpty());
+
+        // Installing again replaces the bundle in one step.
+        QVERIFY(m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:") + voice, QStringLiteral("Jonas"), 1, voice, 0));
+        QVERIFY(waitForCompletion(InstalledCompletion));
+        QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/JonasPremium.SpeechVoice/Info.plist")));
+        QVERIFY(leftovers().isEmpty());
+    }
+
+    void progressIsReportedWhileDownloading()
+    {
+        m_http->setBytesPerSecond(3 * 1024 * 1024);
+        startTestDaemon();
+        QVERIFY(request(BigTag));
+        QVERIFY(request(SmallTag));
+        QVariantMap downloading;
+        QVariantMap waiting;
+        QTRY_VERIFY_WITH_TIMEOUT(
+            [&] {
+                const QVariantList records = m_manager->activeInstallations();
+                for (const QVariant &r : records) {
+                    const QVariantMap record = r.toMap();
+                    if (record.value(TagNameKey) == BigTag
+                        && record.value(ItemSoftwareUpdateStateKey).toLongLong() == DownloadingState
+                        && record.value(ItemDownloadByteCountKey).toULongLong() > 0
+                        && record.value(ItemSecondsRemainingKey).toDouble() > 0) {
+                        downloading = record;
+                    }
+                    if (record.value(TagNameKey) == SmallTag) {
+                        waiting = record;
+                    }
+                }
+                return !downloading.isEmpty();
+            }(),
+            10000);
+        QCOMPARE(downloading.value(ItemDownloadStatusKey).toLongLong(), qint64(DownloadingStatus));
+        QVERIFY(downloading.value(ItemPercentCompleteKey).toDouble() > 0);
+        QVERIFY(downloading.value(ItemPercentCompleteKey).toDouble() < 100);
+        QVERIFY(downloading.value(ItemDownloadStartRefTimeKey).toDouble()
+            > 7e8); // after 2023, in 2001-based seconds
+        QCOMPARE(downloading.value(ItemByteSizeKey).toULongLong(), m_bigSize);
+        QCOMPARE(waiting.value(ItemDownloadStatusKey).toLongLong(), qint64(WaitingStatus));
+        // One at a time, in request order; each request's own port is closed by its own completion.
+        QCOMPARE(m_manager->pendingLocalPortNames().size(), 2);
+        QVERIFY(waitForCompletion(InstalledCompletion, 30000));
+        QCOMPARE(m_finished->first().at(0).toString(), BigTag);
+        QVERIFY(waitForCompletions(2, 10000));
+        QCOMPARE(m_finished->at(1).at(0).toString(), SmallTag);
+        QVERIFY(m_manager->pendingLocalPortNames().isEmpty());
+        QVERIFY(m_manager->activeInstallations().isEmpty());
+    }
+
+    void cancellingLeavesNothingBehind()
+    {
+        m_http->setBytesPerSecond(1024 * 1024);
+        startTestDaemon();
+        QVERIFY(request(BigTag));
+        QVERIFY(request(SmallTag));
+        QTRY_VERIFY_WITH_TIMEOUT(isDownloading(BigTag), 10000);
+        m_manager->cancelAllInstallations();
+        QVERIFY(waitForCompletions(2, 10000));
+        QCOMPARE(m_finished->at(0).at(1).toInt(), int(CancelledCompletion));
+        QCOMPARE(m_finished->at(1).at(1).toInt(), int(CancelledCompletion));
+        QVERIFY(!QFile::exists(voicesFolder() + QStringLiteral("/Big.SpeechVoice")));
+        QVERIFY(!QFile::exists(voicesFolder() + QStringLiteral("/Small.SpeechVoice")));
+        QTRY_VERIFY(leftovers().isEmpty());
+    }
+
+    void wrongChecksumsAndUnknownTagsFail()
+    {
+        startTestDaemon();
+        QVERIFY(request(BadSumTag));
+        QVERIFY(waitForCompletion(FailedCompletion));
+        QVERIFY(m_finished->first()
+                    .at(2)
+                    .toMap()
+                    .value(FailureReasonKey)
+                    .toString()
+                    .startsWith(QStringLiteral("checksum")));
+        QVERIFY(!QFile::exists(voicesFolder() + QStringLiteral("/Big.SpeechVoice")));
+        QVERIFY(leftovers().isEmpty());
+
+        QVERIFY(request(QStringLiteral("VOICEID:no.such.voice")));
+        QVERIFY(waitForCompletions(2));
+        QCOMPARE(m_finished->at(1).at(1).toInt(), int(FailedCompletion));
+        QVERIFY(m_finished->at(1)
+                    .at(2)
+                    .toMap()
+                    .value(FailureReasonKey)
+                    .toString()
+                    .contains(QStringLiteral("unknown tag")));
+
+        QVERIFY(request(MissingTag));
+        QVERIFY(waitForCompletions(3));
+        QCOMPARE(m_finished->at(2).at(1).toInt(), int(FailedCompletion));
+        QVERIFY(m_finished->at(2)
+                    .at(2)
+                    .toMap()
+                    .value(FailureReasonKey)
+                    .toString()
+                    .startsWith(QStringLiteral("network")));
+    }
+
+    void droppedConnectionsAreResumed()
+    {
+        m_http->dropNextTransferAfter(1024 * 1024 + 17);
+        startTestDaemon();
+        QVERIFY(request(BigTag));
+        QVERIFY(waitForCompletion(InstalledCompletion, 30000));
+        QVERIFY(m_http->rangeRequestCount() >= 1);
+        QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/Big.SpeechVoice/Resources/data.bin")));
+        QCOMPARE(QFileInfo(voicesFolder() + QStringLiteral("/Big.SpeechVoice/Resources/data.bin")).size(),
+            m_payloadSize);
+    }
+
+    void aKilledDaemonLeavesNoHalfBundle()
+    {
+        m_http->setBytesPerSecond(1024 * 1024);
+        startTestDaemon();
+        QVERIFY(request(BigTag));
+        QTRY_VERIFY_WITH_TIMEOUT(isDownloading(BigTag), 10000);
+        m_daemon->kill();
+        QVERIFY(!QFile::exists(voicesFolder() + QStringLiteral("/Big.SpeechVoice")));
+
+        // The client notices at once and answers with empty lists.
+        QElapsedTimer clock;
+        clock.start();
+        QVERIFY(m_manager->activeInstallations().isEmpty());
+        m_manager->cancelAllInstallations();
+        QVERIFY(clock.elapsed() < 3000);
+
+        // The next daemon clears what the killed one left, and the client finds it again.
+        m_http->setBytesPerSecond(0);
+        startTestDaemon();
+        QVERIFY(leftovers().isEmpty());
+        QVERIFY(request(SmallTag));
+        QVERIFY(waitForCompletion(InstalledCompletion));
+        QCOMPARE(m_finished->last().at(0).toString(), SmallTag);
+    }
+
+    void hostileClientsDoNotStopTheDaemon()
+    {
+        startTestDaemon();
+        QLocalSocket flood;
+        flood.connectToServer(Platform::UnixMessagePortService::socketPath(ServicePortName));
+        QVERIFY(flood.waitForConnected(2000));
+        QByteArray header(12, '\0');
+        header[11] = '\x7f';
+        header[8] = '\x7f'; // a payload of about two gigabytes
+        flood.write(header);
+        flood.write(QByteArray(4096, 'x'));
+        QVERIFY(flood.waitForBytesWritten(2000));
+        QTRY_COMPARE_WITH_TIMEOUT(flood.state(), QLocalSocket::UnconnectedState, 5000);
+
+        QLocalSocket garbage;
+        garbage.connectToServer(Platform::UnixMessagePortService::socketPath(ServicePortName));
+        QVERIFY(garbage.waitForConnected(2000));
+        // A well-formed frame whose payload does not decode, then one with a port that is no port.
+        garbage.write(QByteArray::fromHex("00000001000000000000000a") + QByteArray(10, '\xff'));
+        QVERIFY(garbage.waitForBytesWritten(2000));
+
+        QVERIFY(m_manager->activeInstallations().isEmpty());
+        QVERIFY(request(SmallTag));
+        QVERIFY(waitForCompletion(InstalledCompletion));
+    }
+
+private:
+    void makeRepository()
+    {
+        const QString repository = m_environment->path(QStringLiteral("repository"));
+        const QString sources = m_environment->path(QStringLiteral("sources"));
+        QDir().mkpath(repository);
+        auto bundle = [&](const QString &name, const QString &identifier, qint64 payload) {
+            const QString folder = TestEnvironment::writeVoiceBundle(
+                sources, name, TestEnvironment::voiceAttributes(identifier, name, QStringLiteral("en_US")));
+            QFile data(folder + QStringLiteral("/Resources/data.bin"));
+            QVERIFY(data.open(QIODevice::WriteOnly));
+            QByteArray bytes(payload, Qt::Uninitialized);
+            QRandomGenerator(7).fillRange(reinterpret_cast<quint32 *>(bytes.data()), bytes.size() / 4);
+            data.write(bytes);
+            data.close();
+            QProcess tar;
+            tar.start(QStringLiteral("tar"),
+                {QStringLiteral("-C"), sources, QStringLiteral("-czf"),
+                    repository + QLatin1Char('/') + name + QStringLiteral(".SpeechVoice.tar.gz"),
+                    name + QStringLiteral(".SpeechVoice")});
+            QVERIFY(tar.waitForFinished(30000));
+            QCOMPARE(tar.exitCode(), 0);
+        };
+        m_payloadSize = 6 * 1024 * 1024;
+        bundle(QStringLiteral("Big"), QStringLiteral("com.vendra.test.big.premium"), m_payloadSize);
+        bundle(QStringLiteral("Small"), QStringLiteral("com.vendra.test.small.premium"), 4096);
+        auto describe = [&](const QString &name, bool correctSum, const QString &path) {
+            QFile archive(repository + QLatin1Char('/') + name + QStringLiteral(".SpeechVoice.tar.gz"));
+            if (!archive.open(QIODevice::ReadOnly)) {
+                qFatal("no archive");
+            }
+            QCryptographicHash hash(QCryptographicHash::Sha256);
+            hash.addData(&archive);
+            QByteArray sum = hash.result().toHex();
+            if (!correctSum) {
+                sum[0] = sum[0] == '0' ? '1' : '0';
+            }
+            if (name == u"Big") {
+                m_bigSize = quint64(archive.size());
+            }
+            return QVariantMap {{QStringLiteral("Path"), path},
+                {QStringLiteral("SHA256"), QString::fromLatin1(sum)},
+                {QStringLiteral("ByteSize"), qint64(archive.size())},
+                {QStringLiteral("Kind"), QStringLiteral("voice")},
+                {QStringLiteral("BundleName"), QString(name + QStringLiteral(".SpeechVoice"))},
+                {QStringLiteral("ObjectID"),
+                    QStringLiteral("com.vendra.test.%1.premium").arg(name.toLower())}};
+        };
+        const QVariantMap packages = {
+            {BigTag, describe(QStringLiteral("Big"), true, QStringLiteral("Big.SpeechVoice.tar.gz"))},
+            {SmallTag, describe(QStringLiteral("Small"), true, QStringLiteral("Small.SpeechVoice.tar.gz"))},
+            {BadSumTag, describe(QStringLiteral("Big"), false, QStringLiteral("Big.SpeechVoice.tar.gz"))},
+            {MissingTag, describe(QStringLiteral("Small"), true, QStringLiteral("Gone.SpeechVoice.tar.gz"))}};
+        m_catalogue = m_environment->path(QStringLiteral("catalogue.plist"));
+        QFile file(m_catalogue);
+        QVERIFY(file.open(QIODevice::WriteOnly));
+        file.write(Platform::PropertyList::serialize(QVariantMap {{QStringLiteral("Packages"), packages}}));
+    }
+
+    void startDaemon(const QStringList &arguments)
+    {
+        m_daemon = std::make_unique<Daemon>();
+        QVERIFY2(m_daemon->start(arguments), "quillond did not start");
+    }
+    void startTestDaemon()
+    {
+        startDaemon({QStringLiteral("--catalogue"), m_catalogue, QStringLiteral("--repository"),
+            m_http->baseUrl().toString()});
+    }
+
+    bool request(const QString &tag)
+    {
+        return m_manager->_requestInstallation(tag, tag.section(QLatin1Char('.'), -2, -2), 1, tag.mid(8), 0);
+    }
+    bool isDownloading(const QString &tag)
+    {
+        for (const QVariant &r : m_manager->activeInstallations()) {
+            const QVariantMap record = r.toMap();
+            if (record.value(TagNameKey) == tag && record.value(ItemDownloadByteCountKey).toULongLong() > 0) {
+                return true;
+            }
+        }
+        return false;
+    }
+    bool waitForCompletions(int count, int timeout = 10000)
+    {
+        QElapsedTimer clock;
+        clock.start();
+        while (m_finished->size() < count && clock.elapsed() < timeout) {
+            m_finished->wait(qMax<int>(1, int(timeout - clock.elapsed())));
+        }
+        return m_finished->size() >= count;
+    }
+    bool waitForCompletion(qint32 expected, int timeout = 10000)
+    {
+        const int before = int(m_finished->size());
+        if (!waitForCompletions(before + 1, timeout)) {
+            return false;
+        }
+        const qint32 message = m_finished->at(before).at(1).toInt();
+        if (message != expected) {
+            qWarning("completion %d, expected %d: %s", message, expected,
+                qPrintable(m_finished->at(before).at(2).toMap().value(FailureReasonKey).toString()));
+        }
+        return message == expected;
+    }
+
+    std::unique_ptr<TestEnvironment> m_environment;
+    std::unique_ptr<TestHttpServer> m_http;
+    std::unique_ptr<Daemon> m_daemon;
+    std::unique_ptr<CZSpeechInstallationManager> m_manager;
+    std::unique_ptr<QSignalSpy> m_finished;
+    QString m_catalogue;
+    qint64 m_payloadSize = 0;
+    quint64 m_bigSize = 0;
+};
+
+QTEST_GUILESS_MAIN(QuillondTest)
+#include "tst_quillond.moc"
