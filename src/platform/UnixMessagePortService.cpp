@@ -12,6 +12,8 @@
 #include <QLocalSocket>
 #include <QPointer>
 
+#include <cerrno>
+#include <cstring>
 #include <poll.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
@@ -27,30 +29,33 @@ int milliseconds(double seconds)
     return seconds <= 0 ? 0 : int(qMin(seconds * 1000.0, 3600.0 * 1000.0));
 }
 
+// A client connection with plain blocking system calls: requests are synchronous, and nothing here
+// needs an event loop.
 class UnixRemotePort final : public RemoteMessagePort
 {
 public:
-    UnixRemotePort(const QString &name, std::unique_ptr<QLocalSocket> socket)
+    UnixRemotePort(const QString &name, int descriptor)
         : m_name(name)
-        , m_socket(std::move(socket))
+        , m_fd(descriptor)
     { }
+    ~UnixRemotePort() override { invalidate(); }
 
     QString name() const override { return m_name; }
 
     bool isValid() override
     {
-        if (!m_socket || m_socket->state() != QLocalSocket::ConnectedState) {
+        if (m_fd < 0) {
             return false;
         }
         // A peer that went away shows as a hang-up, or as readable with nothing to read.
-        pollfd p {int(m_socket->socketDescriptor()), POLLIN, 0};
+        pollfd p {m_fd, POLLIN, 0};
         if (::poll(&p, 1, 0) > 0) {
             if (p.revents & (POLLHUP | POLLERR | POLLNVAL)) {
                 return false;
             }
             if (p.revents & POLLIN) {
                 char c;
-                if (::recv(p.fd, &c, 1, MSG_PEEK | MSG_DONTWAIT) == 0) {
+                if (::recv(m_fd, &c, 1, MSG_PEEK | MSG_DONTWAIT) == 0) {
                     return false;
                 }
             }
@@ -64,29 +69,32 @@ public:
         if (!isValid()) {
             return {MessagePortStatus::IsInvalid, std::nullopt};
         }
-        MessageFrame frame {messageId, replyWanted ? quint32(MessageFrame::ReplyWanted) : 0u, data};
-        m_socket->write(frame.encode());
+        const QByteArray frame
+            = MessageFrame {messageId, replyWanted ? quint32(MessageFrame::ReplyWanted) : 0u, data}.encode();
         QDeadlineTimer sendDeadline(milliseconds(sendTimeout));
-        while (m_socket->bytesToWrite() > 0) {
-            if (m_socket->state() != QLocalSocket::ConnectedState) {
+        qsizetype sent = 0;
+        while (sent < frame.size()) {
+            const ssize_t n = ::send(
+                m_fd, frame.constData() + sent, size_t(frame.size() - sent), MSG_NOSIGNAL | MSG_DONTWAIT);
+            if (n > 0) {
+                sent += n;
+                continue;
+            }
+            if (n < 0 && errno != EAGAIN && errno != EWOULDBLOCK && errno != EINTR) {
+                invalidate();
                 return {MessagePortStatus::BecameInvalid, std::nullopt};
             }
-            if (sendDeadline.hasExpired()
-                || !m_socket->waitForBytesWritten(int(sendDeadline.remainingTime()))) {
-                if (m_socket->state() != QLocalSocket::ConnectedState) {
-                    return {MessagePortStatus::BecameInvalid, std::nullopt};
-                }
-                if (sendDeadline.hasExpired()) {
-                    // Half a frame may be on its way: the connection cannot be trusted any more.
-                    m_socket->abort();
-                    return {MessagePortStatus::SendTimeout, std::nullopt};
-                }
+            if (!waitFor(POLLOUT, sendDeadline)) {
+                // Half a frame may be on its way: the connection cannot be trusted any more.
+                invalidate();
+                return {MessagePortStatus::SendTimeout, std::nullopt};
             }
         }
         if (!replyWanted) {
             return {MessagePortStatus::Success, std::nullopt};
         }
         QDeadlineTimer receiveDeadline(milliseconds(receiveTimeout));
+        QByteArray buffer(64 * 1024, Qt::Uninitialized);
         while (true) {
             while (auto reply = m_reader.next()) {
                 if ((reply->flags & MessageFrame::IsReply) && reply->messageId == messageId) {
@@ -97,40 +105,52 @@ public:
                 }
             }
             if (m_reader.isBroken()) {
-                m_socket->abort();
+                invalidate();
                 return {MessagePortStatus::TransportError, std::nullopt};
             }
-            if (m_socket->bytesAvailable() > 0) {
-                (void)m_reader.append(m_socket->readAll());
+            const ssize_t n = ::recv(m_fd, buffer.data(), size_t(buffer.size()), MSG_DONTWAIT);
+            if (n > 0) {
+                (void)m_reader.append(QByteArray(buffer.constData(), n));
                 continue;
             }
-            if (m_socket->state() != QLocalSocket::ConnectedState) {
+            if (n == 0 || (errno != EAGAIN && errno != EWOULDBLOCK && errno != EINTR)) {
+                invalidate();
                 return {MessagePortStatus::BecameInvalid, std::nullopt};
             }
-            if (receiveDeadline.hasExpired()
-                || !m_socket->waitForReadyRead(int(receiveDeadline.remainingTime()))) {
-                if (m_socket->state() != QLocalSocket::ConnectedState) {
-                    return {MessagePortStatus::BecameInvalid, std::nullopt};
-                }
-                if (receiveDeadline.hasExpired()) {
-                    // A late answer would be taken for the next request's: start afresh.
-                    m_socket->abort();
-                    return {MessagePortStatus::ReceiveTimeout, std::nullopt};
-                }
+            if (!waitFor(POLLIN, receiveDeadline)) {
+                // A late answer would be taken for the next request's: start afresh.
+                invalidate();
+                return {MessagePortStatus::ReceiveTimeout, std::nullopt};
             }
         }
     }
 
     void invalidate() override
     {
-        if (m_socket) {
-            m_socket->abort();
+        if (m_fd >= 0) {
+            ::close(m_fd);
+            m_fd = -1;
         }
     }
 
 private:
+    bool waitFor(short events, const QDeadlineTimer &deadline)
+    {
+        while (!deadline.hasExpired()) {
+            pollfd p {m_fd, events, 0};
+            const int ready = ::poll(&p, 1, int(qMin<qint64>(deadline.remainingTime(), 1000)));
+            if (ready > 0) {
+                return true;
+            }
+            if (ready < 0 && errno != EINTR) {
+                return false;
+            }
+        }
+        return false;
+    }
+
     QString m_name;
-    std::unique_ptr<QLocalSocket> m_socket;
+    int m_fd = -1;
     MessageFrameReader m_reader;
 };
 
@@ -320,16 +340,28 @@ std::unique_ptr<RemoteMessagePort> UnixMessagePortService::createRemotePort(cons
     if (!isValidPortName(name)) {
         return nullptr;
     }
-    const QString path = socketPath(name);
-    if (!QFile::exists(path)) {
+    const QByteArray path = QFile::encodeName(socketPath(name));
+    sockaddr_un address {};
+    if (path.size() >= qsizetype(sizeof(address.sun_path))) {
         return nullptr;
     }
-    auto socket = std::make_unique<QLocalSocket>();
-    socket->connectToServer(path);
-    if (!socket->waitForConnected(1000)) {
+    address.sun_family = AF_UNIX;
+    std::memcpy(address.sun_path, path.constData(), size_t(path.size()));
+    const int fd = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
+    if (fd < 0) {
         return nullptr;
     }
-    return std::make_unique<UnixRemotePort>(name, std::move(socket));
+    // Local connections complete at once or are refused; a full backlog is the only wait, and it is
+    // not waited out for more than a second.
+    QDeadlineTimer deadline(1000);
+    while (::connect(fd, reinterpret_cast<const sockaddr *>(&address), sizeof(address)) != 0) {
+        if ((errno != EAGAIN && errno != EINTR) || deadline.hasExpired()) {
+            ::close(fd);
+            return nullptr;
+        }
+        ::usleep(1000);
+    }
+    return std::make_unique<UnixRemotePort>(name, fd);
 }
 
 std::unique_ptr<LocalMessagePort> UnixMessagePortService::createLocalPort(

@@ -1,0 +1,29 @@
+// Keyed archives arrive from other processes: installation requests, status records, notifications.
+#include "installation/SecureArchiving.h"
+#include "platform/KeyedArchive.h"
+
+#include <QLoggingCategory>
+
+using namespace Cadenza::Platform;
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
+{
+    static const bool quiet = [] {
+        QLoggingCategory::setFilterRules(QStringLiteral("*=false"));
+        return true;
+    }();
+    (void)quiet;
+    const QByteArray bytes = QByteArray::fromRawData(reinterpret_cast<const char *>(data), qsizetype(size));
+    const ArchiveClasses all
+        = ArchiveClasses(ArchiveClass::Array) | ArchiveClass::Dictionary | PropertyListLeaves;
+    if (const auto value = KeyedArchive::decode(bytes, all)) {
+        // Whatever decodes must archive again and decode to the same value.
+        const auto again = KeyedArchive::encode(*value);
+        if (!again || KeyedArchive::decode(*again, all) != value) {
+            __builtin_trap();
+        }
+    }
+    (void)Cadenza::CZDecodeSecureArray(bytes);
+    (void)Cadenza::CZDecodeSecureDictionary(bytes);
+    return 0;
+}
