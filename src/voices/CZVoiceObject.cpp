@@ -1,0 +1,308 @@
+#include "CZVoiceObject.h"
+
+#include "locale/LocaleDisplayName.h"
+#include "platform/Assertion.h"
+#include "platform/DistributedNotificationCenter.h"
+#include "platform/Locale.h"
+#include "platform/LocalizationTable.h"
+#include "platform/PreferencesStore.h"
+#include "platform/Services.h"
+#include "platform/SpeechSynthesisService.h"
+#include "platform/UserLocaleService.h"
+#include "platform/VoiceDescription.h"
+#include "speech-items/CZSpeechItem.h"
+#include "speech-items/CZSpeechItem_p.h"
+#include "voices/SpeechSynthesizer.h"
+#include "voices/WordStem.h"
+
+namespace Cadenza {
+
+using Platform::Locale;
+using Platform::Services;
+namespace VoiceAttribute = Platform::VoiceAttribute;
+
+const QString CZVoiceObject::PreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
+const QString CZVoiceObject::VisibleIdentifiersKey = QStringLiteral("VisibleIdentifiers");
+const QString CZVoiceObject::DefaultVoiceChangedNotification
+    = QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification");
+
+CZVoiceObject::~CZVoiceObject() = default;
+
+qint64 CZVoiceObject::visibilityFromTable(const std::optional<QVariantMap> &table, const QString &attributesIdentifier,
+    const QString &givenIdentifier, bool premiumFallback)
+{
+    if (!table) {
+        return 2;
+    }
+    QVariant value = table->value(attributesIdentifier);
+    // A compact voice inherits what the user chose for its premium form.
+    if (!value.isValid() && premiumFallback && !givenIdentifier.endsWith(QLatin1String("premium"))
+        && !givenIdentifier.endsWith(QLatin1String("compact"))) {
+        value = table->value(givenIdentifier + QStringLiteral(".premium"));
+    }
+    return SpeechItemPrivate::isNumber(value) ? value.toLongLong() : 2;
+}
+
+CZVoiceObjectPtr CZVoiceObject::make(const QString &identifier, const std::optional<QVariantMap> &table)
+{
+    auto voice = std::shared_ptr<CZVoiceObject>(new CZVoiceObject);
+    voice->_voiceAttributes = Services::speechSynthesis().attributesForVoice(identifier);
+    voice->_visibility = visibilityFromTable(table, voice->identifier(), identifier, true);
+    return voice;
+}
+
+CZVoiceObjectPtr CZVoiceObject::initWithVoiceIdentifier(const QString &identifier)
+{
+    return make(identifier, visibleVoicesTable());
+}
+
+QString CZVoiceObject::displayName() const
+{
+    return SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::Name));
+}
+
+QString CZVoiceObject::displayNameRoot() const
+{
+    const QString root = SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::NameRoot));
+    if (!root.isNull()) {
+        return root;
+    }
+    const QString name = displayName();
+    if (name.endsWith(QLatin1String("Compact")) || name.endsWith(QLatin1String("Premium"))) {
+        return name.chopped(qMin<qsizetype>(8, name.size()));
+    }
+    return name;
+}
+
+QString CZVoiceObject::identifier() const
+{
+    return SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::Identifier));
+}
+
+QString CZVoiceObject::gender() const
+{
+    return SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::Gender));
+}
+
+QString CZVoiceObject::localeIdentifier() const
+{
+    QString locale = SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::LocaleIdentifier));
+    if (locale.isEmpty()) {
+        locale = SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::Language));
+    }
+    if (locale.isEmpty()) {
+        locale = QStringLiteral("en_US");
+    }
+    return Locale::canonicalLocaleIdentifier(locale);
+}
+
+QString CZVoiceObject::languageIdentifier() const
+{
+    const QString code = Locale::componentsFromLocaleIdentifier(localeIdentifier()).languageCode;
+    return code.isEmpty() ? QString() : code;
+}
+
+QString CZVoiceObject::countryIdentifier() const
+{
+    const QString code = Locale::componentsFromLocaleIdentifier(localeIdentifier()).countryCode;
+    return code.isEmpty() ? QString() : code;
+}
+
+QString CZVoiceObject::languageDisplayString() const
+{
+    return SpeechItemPrivate::conversionDisplayName(Locale::LanguageCodeKey, languageIdentifier());
+}
+
+QString CZVoiceObject::countryDisplayString() const
+{
+    const auto parts = Locale::componentsFromLocaleIdentifier(localeIdentifier());
+    QString name;
+    if (!parts.countryCode.isEmpty()) {
+        name = SpeechItemPrivate::conversionDisplayName(Locale::CountryCodeKey, parts.countryCode);
+    } else if (!parts.variantCode.isEmpty()) {
+        name = SpeechItemPrivate::conversionDisplayName(Locale::VariantCodeKey, parts.variantCode);
+    } else if (!parts.languageCode.isEmpty()) {
+        name = SpeechItemPrivate::conversionDisplayName(Locale::LanguageCodeKey, parts.languageCode);
+    }
+    return name.isNull() ? QStringLiteral("") : name;
+}
+
+qint64 CZVoiceObject::relativeDesirability() const
+{
+    const QVariant value = _voiceAttributes.value(VoiceAttribute::RelativeDesirability);
+    return SpeechItemPrivate::isNumber(value) ? value.toLongLong() : 0;
+}
+
+bool CZVoiceObject::showsInFullListOnly() const
+{
+    const QVariant value = _voiceAttributes.value(VoiceAttribute::ShowInFullListOnly);
+    return SpeechItemPrivate::isNumber(value) && value.toBool();
+}
+
+QString CZVoiceObject::genderDisplayString() const
+{
+    const QString value = gender();
+    const Platform::LocalizationTable &table = Platform::LocalizationTable::shared();
+    if (value == Platform::VoiceGender::Male) {
+        return table.text(QStringLiteral("Male"));
+    }
+    if (value == Platform::VoiceGender::Female) {
+        return table.text(QStringLiteral("Female"));
+    }
+    if (value == Platform::VoiceGender::Neuter) {
+        return table.text(QStringLiteral("Novelty"));
+    }
+    return {};
+}
+
+bool CZVoiceObject::doesMatchSystemLocale() const
+{
+    return isSameLocaleIdentifier(systemLocaleIdentifier(), localeIdentifier());
+}
+
+bool CZVoiceObject::isAppropriateForSystemLangauge() const
+{
+    return isSameLangaugeFromLocaleIdentifier(systemLocaleIdentifier(), localeIdentifier());
+}
+
+int CZVoiceObject::compare(const CZVoiceObject &other) const
+{
+    return SpeechItemPrivate::compareForDisplay(displayName(), other.displayName());
+}
+
+bool CZVoiceObject::matchesSearchString(const QString &searchString) const
+{
+    const QStringList words = searchString.split(QLatin1Char(' '));
+    QString language, country, genderText;
+    bool namesKnown = false;
+    for (const QString &word : words) {
+        if (word.isEmpty()) {
+            continue;
+        }
+        if (containsWordStem(displayName(), word)) {
+            continue;
+        }
+        if (!namesKnown) {
+            language = languageDisplayString();
+            country = countryDisplayString();
+            genderText = genderDisplayString();
+            namesKnown = true;
+        }
+        if (!containsWordStem(language, word) && !containsWordStem(country, word) && !containsWordStem(genderText, word)) {
+            return false;
+        }
+    }
+    return true;
+}
+
+QString CZVoiceObject::description() const
+{
+    return QStringLiteral("Name: %1, Identifier: %2, Locale: %3, Language: %4, Country: %5, Gender: %6, Download: %7 (%8)")
+        .arg(displayName(), identifier(), localeIdentifier(), languageDisplayString(), countryDisplayString(),
+            genderDisplayString())
+        .arg(_downloadStatus)
+        .arg(_downloadPercentComplete, 0, 'f', 6);
+}
+
+QString CZVoiceObject::systemLocaleIdentifier()
+{
+    if (const auto speech = Services::speechSynthesis().speechLanguageLocale()) {
+        return *speech;
+    }
+    const QStringList preferred = Services::userLocale().preferredLanguages();
+    if (preferred.isEmpty()) {
+        return {};
+    }
+    auto parts = Locale::componentsFromLocaleIdentifier(preferred.first());
+    if (!parts.countryCode.isEmpty()) {
+        return preferred.first();
+    }
+    const QString country
+        = Locale::componentsFromLocaleIdentifier(Services::userLocale().currentLocaleIdentifier()).countryCode;
+    if (!country.isEmpty()) {
+        parts.countryCode = country;
+    }
+    return Locale::localeIdentifierFromComponents(parts);
+}
+
+bool CZVoiceObject::isSameLocaleIdentifier(const QString &first, const QString &secondLocaleIdentifier)
+{
+    return CZSpeechItem::isSameLocaleIdentifier(first, secondLocaleIdentifier);
+}
+
+bool CZVoiceObject::isSameLangaugeFromLocaleIdentifier(const QString &first, const QString &secondLocaleIdentifier)
+{
+    return CZSpeechItem::isSameLangaugeFromLocaleIdentifier(first, secondLocaleIdentifier);
+}
+
+std::optional<QVariantMap> CZVoiceObject::visibleVoicesTable()
+{
+    Platform::PreferencesStore &preferences = Services::preferences();
+    (void)preferences.synchronize(PreferencesDomain);
+    const QVariant table = preferences.value(VisibleIdentifiersKey, PreferencesDomain);
+    if (table.typeId() != QMetaType::QVariantMap) {
+        return std::nullopt;
+    }
+    return table.toMap();
+}
+
+void CZVoiceObject::setVisibleVoicesTable(const QVariantMap &table)
+{
+    Platform::PreferencesStore &preferences = Services::preferences();
+    preferences.setValue(VisibleIdentifiersKey, table, PreferencesDomain);
+    (void)preferences.synchronize(PreferencesDomain);
+    Services::notifications().postNotification(DefaultVoiceChangedNotification);
+}
+
+QList<CZVoiceObjectPtr> CZVoiceObject::visibleVoicesForLocaleIdentifier(const QString &localeIdentifier,
+    const QStringList &additionalRequiredVoices, bool allowAllVoices)
+{
+    const QStringList candidates
+        = allowAllVoices ? SpeechSynthesizer::allVoices() : SpeechSynthesizer::avaliableMainstreamVoices();
+    Platform::SpeechSynthesisService &service = Services::speechSynthesis();
+
+    // First pass: is there a voice of exactly this locale, or at least of its language?
+    bool exactMatch = false;
+    bool languageMatch = false;
+    for (const QString &candidate : candidates) {
+        const QVariantMap attributes = service.attributesForVoice(candidate);
+        const QString locale = SpeechItemPrivate::stringValue(attributes.value(VoiceAttribute::LocaleIdentifier));
+        if (isSameLocaleIdentifier(locale, localeIdentifier)) {
+            exactMatch = true;
+            languageMatch = true;
+            break;
+        }
+        if (isSameLangaugeFromLocaleIdentifier(locale, localeIdentifier)) {
+            languageMatch = true;
+        }
+    }
+    const QString defaultVoice = allowAllVoices ? SpeechSynthesizer::defaultVoiceFromAllVoices()
+                                                : SpeechSynthesizer::defaultVoiceFromMainstreamVoices();
+
+    // Read once for the whole pass: the table and the system locale cannot change in between.
+    const std::optional<QVariantMap> table = visibleVoicesTable();
+    const QString system = systemLocaleIdentifier();
+    QList<CZVoiceObjectPtr> included;
+    for (const QString &candidate : candidates) {
+        CZVoiceObjectPtr voice = make(candidate, table);
+        const qint64 visibility = voice->visibility();
+        const bool automatic = visibility == 2 && !voice->showsInFullListOnly();
+        bool include = visibility == 1;
+        if (!include && automatic) {
+            include = exactMatch ? isSameLocaleIdentifier(system, voice->localeIdentifier())
+                                 : isSameLangaugeFromLocaleIdentifier(system, voice->localeIdentifier());
+        }
+        if (!include && automatic && !languageMatch) {
+            include = isSameLocaleIdentifier(voice->localeIdentifier(), QStringLiteral("en_US"));
+        }
+        if (!include) {
+            include = voice->identifier() == defaultVoice || additionalRequiredVoices.contains(voice->identifier());
+        }
+        if (include) {
+            included.append(voice);
+        }
+    }
+    return included;
+}
+
+} // namespace Cadenza
