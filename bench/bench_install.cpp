@@ -45,7 +45,8 @@ int main(int argc, char *argv[])
     const qint64 megabytes = argc > 1 ? std::atoll(argv[1]) : 100;
     const int runs = argc > 2 ? std::atoi(argv[2]) : 3;
     QTemporaryDir world;
-    for (const char *name : {"XDG_DATA_HOME", "XDG_CONFIG_HOME", "XDG_CACHE_HOME", "XDG_RUNTIME_DIR", "CADENZA_ROOT"}) {
+    for (const char *name :
+        {"XDG_DATA_HOME", "XDG_CONFIG_HOME", "XDG_CACHE_HOME", "XDG_RUNTIME_DIR", "CADENZA_ROOT"}) {
         const QString folder = world.filePath(QString::fromLatin1(name));
         QDir().mkpath(folder);
         qputenv(name, QFile::encodeName(folder));
@@ -74,7 +75,9 @@ int main(int argc, char *argv[])
     QDir().mkpath(repository);
     const QString archive = repository + QStringLiteral("/Large.SpeechVoice.tar.gz");
     QProcess tar;
-    tar.start(QStringLiteral("tar"), {QStringLiteral("-C"), sources, QStringLiteral("-czf"), archive, QStringLiteral("Large.SpeechVoice")});
+    tar.start(QStringLiteral("tar"),
+        {QStringLiteral("-C"), sources, QStringLiteral("-czf"), archive,
+            QStringLiteral("Large.SpeechVoice")});
     tar.waitForFinished(600000);
     QFile archiveFile(archive);
     archiveFile.open(QIODevice::ReadOnly);
@@ -83,8 +86,9 @@ int main(int argc, char *argv[])
     const qint64 archiveSize = archiveFile.size();
     const QVariantMap packages {{QStringLiteral("VOICEID:bench.large"),
         QVariantMap {{QStringLiteral("Path"), QStringLiteral("Large.SpeechVoice.tar.gz")},
-            {QStringLiteral("SHA256"), QString::fromLatin1(hash.result().toHex())}, {QStringLiteral("ByteSize"), archiveSize},
-            {QStringLiteral("Kind"), QStringLiteral("voice")}, {QStringLiteral("BundleName"), QStringLiteral("Large.SpeechVoice")},
+            {QStringLiteral("SHA256"), QString::fromLatin1(hash.result().toHex())},
+            {QStringLiteral("ByteSize"), archiveSize}, {QStringLiteral("Kind"), QStringLiteral("voice")},
+            {QStringLiteral("BundleName"), QStringLiteral("Large.SpeechVoice")},
             {QStringLiteral("ObjectID"), QStringLiteral("bench.large")}}}};
     const QString catalogue = world.filePath(QStringLiteral("catalogue.plist"));
     QFile file(catalogue);
@@ -95,8 +99,9 @@ int main(int argc, char *argv[])
     qputenv("QT_LOGGING_RULES", "quillond*=false");
     QProcess daemon;
     daemon.setProcessChannelMode(QProcess::ForwardedErrorChannel);
-    daemon.start(QStringLiteral(QUILLOND_PATH), {QStringLiteral("--catalogue"), catalogue, QStringLiteral("--repository"),
-                                                    QUrl::fromLocalFile(repository).toString()});
+    daemon.start(QStringLiteral(QUILLOND_PATH),
+        {QStringLiteral("--catalogue"), catalogue, QStringLiteral("--repository"),
+            QUrl::fromLocalFile(repository).toString()});
     CZSpeechInstallationManager manager;
     for (int i = 0; i < 100 && !manager._serverIsRunning(); ++i) {
         QThread::msleep(50);
@@ -113,8 +118,8 @@ int main(int argc, char *argv[])
                     outcome = message;
                     loop.quit();
                 });
-            manager._requestInstallation(QStringLiteral("VOICEID:bench.large"), QStringLiteral("Large"), quint64(archiveSize),
-                QStringLiteral("bench.large"), 0);
+            manager._requestInstallation(QStringLiteral("VOICEID:bench.large"), QStringLiteral("Large"),
+                quint64(archiveSize), QStringLiteral("bench.large"), 0);
             loop.exec();
             if (outcome != InstallerProtocol::InstalledCompletion) {
                 qFatal("installation failed");
@@ -122,9 +127,11 @@ int main(int argc, char *argv[])
         }));
         QDir(scratch).removeRecursively();
         QDir().mkpath(scratch);
-        copies.push_back(runCommand(QStringLiteral("cp"), {archive, scratch + QStringLiteral("/copy.tar.gz")}));
+        copies.push_back(
+            runCommand(QStringLiteral("cp"), {archive, scratch + QStringLiteral("/copy.tar.gz")}));
         sums.push_back(runCommand(QStringLiteral("sha256sum"), {archive}));
-        unpacks.push_back(runCommand(QStringLiteral("tar"), {QStringLiteral("-xzf"), archive, QStringLiteral("-C"), scratch}));
+        unpacks.push_back(runCommand(
+            QStringLiteral("tar"), {QStringLiteral("-xzf"), archive, QStringLiteral("-C"), scratch}));
     }
     std::sort(installs.begin(), installs.end());
     std::sort(copies.begin(), copies.end());
@@ -132,7 +139,8 @@ int main(int argc, char *argv[])
     std::sort(unpacks.begin(), unpacks.end());
     const double floor = median(copies) + median(sums) + median(unpacks);
     const std::string size = std::to_string(megabytes) + " MB";
-    printTable(("Installing a " + size + " bundle from file:// (median of " + std::to_string(runs) + ")").c_str(),
+    printTable(
+        ("Installing a " + size + " bundle from file:// (median of " + std::to_string(runs) + ")").c_str(),
         {{"quillond: request to installed", median(installs), "s", "cp + sha256sum + tar -xzf", floor},
             {"  cp of the archive", median(copies), "s", "", 0},
             {"  sha256sum of the archive", median(sums), "s", "", 0},

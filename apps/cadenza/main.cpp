@@ -1,6 +1,7 @@
 // cadenza: Cadenza's command-line tool.
 
 #include "InstallerCommands.h"
+#include "LanguagesCommand.h"
 #include "PostCommand.h"
 #include "SayCommand.h"
 #include "VoicesCommand.h"
@@ -19,6 +20,7 @@ void printUsage(FILE *to)
                "Commands:\n"
                "  voices   list the installed voices\n"
                "  say      speak a text, or write it to a WAV file\n"
+               "  languages list the installed and downloadable recognition languages\n"
                "  post     post a notification to every process of the session\n"
                "  status   show what the installer daemon is installing\n"
                "  install  install a voice or recognition language by its tag\n"
@@ -52,6 +54,9 @@ int main(int argc, char *argv[])
     }
     if (command == u"say") {
         return SayCommand::run(arguments);
+    }
+    if (command == u"languages") {
+        return LanguagesCommand::run(arguments);
     }
     if (command == u"post") {
         return PostCommand::run(arguments);

@@ -4,6 +4,7 @@
 #include "DBusNotificationCenter.h"
 #include "EnvironmentUserLocaleService.h"
 #include "FilePreferencesStore.h"
+#include "RecognitionService.h"
 #include "UnixMessagePortService.h"
 
 #include <QMutex>
@@ -20,6 +21,7 @@ struct Registry
     std::shared_ptr<UserLocaleService> userLocale;
     std::shared_ptr<MessagePortService> messagePorts;
     std::shared_ptr<DistributedNotificationCenter> notifications;
+    std::shared_ptr<RecognitionService> recognition;
 };
 
 Registry &registry()
@@ -102,6 +104,20 @@ void Services::setMessagePorts(std::shared_ptr<MessagePortService> service)
 void Services::setNotifications(std::shared_ptr<DistributedNotificationCenter> center)
 {
     replace(&Registry::notifications, std::move(center));
+}
+
+} // namespace Cadenza::Platform
+
+namespace Cadenza::Platform {
+
+RecognitionService &Services::recognition()
+{
+    return serviceOf<RecognitionService, BundleRecognitionService>(&Registry::recognition);
+}
+
+void Services::setRecognition(std::shared_ptr<RecognitionService> service)
+{
+    replace(&Registry::recognition, std::move(service));
 }
 
 } // namespace Cadenza::Platform

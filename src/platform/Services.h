@@ -10,6 +10,7 @@ namespace Cadenza::Platform {
 class DistributedNotificationCenter;
 class MessagePortService;
 class PreferencesStore;
+class RecognitionService;
 class SpeechSynthesisService;
 class UserLocaleService;
 
@@ -25,6 +26,7 @@ public:
     static UserLocaleService &userLocale();
     static MessagePortService &messagePorts();
     static DistributedNotificationCenter &notifications();
+    static RecognitionService &recognition();
 
     /// Replaces a service; passing nullptr returns to the Linux implementation.
     static void setPreferences(std::shared_ptr<PreferencesStore> store);
@@ -32,6 +34,7 @@ public:
     static void setUserLocale(std::shared_ptr<UserLocaleService> service);
     static void setMessagePorts(std::shared_ptr<MessagePortService> service);
     static void setNotifications(std::shared_ptr<DistributedNotificationCenter> center);
+    static void setRecognition(std::shared_ptr<RecognitionService> service);
 };
 
 } // namespace Cadenza::Platform

@@ -25,7 +25,8 @@ namespace {
 
 const QString CatalogueResource = QStringLiteral(":/cadenza/SpeechDataDefaults.plist");
 
-struct SharedState {
+struct SharedState
+{
     QMutex mutex;
     std::optional<QVariantMap> catalogue;
     bool catalogueLoaded = false;
@@ -119,8 +120,8 @@ using namespace SpeechItemPrivate;
 CZSpeechItem::CZSpeechItem() = default;
 CZSpeechItem::~CZSpeechItem() = default;
 
-CZSpeechItemPtr CZSpeechItem::initWithDownloadableBundleIdentifier(const QString &bundleIdentifier,
-    const QVariant &properties)
+CZSpeechItemPtr CZSpeechItem::initWithDownloadableBundleIdentifier(
+    const QString &bundleIdentifier, const QVariant &properties)
 {
     auto item = std::make_shared<CZSpeechItem>();
     if (!item->initializeFromCatalogue(bundleIdentifier, properties)) {
@@ -170,14 +171,16 @@ bool CZSpeechItem::isSameLocaleIdentifier(const QString &first, const QString &s
     return a.countryCode.compare(b.countryCode, Qt::CaseInsensitive) == 0;
 }
 
-bool CZSpeechItem::isSameLangaugeFromLocaleIdentifier(const QString &first, const QString &secondLocaleIdentifier)
+bool CZSpeechItem::isSameLangaugeFromLocaleIdentifier(
+    const QString &first, const QString &secondLocaleIdentifier)
 {
     const QString a = Locale::componentsFromLocaleIdentifier(first).languageCode;
     const QString b = Locale::componentsFromLocaleIdentifier(secondLocaleIdentifier).languageCode;
     return !a.isEmpty() && !b.isEmpty() && a.compare(b, Qt::CaseInsensitive) == 0;
 }
 
-bool CZSpeechItem::isLocaleIdentifier(const QString &localeIdentifier, const QStringList &containedInLocaleIdentifiers)
+bool CZSpeechItem::isLocaleIdentifier(
+    const QString &localeIdentifier, const QStringList &containedInLocaleIdentifiers)
 {
     for (const QString &candidate : containedInLocaleIdentifiers) {
         if (isSameLocaleIdentifier(candidate, localeIdentifier)) {
@@ -250,7 +253,8 @@ QString CZSpeechItem::displayStringForTimeRemaining(double seconds)
     if (seconds < 7200) {
         return table.text(QStringLiteral("DownloadingProgressTimeRemainingAboutAnHour"));
     }
-    return table.format(QStringLiteral("DownloadingProgressTimeRemainingNHours"), {numbers.toString(qint64(seconds / 3600))});
+    return table.format(
+        QStringLiteral("DownloadingProgressTimeRemainingNHours"), {numbers.toString(qint64(seconds / 3600))});
 }
 
 QVariantMap CZSpeechItem::installationDictionaryCache()
@@ -264,7 +268,8 @@ QVariantMap CZSpeechItem::installationDictionaryCache()
         if (parsed && parsed->typeId() == QMetaType::QVariantMap) {
             s.catalogue = parsed->toMap();
         } else {
-            qCWarning(Platform::lcInstallation, "Cannot read the installation catalogue: %s", qPrintable(error));
+            qCWarning(
+                Platform::lcInstallation, "Cannot read the installation catalogue: %s", qPrintable(error));
         }
     }
     return s.catalogue.value_or(QVariantMap());
@@ -291,8 +296,8 @@ QString CZSpeechItem::displayTitle() const
     if (!_showCountryInDisplayTitle) {
         return languageDisplayString();
     }
-    return LocalizationTable::shared().format(QStringLiteral("LanguageWithCountryGroupFormat"),
-        {languageDisplayString(), countryDisplayString()});
+    return LocalizationTable::shared().format(
+        QStringLiteral("LanguageWithCountryGroupFormat"), {languageDisplayString(), countryDisplayString()});
 }
 
 QString CZSpeechItem::languageIdentifier() const
@@ -308,7 +313,8 @@ QString CZSpeechItem::countryIdentifier() const
 QString CZSpeechItem::languageDisplayString() const
 {
     const QString language = languageIdentifier();
-    const QString name = language.isEmpty() ? QString() : conversionDisplayName(Locale::LanguageCodeKey, language);
+    const QString name
+        = language.isEmpty() ? QString() : conversionDisplayName(Locale::LanguageCodeKey, language);
     if (!name.isNull()) {
         return name;
     }
@@ -318,7 +324,8 @@ QString CZSpeechItem::languageDisplayString() const
         qPrintable(QStringLiteral("Language display name is nil for locale: %1, lang: %2, for curLocale: %3, "
                                   "autoCurLocale: %4, prefLangs: %5.")
                        .arg(localeIdentifier(), language, _conversionLocale().identifier(),
-                           Platform::Services::userLocale().currentLocaleIdentifier(), preferred.join(QStringLiteral(", ")))));
+                           Platform::Services::userLocale().currentLocaleIdentifier(),
+                           preferred.join(QStringLiteral(", ")))));
     std::abort();
 }
 

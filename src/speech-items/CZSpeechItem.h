@@ -34,19 +34,20 @@ public:
 
     /// An item from its catalogue entry; nullptr when the entry is not a dictionary. Values of the
     /// wrong type count as absent.
-    [[nodiscard]] static CZSpeechItemPtr initWithDownloadableBundleIdentifier(const QString &bundleIdentifier,
-        const QVariant &properties);
+    [[nodiscard]] static CZSpeechItemPtr initWithDownloadableBundleIdentifier(
+        const QString &bundleIdentifier, const QVariant &properties);
 
     // The class side.
     /// The speech service's speech-language locale, or a null string.
     [[nodiscard]] static QString systemLocaleIdentifier();
     /// Same language (case-insensitive) and either no country on both sides or the same country.
-    [[nodiscard]] static bool isSameLocaleIdentifier(const QString &first, const QString &secondLocaleIdentifier);
+    [[nodiscard]] static bool isSameLocaleIdentifier(
+        const QString &first, const QString &secondLocaleIdentifier);
     /// Same language code, case-insensitive; both must have one.
-    [[nodiscard]] static bool isSameLangaugeFromLocaleIdentifier(const QString &first,
-        const QString &secondLocaleIdentifier);
-    [[nodiscard]] static bool isLocaleIdentifier(const QString &localeIdentifier,
-        const QStringList &containedInLocaleIdentifiers);
+    [[nodiscard]] static bool isSameLangaugeFromLocaleIdentifier(
+        const QString &first, const QString &secondLocaleIdentifier);
+    [[nodiscard]] static bool isLocaleIdentifier(
+        const QString &localeIdentifier, const QStringList &containedInLocaleIdentifiers);
     /// The items shown for @p forLocaleIdentifier: shown by the user, of that locale, or required;
     /// when none is, the first en_US item alone.
     [[nodiscard]] static QList<CZSpeechItemPtr> visibleObjectsFromItems(const QList<CZSpeechItemPtr> &items,

@@ -28,8 +28,8 @@ const QString CZVoiceObject::DefaultVoiceChangedNotification
 
 CZVoiceObject::~CZVoiceObject() = default;
 
-qint64 CZVoiceObject::visibilityFromTable(const std::optional<QVariantMap> &table, const QString &attributesIdentifier,
-    const QString &givenIdentifier, bool premiumFallback)
+qint64 CZVoiceObject::visibilityFromTable(const std::optional<QVariantMap> &table,
+    const QString &attributesIdentifier, const QString &givenIdentifier, bool premiumFallback)
 {
     if (!table) {
         return 2;
@@ -188,7 +188,8 @@ bool CZVoiceObject::matchesSearchString(const QString &searchString) const
             genderText = genderDisplayString();
             namesKnown = true;
         }
-        if (!containsWordStem(language, word) && !containsWordStem(country, word) && !containsWordStem(genderText, word)) {
+        if (!containsWordStem(language, word) && !containsWordStem(country, word)
+            && !containsWordStem(genderText, word)) {
             return false;
         }
     }
@@ -197,7 +198,8 @@ bool CZVoiceObject::matchesSearchString(const QString &searchString) const
 
 QString CZVoiceObject::description() const
 {
-    return QStringLiteral("Name: %1, Identifier: %2, Locale: %3, Language: %4, Country: %5, Gender: %6, Download: %7 (%8)")
+    return QStringLiteral(
+        "Name: %1, Identifier: %2, Locale: %3, Language: %4, Country: %5, Gender: %6, Download: %7 (%8)")
         .arg(displayName(), identifier(), localeIdentifier(), languageDisplayString(), countryDisplayString(),
             genderDisplayString())
         .arg(_downloadStatus)
@@ -218,7 +220,8 @@ QString CZVoiceObject::systemLocaleIdentifier()
         return preferred.first();
     }
     const QString country
-        = Locale::componentsFromLocaleIdentifier(Services::userLocale().currentLocaleIdentifier()).countryCode;
+        = Locale::componentsFromLocaleIdentifier(Services::userLocale().currentLocaleIdentifier())
+              .countryCode;
     if (!country.isEmpty()) {
         parts.countryCode = country;
     }
@@ -230,7 +233,8 @@ bool CZVoiceObject::isSameLocaleIdentifier(const QString &first, const QString &
     return CZSpeechItem::isSameLocaleIdentifier(first, secondLocaleIdentifier);
 }
 
-bool CZVoiceObject::isSameLangaugeFromLocaleIdentifier(const QString &first, const QString &secondLocaleIdentifier)
+bool CZVoiceObject::isSameLangaugeFromLocaleIdentifier(
+    const QString &first, const QString &secondLocaleIdentifier)
 {
     return CZSpeechItem::isSameLangaugeFromLocaleIdentifier(first, secondLocaleIdentifier);
 }
@@ -254,8 +258,8 @@ void CZVoiceObject::setVisibleVoicesTable(const QVariantMap &table)
     Services::notifications().postNotification(DefaultVoiceChangedNotification);
 }
 
-QList<CZVoiceObjectPtr> CZVoiceObject::visibleVoicesForLocaleIdentifier(const QString &localeIdentifier,
-    const QStringList &additionalRequiredVoices, bool allowAllVoices)
+QList<CZVoiceObjectPtr> CZVoiceObject::visibleVoicesForLocaleIdentifier(
+    const QString &localeIdentifier, const QStringList &additionalRequiredVoices, bool allowAllVoices)
 {
     const QStringList candidates
         = allowAllVoices ? SpeechSynthesizer::allVoices() : SpeechSynthesizer::avaliableMainstreamVoices();
@@ -266,7 +270,8 @@ QList<CZVoiceObjectPtr> CZVoiceObject::visibleVoicesForLocaleIdentifier(const QS
     bool languageMatch = false;
     for (const QString &candidate : candidates) {
         const QVariantMap attributes = service.attributesForVoice(candidate);
-        const QString locale = SpeechItemPrivate::stringValue(attributes.value(VoiceAttribute::LocaleIdentifier));
+        const QString locale
+            = SpeechItemPrivate::stringValue(attributes.value(VoiceAttribute::LocaleIdentifier));
         if (isSameLocaleIdentifier(locale, localeIdentifier)) {
             exactMatch = true;
             languageMatch = true;
@@ -296,7 +301,8 @@ QList<CZVoiceObjectPtr> CZVoiceObject::visibleVoicesForLocaleIdentifier(const QS
             include = isSameLocaleIdentifier(voice->localeIdentifier(), QStringLiteral("en_US"));
         }
         if (!include) {
-            include = voice->identifier() == defaultVoice || additionalRequiredVoices.contains(voice->identifier());
+            include = voice->identifier() == defaultVoice
+                || additionalRequiredVoices.contains(voice->identifier());
         }
         if (include) {
             included.append(voice);

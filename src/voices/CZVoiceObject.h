@@ -74,22 +74,23 @@ public:
     /// The user's speech locale: the speech language, else the first preferred language with a
     /// country (the current locale's country added when it has none).
     [[nodiscard]] static QString systemLocaleIdentifier();
-    [[nodiscard]] static bool isSameLocaleIdentifier(const QString &first, const QString &secondLocaleIdentifier);
-    [[nodiscard]] static bool isSameLangaugeFromLocaleIdentifier(const QString &first,
-        const QString &secondLocaleIdentifier);
+    [[nodiscard]] static bool isSameLocaleIdentifier(
+        const QString &first, const QString &secondLocaleIdentifier);
+    [[nodiscard]] static bool isSameLangaugeFromLocaleIdentifier(
+        const QString &first, const QString &secondLocaleIdentifier);
     /// The visibility table, read afresh; nothing when it was never written.
     [[nodiscard]] static std::optional<QVariantMap> visibleVoicesTable();
     /// Writes the table, synchronises, and tells every process.
     static void setVisibleVoicesTable(const QVariantMap &table);
     /// The voices a voice menu lists for @p localeIdentifier, in enumeration order.
-    [[nodiscard]] static QList<CZVoiceObjectPtr> visibleVoicesForLocaleIdentifier(const QString &localeIdentifier,
-        const QStringList &additionalRequiredVoices, bool allowAllVoices);
+    [[nodiscard]] static QList<CZVoiceObjectPtr> visibleVoicesForLocaleIdentifier(
+        const QString &localeIdentifier, const QStringList &additionalRequiredVoices, bool allowAllVoices);
 
 protected:
     CZVoiceObject() = default;
     /// Reads the visibility from @p table for @p identifier, with the premium fallback when allowed.
-    static qint64 visibilityFromTable(const std::optional<QVariantMap> &table, const QString &attributesIdentifier,
-        const QString &givenIdentifier, bool premiumFallback);
+    static qint64 visibilityFromTable(const std::optional<QVariantMap> &table,
+        const QString &attributesIdentifier, const QString &givenIdentifier, bool premiumFallback);
 
     QVariantMap _voiceAttributes;
     qint64 _visibility = 2;

@@ -27,7 +27,8 @@ DownloadableVoicePtr DownloadableVoice::initWithVoiceID(const QString &voiceID, 
     voice->_version = stringValue(properties.value(QStringLiteral("VoiceVersion")));
     voice->_tagName = stringValue(properties.value(QStringLiteral("VoiceTag")));
     voice->_fullSizeByteSize = unsignedValue(properties.value(QStringLiteral("FullSizeByteSize")));
-    voice->_fullSizeBundleIdentifier = stringValue(properties.value(QStringLiteral("FullSizeBundleIdentifier")));
+    voice->_fullSizeBundleIdentifier
+        = stringValue(properties.value(QStringLiteral("FullSizeBundleIdentifier")));
     voice->_fullSizeTagName = stringValue(properties.value(QStringLiteral("FullSizeTagName")));
     voice->_fullSizeVersion = stringValue(properties.value(QStringLiteral("FullSizeVersion")));
     return voice;

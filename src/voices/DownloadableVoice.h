@@ -13,7 +13,8 @@ class CADENZACORE_EXPORT DownloadableVoice : public CZVoiceObject
 {
 public:
     /// nullptr when @p properties is not a dictionary; values of the wrong type count as absent.
-    [[nodiscard]] static DownloadableVoicePtr initWithVoiceID(const QString &voiceID, const QVariant &properties);
+    [[nodiscard]] static DownloadableVoicePtr initWithVoiceID(
+        const QString &voiceID, const QVariant &properties);
 
     bool isDownloadable() const override { return true; }
 
