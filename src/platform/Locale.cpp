@@ -3,6 +3,8 @@
 #include <unicode/uldnames.h>
 #include <unicode/uloc.h>
 
+#include <QHash>
+
 #include <array>
 
 namespace Cadenza::Platform {
@@ -36,7 +38,37 @@ Locale::Locale(const QString &identifier)
     : m_identifier(canonicalLocaleIdentifier(identifier))
 { }
 
+namespace {
+// Menus and searches ask about the same few dozen locales again and again; ICU is asked once each.
+template<typename Value>
+struct AnswerCache
+{
+    static constexpr qsizetype Capacity = 4096;
+    QHash<QString, Value> answers;
+
+    template<typename Compute>
+    Value get(const QString &key, Compute compute)
+    {
+        if (auto it = answers.constFind(key); it != answers.cend()) {
+            return *it;
+        }
+        if (answers.size() >= Capacity) {
+            answers.clear();
+        }
+        Value value = compute();
+        answers.insert(key, value);
+        return value;
+    }
+};
+} // namespace
+
 QString Locale::canonicalLocaleIdentifier(const QString &identifier)
+{
+    thread_local AnswerCache<QString> cache;
+    return cache.get(identifier, [&] { return canonicalLocaleIdentifierUncached(identifier); });
+}
+
+QString Locale::canonicalLocaleIdentifierUncached(const QString &identifier)
 {
     QByteArray input = identifier.trimmed().toLatin1();
     // POSIX names carry an encoding and modifier that are not part of the locale.
@@ -67,12 +99,15 @@ QString Locale::canonicalLocaleIdentifier(const QString &identifier)
 
 LocaleComponents Locale::componentsFromLocaleIdentifier(const QString &identifier)
 {
-    const QByteArray id = canonicalLocaleIdentifier(identifier).toLatin1();
-    if (id.isEmpty()) {
-        return {};
-    }
-    return {component(id, uloc_getLanguage), component(id, uloc_getScript), component(id, uloc_getCountry),
-        component(id, uloc_getVariant)};
+    thread_local AnswerCache<LocaleComponents> cache;
+    return cache.get(identifier, [&] {
+        const QByteArray id = canonicalLocaleIdentifier(identifier).toLatin1();
+        if (id.isEmpty()) {
+            return LocaleComponents();
+        }
+        return LocaleComponents {component(id, uloc_getLanguage), component(id, uloc_getScript),
+            component(id, uloc_getCountry), component(id, uloc_getVariant)};
+    });
 }
 
 QString Locale::localeIdentifierFromComponents(const LocaleComponents &components)

@@ -46,11 +46,14 @@ public:
     [[nodiscard]] QString displayNameForKey(const QString &key, const QString &value) const;
 
     /// "en-us", "en_US.UTF-8", "iw" → "en_US", "en_US", "he". Accepts language tags and identifiers.
+    /// Answers are kept per thread, so asking again costs a lookup.
     [[nodiscard]] static QString canonicalLocaleIdentifier(const QString &identifier);
     [[nodiscard]] static LocaleComponents componentsFromLocaleIdentifier(const QString &identifier);
     [[nodiscard]] static QString localeIdentifierFromComponents(const LocaleComponents &components);
 
 private:
+    static QString canonicalLocaleIdentifierUncached(const QString &identifier);
+
     QString m_identifier;
 };
 

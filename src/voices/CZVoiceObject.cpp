@@ -84,47 +84,68 @@ QString CZVoiceObject::gender() const
     return SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::Gender));
 }
 
+CZVoiceObject::Derived &CZVoiceObject::derived() const
+{
+    if (!m_derived) {
+        m_derived = std::make_unique<Derived>();
+        QString locale
+            = SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::LocaleIdentifier));
+        if (locale.isEmpty()) {
+            locale = SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::Language));
+        }
+        if (locale.isEmpty()) {
+            locale = QStringLiteral("en_US");
+        }
+        m_derived->localeIdentifier = Locale::canonicalLocaleIdentifier(locale);
+        const auto parts = Locale::componentsFromLocaleIdentifier(m_derived->localeIdentifier);
+        m_derived->languageCode = parts.languageCode;
+        m_derived->countryCode = parts.countryCode;
+        m_derived->variantCode = parts.variantCode;
+    }
+    return *m_derived;
+}
+
 QString CZVoiceObject::localeIdentifier() const
 {
-    QString locale = SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::LocaleIdentifier));
-    if (locale.isEmpty()) {
-        locale = SpeechItemPrivate::stringValue(_voiceAttributes.value(VoiceAttribute::Language));
-    }
-    if (locale.isEmpty()) {
-        locale = QStringLiteral("en_US");
-    }
-    return Locale::canonicalLocaleIdentifier(locale);
+    return derived().localeIdentifier;
 }
 
 QString CZVoiceObject::languageIdentifier() const
 {
-    const QString code = Locale::componentsFromLocaleIdentifier(localeIdentifier()).languageCode;
+    const QString &code = derived().languageCode;
     return code.isEmpty() ? QString() : code;
 }
 
 QString CZVoiceObject::countryIdentifier() const
 {
-    const QString code = Locale::componentsFromLocaleIdentifier(localeIdentifier()).countryCode;
+    const QString &code = derived().countryCode;
     return code.isEmpty() ? QString() : code;
 }
 
 QString CZVoiceObject::languageDisplayString() const
 {
-    return SpeechItemPrivate::conversionDisplayName(Locale::LanguageCodeKey, languageIdentifier());
+    Derived &d = derived();
+    if (!d.languageDisplay) {
+        d.languageDisplay = SpeechItemPrivate::conversionDisplayName(Locale::LanguageCodeKey, d.languageCode);
+    }
+    return *d.languageDisplay;
 }
 
 QString CZVoiceObject::countryDisplayString() const
 {
-    const auto parts = Locale::componentsFromLocaleIdentifier(localeIdentifier());
-    QString name;
-    if (!parts.countryCode.isEmpty()) {
-        name = SpeechItemPrivate::conversionDisplayName(Locale::CountryCodeKey, parts.countryCode);
-    } else if (!parts.variantCode.isEmpty()) {
-        name = SpeechItemPrivate::conversionDisplayName(Locale::VariantCodeKey, parts.variantCode);
-    } else if (!parts.languageCode.isEmpty()) {
-        name = SpeechItemPrivate::conversionDisplayName(Locale::LanguageCodeKey, parts.languageCode);
+    Derived &d = derived();
+    if (!d.countryDisplay) {
+        QString name;
+        if (!d.countryCode.isEmpty()) {
+            name = SpeechItemPrivate::conversionDisplayName(Locale::CountryCodeKey, d.countryCode);
+        } else if (!d.variantCode.isEmpty()) {
+            name = SpeechItemPrivate::conversionDisplayName(Locale::VariantCodeKey, d.variantCode);
+        } else if (!d.languageCode.isEmpty()) {
+            name = SpeechItemPrivate::conversionDisplayName(Locale::LanguageCodeKey, d.languageCode);
+        }
+        d.countryDisplay = name.isNull() ? QStringLiteral("") : name;
     }
-    return name.isNull() ? QStringLiteral("") : name;
+    return *d.countryDisplay;
 }
 
 qint64 CZVoiceObject::relativeDesirability() const
@@ -140,6 +161,15 @@ bool CZVoiceObject::showsInFullListOnly() const
 }
 
 QString CZVoiceObject::genderDisplayString() const
+{
+    Derived &d = derived();
+    if (!d.genderDisplay) {
+        d.genderDisplay = genderDisplayStringUncached();
+    }
+    return *d.genderDisplay;
+}
+
+QString CZVoiceObject::genderDisplayStringUncached() const
 {
     const QString value = gender();
     const Platform::LocalizationTable &table = Platform::LocalizationTable::shared();

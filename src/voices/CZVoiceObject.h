@@ -37,7 +37,6 @@ public:
     [[nodiscard]] static CZVoiceObjectPtr initWithVoiceIdentifier(const QString &identifier);
 
     [[nodiscard]] const QVariantMap &voiceAttributes() const { return _voiceAttributes; }
-    [[nodiscard]] QVariantMap &voiceAttributes() { return _voiceAttributes; }
     [[nodiscard]] QString displayName() const;
     /// The name without " Compact" or " Premium", unless the voice names its root itself.
     [[nodiscard]] QString displayNameRoot() const;
@@ -98,6 +97,22 @@ protected:
     double _downloadPercentComplete = 0;
 
 private:
+    // Texts derived from the attributes, made on first use: searches ask for them again and again.
+    struct Derived
+    {
+        QString localeIdentifier;
+        QString languageCode;
+        QString countryCode;
+        QString variantCode;
+        std::optional<QString> languageDisplay;
+        std::optional<QString> countryDisplay;
+        std::optional<QString> genderDisplay;
+    };
+    Derived &derived() const;
+    QString genderDisplayStringUncached() const;
+
+    mutable std::unique_ptr<Derived> m_derived;
+
     static CZVoiceObjectPtr make(const QString &identifier, const std::optional<QVariantMap> &table);
 };
 

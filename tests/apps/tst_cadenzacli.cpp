@@ -147,9 +147,25 @@ private Q_SLOTS:
         QCOMPARE(r.exitCode, 2);
     }
 
+    void languagesListsTheCatalogue()
+    {
+        const Result r = cadenza({QStringLiteral("languages"), QStringLiteral("--json")});
+        QCOMPARE(r.exitCode, 0);
+        const QJsonArray languages = QJsonDocument::fromJson(r.out.toUtf8()).array();
+        QCOMPARE(languages.size(), 6); // the sample repository's, none installed
+        const QJsonObject first = languages.first().toObject();
+        QCOMPARE(first.value(QStringLiteral("kind")).toString(), QStringLiteral("downloadable"));
+        QCOMPARE(first.value(QStringLiteral("locale")).toString(), QStringLiteral("de_DE"));
+        QCOMPARE(first.value(QStringLiteral("title")).toString(), QStringLiteral("German (Germany)"));
+        QCOMPARE(first.value(QStringLiteral("visibility")).toInt(), 2);
+        QCOMPARE(first.value(QStringLiteral("tag")).toString(), QStringLiteral("SRCLANGID:de_DE"));
+    }
+
     void everyCommandHasHelp()
     {
-        for (const QString &command : {QStringLiteral("voices"), QStringLiteral("say")}) {
+        for (const QString &command : {QStringLiteral("voices"), QStringLiteral("say"),
+                 QStringLiteral("languages"), QStringLiteral("status"), QStringLiteral("install"),
+                 QStringLiteral("cancel"), QStringLiteral("post")}) {
             const Result r = cadenza({command, QStringLiteral("--help")});
             QCOMPARE(r.exitCode, 0);
             QVERIFY(r.out.contains(QStringLiteral("Usage: cadenza ") + command));

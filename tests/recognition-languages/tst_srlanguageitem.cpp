@@ -22,8 +22,8 @@ using namespace Cadenza::Platform;
 namespace {
 QVariantMap language(const QString &locale, const QString &tag, const QString &fallback = QString())
 {
-    QVariantMap entry {{QStringLiteral("LocaleIdentifier"), locale}, {QStringLiteral("ByteSize"), qint64(1000)},
-        {QStringLiteral("Version"), QStringLiteral("1.0")}};
+    QVariantMap entry {{QStringLiteral("LocaleIdentifier"), locale},
+        {QStringLiteral("ByteSize"), qint64(1000)}, {QStringLiteral("Version"), QStringLiteral("1.0")}};
     if (!tag.isNull()) {
         entry.insert(QStringLiteral("Tag"), tag);
     }
@@ -59,9 +59,13 @@ private Q_SLOTS:
         Services::setNotifications(m_notifications);
         Services::setUserLocale(std::make_shared<FakeUserLocaleService>());
         SpeechItemPrivate::setInstallationDictionary(QVariantMap {{QStringLiteral("DownloadableSRLanguages"),
-            QVariantMap {{QStringLiteral("b.de"), language(QStringLiteral("de_DE"), QStringLiteral("SRCLANGID:de_DE"))},
-                {QStringLiteral("b.enin"), language(QStringLiteral("en_IN"), QStringLiteral("SRCLANGID:en_IN"), QStringLiteral("en-US"))},
-                {QStringLiteral("b.fr"), language(QStringLiteral("fr_FR"), QStringLiteral("SRCLANGID:fr_FR"))},
+            QVariantMap {{QStringLiteral("b.de"),
+                             language(QStringLiteral("de_DE"), QStringLiteral("SRCLANGID:de_DE"))},
+                {QStringLiteral("b.enin"),
+                    language(
+                        QStringLiteral("en_IN"), QStringLiteral("SRCLANGID:en_IN"), QStringLiteral("en-US"))},
+                {QStringLiteral("b.fr"),
+                    language(QStringLiteral("fr_FR"), QStringLiteral("SRCLANGID:fr_FR"))},
                 {QStringLiteral("b.junk"), QStringLiteral("not a dictionary")}}}});
     }
     void cleanup()
@@ -72,11 +76,12 @@ private Q_SLOTS:
 
     void installedLanguagesAndTheirExtensions()
     {
-        m_recognition->setInstalledLanguages(
-            QStringList {QStringLiteral("en_US"), QStringLiteral("fr"), QStringLiteral("ar"), QStringLiteral("de-DE")});
+        m_recognition->setInstalledLanguages(QStringList {
+            QStringLiteral("en_US"), QStringLiteral("fr"), QStringLiteral("ar"), QStringLiteral("de-DE")});
         const auto items = CZSRLanguageItem::availableLocalRecognizerLanguageItems();
-        QCOMPARE(locales(items), QStringList({QStringLiteral("en_US"), QStringLiteral("en_IN"), QStringLiteral("ar"),
-                                     QStringLiteral("de_DE")}));
+        QCOMPARE(locales(items),
+            QStringList({QStringLiteral("en_US"), QStringLiteral("en_IN"), QStringLiteral("ar"),
+                QStringLiteral("de_DE")}));
         // The extension is a fresh item: it carries its fallback, not the download's properties.
         QCOMPARE(items.at(1)->fallbackLocaleIdentifier(), QStringLiteral("en-US"));
         QCOMPARE(items.at(1)->byteSize(), 0u);
@@ -91,9 +96,11 @@ private Q_SLOTS:
     void downloadableLanguagesSkipRefusedEntries()
     {
         const auto items = CZSRLanguageItem::downloadableLocalSRLanguageItems();
-        QCOMPARE(locales(items), QStringList({QStringLiteral("de_DE"), QStringLiteral("en_IN"), QStringLiteral("fr_FR")}));
+        QCOMPARE(locales(items),
+            QStringList({QStringLiteral("de_DE"), QStringLiteral("en_IN"), QStringLiteral("fr_FR")}));
         QCOMPARE(items.first()->bundleIdentifier(), QStringLiteral("b.de"));
-        SpeechItemPrivate::setInstallationDictionary(QVariantMap {{QStringLiteral("DownloadableSRLanguages"), 12}});
+        SpeechItemPrivate::setInstallationDictionary(
+            QVariantMap {{QStringLiteral("DownloadableSRLanguages"), 12}});
         QVERIFY(CZSRLanguageItem::downloadableLocalSRLanguageItems().isEmpty());
         SpeechItemPrivate::setInstallationDictionary(std::nullopt);
         QVERIFY(CZSRLanguageItem::downloadableLocalSRLanguageItems().isEmpty());
@@ -103,12 +110,14 @@ private Q_SLOTS:
     {
         SpeechItemPrivate::setInstallationDictionary(QVariantMap {{QStringLiteral("DownloadableSRLanguages"),
             QVariantMap {{QStringLiteral("b.untagged"), language(QStringLiteral("it_IT"), QString())},
-                {QStringLiteral("a.tagged"), language(QStringLiteral("it_IT"), QStringLiteral("SRCLANGID:it_IT"))},
+                {QStringLiteral("a.tagged"),
+                    language(QStringLiteral("it_IT"), QStringLiteral("SRCLANGID:it_IT"))},
                 {QStringLiteral("c.lonely"), language(QStringLiteral("nl_NL"), QString())}}}});
         const auto items = CZSRLanguageItem::downloadableLocalSRLanguageItems();
         QCOMPARE(items.size(), 3);
         QCOMPARE(items.at(1)->bundleIdentifier(), QStringLiteral("b.untagged"));
-        QCOMPARE(items.at(1)->tagName(), QStringLiteral("SRCLANGID:it_IT")); // borrowed from the first entry of its locale
+        QCOMPARE(items.at(1)->tagName(),
+            QStringLiteral("SRCLANGID:it_IT")); // borrowed from the first entry of its locale
         QVERIFY(items.at(2)->tagName().isEmpty());
     }
 
@@ -127,7 +136,8 @@ private Q_SLOTS:
         QTest::addColumn<QStringList>("items");
         QTest::addColumn<QString>("wanted");
         QTest::addColumn<qsizetype>("index");
-        QTest::newRow("English prefers en_US") << QStringList {"en_AU", "fr_FR", "en_US"} << "en_GB" << qsizetype(2);
+        QTest::newRow("English prefers en_US")
+            << QStringList {"en_AU", "fr_FR", "en_US"} << "en_GB" << qsizetype(2);
         QTest::newRow("same language") << QStringList {"en_US", "fr_FR"} << "fr_CA" << qsizetype(1);
         QTest::newRow("en_US stands in") << QStringList {"fr_FR", "en_US"} << "ja_JP" << qsizetype(1);
         QTest::newRow("nothing") << QStringList {"fr_FR"} << "ja_JP" << qsizetype(-1);
@@ -149,7 +159,8 @@ private Q_SLOTS:
 
     void preferredDictationLocale()
     {
-        QCOMPARE(CZSRLanguageItem::preferredDictationLocaleIdentifierFromAvaiableLocaleIdentifiers({}, QStringLiteral("xx_YY")),
+        QCOMPARE(CZSRLanguageItem::preferredDictationLocaleIdentifierFromAvaiableLocaleIdentifiers(
+                     {}, QStringLiteral("xx_YY")),
             QStringLiteral("xx_YY"));
         QCOMPARE(CZSRLanguageItem::preferredDictationLocaleIdentifierFromAvaiableLocaleIdentifiers(
                      {QStringLiteral("en-US"), QStringLiteral("fr-fr")}, QStringLiteral("fr_CA")),
@@ -166,7 +177,8 @@ private Q_SLOTS:
         QCOMPARE(CZSRLanguageItem::visibiltyValueForLocaleIdentifier(QStringLiteral("en_US"), &exists), 2);
         QVERIFY(!exists);
         QSignalSpy posted(m_notifications.get(), &DistributedNotificationCenter::notificationPosted);
-        CZSRLanguageItem::setVisibleSRLanguageItemsTable({{QStringLiteral("en_US"), 0}, {QStringLiteral("de"), QStringLiteral("1")}});
+        CZSRLanguageItem::setVisibleSRLanguageItemsTable(
+            {{QStringLiteral("en_US"), 0}, {QStringLiteral("de"), QStringLiteral("1")}});
         CZSRLanguageItem::setVisibilityValue(1, QStringLiteral("en-US"));
         auto table = CZSRLanguageItem::visibleSRLanguageItemsTable().value_or(QVariantMap());
         QCOMPARE(table.keys(), QStringList({QStringLiteral("de"), QStringLiteral("en_US")}));
@@ -181,7 +193,8 @@ private Q_SLOTS:
         QCOMPARE(CZSRLanguageItem::visibiltyValueForLocaleIdentifier(QStringLiteral("de"), &exists), 2);
         QVERIFY(!exists);
         QTRY_COMPARE(posted.size(), 3); // every write announces, changed or not
-        QCOMPARE(posted.first().at(0).toString(), QStringLiteral("com.vendra.speech.DefaultSRLanguageChangedNotification"));
+        QCOMPARE(posted.first().at(0).toString(),
+            QStringLiteral("com.vendra.speech.DefaultSRLanguageChangedNotification"));
         QCOMPARE(CZSRLanguageItem::initWithLocaleIdentifier(QStringLiteral("fr_CA"))->visibility(), 0);
     }
 
@@ -191,7 +204,8 @@ private Q_SLOTS:
         item->setDownloadStatus(3);
         item->setDownloadPercentComplete(12.5);
         QCOMPARE(item->description(),
-            QStringLiteral("Locale: de_DE, Language: German, Country: Germany, Visible: 2, Download: 3 (12.500000)"));
+            QStringLiteral(
+                "Locale: de_DE, Language: German, Country: Germany, Visible: 2, Download: 3 (12.500000)"));
     }
 
     void recognizerBundlesOnDisk()
@@ -203,11 +217,15 @@ private Q_SLOTS:
             QVERIFY(info.open(QIODevice::WriteOnly));
             info.write(PropertyList::serialize(QVariantMap {{QStringLiteral("LocaleIdentifier"), locale}}));
         };
-        bundle(Paths::userRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"), QStringLiteral("de_DE"));
-        bundle(Paths::systemRecognizersFolder(), QStringLiteral("en_US.SpeechRecognition"), QStringLiteral("en-US"));
-        bundle(Paths::systemRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"), QStringLiteral("de_DE"));
+        bundle(Paths::userRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"),
+            QStringLiteral("de_DE"));
+        bundle(Paths::systemRecognizersFolder(), QStringLiteral("en_US.SpeechRecognition"),
+            QStringLiteral("en-US"));
+        bundle(Paths::systemRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"),
+            QStringLiteral("de_DE"));
         bundle(Paths::systemRecognizersFolder(), QStringLiteral("odd.SpeechRecognition"), 5);
-        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Skipping recognizer bundle .*odd")));
+        QTest::ignoreMessage(
+            QtWarningMsg, QRegularExpression(QStringLiteral("Skipping recognizer bundle .*odd")));
         QCOMPARE(Services::recognition().installedLanguages().value_or(QStringList()),
             QStringList({QStringLiteral("de_DE"), QStringLiteral("en-US")}));
         QCOMPARE(locales(CZSRLanguageItem::availableLocalRecognizerLanguageItems()),

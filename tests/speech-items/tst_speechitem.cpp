@@ -17,7 +17,8 @@ using namespace Cadenza::Platform;
 namespace {
 CZSpeechItemPtr item(const QString &locale, qint64 visibility = 0, const QString &bundle = QString())
 {
-    auto made = CZSpeechItem::initWithDownloadableBundleIdentifier(bundle.isEmpty() ? QStringLiteral("b.") + locale : bundle,
+    auto made = CZSpeechItem::initWithDownloadableBundleIdentifier(
+        bundle.isEmpty() ? QStringLiteral("b.") + locale : bundle,
         QVariantMap {{QStringLiteral("LocaleIdentifier"), locale}});
     made->setVisibility(visibility);
     return made;
@@ -58,14 +59,22 @@ private Q_SLOTS:
         QTest::addColumn<QString>("b");
         QTest::addColumn<bool>("sameLocale");
         QTest::addColumn<bool>("sameLanguage");
-        QTest::newRow("country on one side") << "en" << "en_US" << false << true;
-        QTest::newRow("case of the language") << "en" << "EN" << true << true;
-        QTest::newRow("case of the country") << "en_US" << "en_us" << true << true;
-        QTest::newRow("scripts ignored") << "zh_Hans_CN" << "zh_CN" << true << true;
-        QTest::newRow("tags") << "en-GB" << "en_GB" << true << true;
-        QTest::newRow("other country") << "en_GB" << "en_US" << false << true;
-        QTest::newRow("other language") << "de_DE" << "en_DE" << false << false;
-        QTest::newRow("no language") << "" << "" << false << false;
+        QTest::newRow("country on one side") << "en"
+                                             << "en_US" << false << true;
+        QTest::newRow("case of the language") << "en"
+                                              << "EN" << true << true;
+        QTest::newRow("case of the country") << "en_US"
+                                             << "en_us" << true << true;
+        QTest::newRow("scripts ignored") << "zh_Hans_CN"
+                                         << "zh_CN" << true << true;
+        QTest::newRow("tags") << "en-GB"
+                              << "en_GB" << true << true;
+        QTest::newRow("other country") << "en_GB"
+                                       << "en_US" << false << true;
+        QTest::newRow("other language") << "de_DE"
+                                        << "en_DE" << false << false;
+        QTest::newRow("no language") << ""
+                                     << "" << false << false;
         QTest::newRow("null") << QString() << "en" << false << false;
     }
     void sameLocale()
@@ -81,7 +90,8 @@ private Q_SLOTS:
 
     void containment()
     {
-        QVERIFY(CZSpeechItem::isLocaleIdentifier(QStringLiteral("en-us"), {QStringLiteral("fr"), QStringLiteral("en_US")}));
+        QVERIFY(CZSpeechItem::isLocaleIdentifier(
+            QStringLiteral("en-us"), {QStringLiteral("fr"), QStringLiteral("en_US")}));
         QVERIFY(!CZSpeechItem::isLocaleIdentifier(QStringLiteral("en"), {QStringLiteral("en_US")}));
         QCOMPARE(CZSpeechItem::normalizedLocaleIdentifier(QStringLiteral("de-DE")), QStringLiteral("de_DE"));
     }
@@ -96,12 +106,15 @@ private Q_SLOTS:
         QCOMPARE(locales(CZSpeechItem::visibleObjectsFromItems({gb, de, us}, QStringLiteral("ja_JP"), {})),
             QStringList {QStringLiteral("en_US")});
         QVERIFY(CZSpeechItem::visibleObjectsFromItems({gb, de}, QStringLiteral("ja_JP"), {}).isEmpty());
-        QCOMPARE(locales(CZSpeechItem::visibleObjectsFromItems({gb, fr, de, us}, QStringLiteral("de_de"), {})),
+        QCOMPARE(
+            locales(CZSpeechItem::visibleObjectsFromItems({gb, fr, de, us}, QStringLiteral("de_de"), {})),
             QStringList({QStringLiteral("fr_FR"), QStringLiteral("de_DE")}));
         // Required locales are compared as written.
-        QCOMPARE(locales(CZSpeechItem::visibleObjectsFromItems({gb, de}, QStringLiteral("ja"), {QStringLiteral("en_GB")})),
+        QCOMPARE(locales(CZSpeechItem::visibleObjectsFromItems(
+                     {gb, de}, QStringLiteral("ja"), {QStringLiteral("en_GB")})),
             QStringList {QStringLiteral("en_GB")});
-        QCOMPARE(locales(CZSpeechItem::visibleObjectsFromItems({gb, de}, QStringLiteral("ja"), {QStringLiteral("en-GB")})),
+        QCOMPARE(locales(CZSpeechItem::visibleObjectsFromItems(
+                     {gb, de}, QStringLiteral("ja"), {QStringLiteral("en-GB")})),
             QStringList());
     }
 
@@ -110,18 +123,30 @@ private Q_SLOTS:
         QTest::addColumn<quint64>("bytes");
         QTest::addColumn<QString>("english");
         QTest::addColumn<QString>("german");
-        QTest::newRow("0") << quint64(0) << "0 bytes" << "0 Byte";
-        QTest::newRow("999") << quint64(999) << "999 bytes" << "999 Byte";
-        QTest::newRow("1000") << quint64(1000) << "1 KB" << "1 KB";
-        QTest::newRow("1499") << quint64(1499) << "1 KB" << "1 KB";
-        QTest::newRow("1500") << quint64(1500) << "2 KB" << "2 KB";
-        QTest::newRow("999499") << quint64(999499) << "999 KB" << "999 KB";
-        QTest::newRow("999500 reads as a thousand") << quint64(999500) << "1,000 KB" << "1.000 KB";
-        QTest::newRow("1500000") << quint64(1500000) << "2 MB" << "2 MB";
-        QTest::newRow("999500000") << quint64(999500000) << "1,000 MB" << "1.000 MB";
-        QTest::newRow("1500000000") << quint64(1500000000) << "1.5 GB" << "1,5 GB";
-        QTest::newRow("2000000000") << quint64(2000000000) << "2 GB" << "2 GB";
-        QTest::newRow("max") << quint64(18446744073709551615ULL) << "18,446,744,073.7 GB" << "18.446.744.073,7 GB";
+        QTest::newRow("0") << quint64(0) << "0 bytes"
+                           << "0 Byte";
+        QTest::newRow("999") << quint64(999) << "999 bytes"
+                             << "999 Byte";
+        QTest::newRow("1000") << quint64(1000) << "1 KB"
+                              << "1 KB";
+        QTest::newRow("1499") << quint64(1499) << "1 KB"
+                              << "1 KB";
+        QTest::newRow("1500") << quint64(1500) << "2 KB"
+                              << "2 KB";
+        QTest::newRow("999499") << quint64(999499) << "999 KB"
+                                << "999 KB";
+        QTest::newRow("999500 reads as a thousand") << quint64(999500) << "1,000 KB"
+                                                    << "1.000 KB";
+        QTest::newRow("1500000") << quint64(1500000) << "2 MB"
+                                 << "2 MB";
+        QTest::newRow("999500000") << quint64(999500000) << "1,000 MB"
+                                   << "1.000 MB";
+        QTest::newRow("1500000000") << quint64(1500000000) << "1.5 GB"
+                                    << "1,5 GB";
+        QTest::newRow("2000000000") << quint64(2000000000) << "2 GB"
+                                    << "2 GB";
+        QTest::newRow("max") << quint64(18446744073709551615ULL) << "18,446,744,073.7 GB"
+                             << "18.446.744.073,7 GB";
     }
     void byteSizes()
     {
@@ -205,10 +230,12 @@ private Q_SLOTS:
 
     void catalogueEntriesOfTheWrongTypeCountAsAbsent()
     {
-        QVERIFY(!CZSpeechItem::initWithDownloadableBundleIdentifier(QStringLiteral("x"), QStringLiteral("not a dictionary")));
+        QVERIFY(!CZSpeechItem::initWithDownloadableBundleIdentifier(
+            QStringLiteral("x"), QStringLiteral("not a dictionary")));
         const auto odd = CZSpeechItem::initWithDownloadableBundleIdentifier(QStringLiteral("x"),
-            QVariantMap {{QStringLiteral("LocaleIdentifier"), 42}, {QStringLiteral("ByteSize"), QStringLiteral("12")},
-                {QStringLiteral("Tag"), QVariantMap()}, {QStringLiteral("FullSizeByteSize"), qint64(77)},
+            QVariantMap {{QStringLiteral("LocaleIdentifier"), 42},
+                {QStringLiteral("ByteSize"), QStringLiteral("12")}, {QStringLiteral("Tag"), QVariantMap()},
+                {QStringLiteral("FullSizeByteSize"), qint64(77)},
                 {QStringLiteral("Version"), QStringLiteral("2.0")}});
         QVERIFY(odd);
         QVERIFY(odd->localeIdentifier().isNull());
@@ -236,7 +263,8 @@ private Q_SLOTS:
         child.start(QCoreApplication::applicationFilePath(), {});
         QVERIFY(child.waitForFinished(30000));
         QCOMPARE(child.exitStatus(), QProcess::CrashExit);
-        QVERIFY(child.readAllStandardError().contains("Language display name is nil for locale: , lang: , for curLocale: en"));
+        QVERIFY(child.readAllStandardError().contains(
+            "Language display name is nil for locale: , lang: , for curLocale: en"));
     }
 
 private:
@@ -251,7 +279,8 @@ int main(int argc, char *argv[])
     if (qEnvironmentVariableIsSet("CADENZA_TEST_NAMELESS_LANGUAGE")) {
         Services::setUserLocale(std::make_shared<FakeUserLocaleService>());
         // An item with no locale at all has no language to name.
-        (void)CZSpeechItem::initWithDownloadableBundleIdentifier(QStringLiteral("x"), QVariantMap())->languageDisplayString();
+        (void)CZSpeechItem::initWithDownloadableBundleIdentifier(QStringLiteral("x"), QVariantMap())
+            ->languageDisplayString();
         return 0; // not reached
     }
     SpeechItemTest test;

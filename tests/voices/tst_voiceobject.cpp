@@ -38,7 +38,8 @@ private Q_SLOTS:
     void init()
     {
         m_environment = std::make_unique<TestEnvironment>();
-        m_locale = std::make_shared<FakeUserLocaleService>(QStringList {QStringLiteral("en_US")}, QStringLiteral("en_US"));
+        m_locale = std::make_shared<FakeUserLocaleService>(
+            QStringList {QStringLiteral("en_US")}, QStringLiteral("en_US"));
         m_speech = std::make_shared<FakeSpeechSynthesisService>();
         m_preferences = std::make_shared<MemoryPreferencesStore>();
         m_notifications = std::make_shared<InProcessNotificationCenter>();
@@ -62,7 +63,9 @@ private Q_SLOTS:
         QTest::newRow("compact") << "Orin Compact" << QString() << "Orin";
         QTest::newRow("premium") << "Maren Premium" << QString() << "Maren";
         QTest::newRow("other") << "Tobias (Enhanced)" << QString() << "Tobias (Enhanced)";
-        QTest::newRow("given root") << "Orin Compact" << "Orin the Voice" << "Orin the Voice";
+        QTest::newRow("given root") << "Orin Compact"
+                                    << "Orin the Voice"
+                                    << "Orin the Voice";
         QTest::newRow("shorter than the cut") << "Premium" << QString() << "";
         QTest::newRow("no blank") << "XPremium" << QString() << "";
     }
@@ -71,12 +74,14 @@ private Q_SLOTS:
         QFETCH(QString, name);
         QFETCH(QString, root);
         QFETCH(QString, expected);
-        QVariantMap attributes = TestEnvironment::voiceAttributes(P + QStringLiteral("v"), name, QStringLiteral("en_US"));
+        QVariantMap attributes
+            = TestEnvironment::voiceAttributes(P + QStringLiteral("v"), name, QStringLiteral("en_US"));
         if (!root.isNull()) {
             attributes.insert(QStringLiteral("VoiceNameRoot"), root);
         }
         m_speech->addVoice(attributes);
-        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("v"))->displayNameRoot(), expected);
+        QCOMPARE(
+            CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("v"))->displayNameRoot(), expected);
     }
 
     void compactVoicesInheritThePremiumChoice()
@@ -84,13 +89,17 @@ private Q_SLOTS:
         addVoice(QStringLiteral("maren"), QStringLiteral("Maren"), QStringLiteral("en_US"));
         addVoice(QStringLiteral("maren.compact"), QStringLiteral("Maren Compact"), QStringLiteral("en_US"));
         addVoice(QStringLiteral("maren.premium"), QStringLiteral("Maren Premium"), QStringLiteral("en_US"));
-        CZVoiceObject::setVisibleVoicesTable({{P + QStringLiteral("maren.premium"), 0}, {P + QStringLiteral("x"), QStringLiteral("1")}});
+        CZVoiceObject::setVisibleVoicesTable(
+            {{P + QStringLiteral("maren.premium"), 0}, {P + QStringLiteral("x"), QStringLiteral("1")}});
         // An identifier with neither ending takes the premium entry; one with an ending never does.
         QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("maren"))->visibility(), 0);
-        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("maren.compact"))->visibility(), 2);
-        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("maren.premium"))->visibility(), 0);
+        QCOMPARE(
+            CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("maren.compact"))->visibility(), 2);
+        QCOMPARE(
+            CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("maren.premium"))->visibility(), 0);
         CZVoiceObject::setVisibleVoicesTable({{P + QStringLiteral("maren"), QStringLiteral("1")}});
-        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("maren"))->visibility(), 2); // not a number
+        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("maren"))->visibility(),
+            2); // not a number
     }
 
     void theTableIsWrittenSynchronisedAndAnnounced()
@@ -100,9 +109,15 @@ private Q_SLOTS:
         const int before = m_preferences->synchronizeCount();
         CZVoiceObject::setVisibleVoicesTable({{P + QStringLiteral("a"), 1}});
         QVERIFY(m_preferences->synchronizeCount() > before);
-        QCOMPARE(m_preferences->backing()->value(CZVoiceObject::PreferencesDomain).value(QStringLiteral("VisibleIdentifiers")).toMap().size(), 1);
+        QCOMPARE(m_preferences->backing()
+                     ->value(CZVoiceObject::PreferencesDomain)
+                     .value(QStringLiteral("VisibleIdentifiers"))
+                     .toMap()
+                     .size(),
+            1);
         QVERIFY(posted.wait(1000));
-        QCOMPARE(posted.first().at(0).toString(), QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"));
+        QCOMPARE(posted.first().at(0).toString(),
+            QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"));
         QVERIFY(posted.first().at(1).toString().isEmpty());
     }
 
@@ -127,16 +142,22 @@ private Q_SLOTS:
         const auto voice = CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("plain"));
         QVERIFY(CZVoiceObject::isSameLocaleIdentifier(voice->localeIdentifier(), QStringLiteral("en")));
         QVERIFY(!CZVoiceObject::isSameLocaleIdentifier(voice->localeIdentifier(), QStringLiteral("en_US")));
-        QVERIFY(CZVoiceObject::isSameLangaugeFromLocaleIdentifier(voice->localeIdentifier(), QStringLiteral("en_US")));
+        QVERIFY(CZVoiceObject::isSameLangaugeFromLocaleIdentifier(
+            voice->localeIdentifier(), QStringLiteral("en_US")));
         QCOMPARE(voice->countryDisplayString(), QStringLiteral("English")); // no country: the language's name
         QVERIFY(voice->countryIdentifier().isNull());
         // Without a locale attribute, the language attribute; without both, en_US.
-        m_speech->addVoice(QVariantMap {{QStringLiteral("VoiceIdentifier"), QString(P + QStringLiteral("lang"))},
-            {QStringLiteral("VoiceName"), QStringLiteral("Lang")}, {QStringLiteral("VoiceLanguage"), QStringLiteral("de")}});
-        m_speech->addVoice(QVariantMap {{QStringLiteral("VoiceIdentifier"), QString(P + QStringLiteral("none"))},
-            {QStringLiteral("VoiceName"), QStringLiteral("None")}});
-        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("lang"))->localeIdentifier(), QStringLiteral("de"));
-        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("none"))->localeIdentifier(), QStringLiteral("en_US"));
+        m_speech->addVoice(
+            QVariantMap {{QStringLiteral("VoiceIdentifier"), QString(P + QStringLiteral("lang"))},
+                {QStringLiteral("VoiceName"), QStringLiteral("Lang")},
+                {QStringLiteral("VoiceLanguage"), QStringLiteral("de")}});
+        m_speech->addVoice(
+            QVariantMap {{QStringLiteral("VoiceIdentifier"), QString(P + QStringLiteral("none"))},
+                {QStringLiteral("VoiceName"), QStringLiteral("None")}});
+        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("lang"))->localeIdentifier(),
+            QStringLiteral("de"));
+        QCOMPARE(CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("none"))->localeIdentifier(),
+            QStringLiteral("en_US"));
     }
 
     void systemLocale()
@@ -154,7 +175,8 @@ private Q_SLOTS:
     {
         // The user speaks Japanese; no voice does. The default voice is listed whatever the rules say.
         m_locale->setPreferredLanguages({QStringLiteral("ja_JP")});
-        QVariantMap us = TestEnvironment::voiceAttributes(P + QStringLiteral("us"), QStringLiteral("Us"), QStringLiteral("en_US"));
+        QVariantMap us = TestEnvironment::voiceAttributes(
+            P + QStringLiteral("us"), QStringLiteral("Us"), QStringLiteral("en_US"));
         us.insert(QStringLiteral("VoiceCreator"), 3);
         us.insert(QStringLiteral("VoiceID"), 4);
         m_speech->addVoice(us);
@@ -162,15 +184,18 @@ private Q_SLOTS:
         m_preferences->setValue(QStringLiteral("SelectedVoiceID"), 4, CZVoiceObject::PreferencesDomain);
         addVoice(QStringLiteral("gb"), QStringLiteral("Gb"), QStringLiteral("en_GB"));
         addVoice(QStringLiteral("de"), QStringLiteral("De"), QStringLiteral("de_DE"));
-        QCOMPARE(identifiers(CZVoiceObject::visibleVoicesForLocaleIdentifier(QStringLiteral("ja_JP"), {}, false)),
+        QCOMPARE(
+            identifiers(CZVoiceObject::visibleVoicesForLocaleIdentifier(QStringLiteral("ja_JP"), {}, false)),
             QStringList {QStringLiteral("us")});
         // One voice of the language, of another country: the language's voices, and no English stand-in.
         m_locale->setPreferredLanguages({QStringLiteral("de_AT")});
         addVoice(QStringLiteral("at2"), QStringLiteral("At2"), QStringLiteral("de_CH"));
-        QCOMPARE(identifiers(CZVoiceObject::visibleVoicesForLocaleIdentifier(QStringLiteral("de_AT"), {}, false)),
+        QCOMPARE(
+            identifiers(CZVoiceObject::visibleVoicesForLocaleIdentifier(QStringLiteral("de_AT"), {}, false)),
             QStringList({QStringLiteral("at2"), QStringLiteral("de"), QStringLiteral("us")}));
         // With an exact match, only voices of exactly the system locale are automatic.
-        QCOMPARE(identifiers(CZVoiceObject::visibleVoicesForLocaleIdentifier(QStringLiteral("de_CH"), {}, false)),
+        QCOMPARE(
+            identifiers(CZVoiceObject::visibleVoicesForLocaleIdentifier(QStringLiteral("de_CH"), {}, false)),
             QStringList {QStringLiteral("us")});
     }
 
@@ -182,11 +207,11 @@ private Q_SLOTS:
         addVoice(QStringLiteral("full"), QStringLiteral("Full"), QStringLiteral("en_US"), true);
         addVoice(QStringLiteral("fr"), QStringLiteral("Fr"), QStringLiteral("fr_FR"));
         addVoice(QStringLiteral("it"), QStringLiteral("It"), QStringLiteral("it_IT"));
-        CZVoiceObject::setVisibleVoicesTable({{P + QStringLiteral("Orin"), 0}, {P + QStringLiteral("fr"), 1},
-            {P + QStringLiteral("us"), 0}});
+        CZVoiceObject::setVisibleVoicesTable(
+            {{P + QStringLiteral("Orin"), 0}, {P + QStringLiteral("fr"), 1}, {P + QStringLiteral("us"), 0}});
         // Orin is hidden but is the default; "it" is required; "full" is automatic but full-list only.
-        QCOMPARE(identifiers(CZVoiceObject::visibleVoicesForLocaleIdentifier(QStringLiteral("en_US"),
-                     {P + QStringLiteral("it")}, false)),
+        QCOMPARE(identifiers(CZVoiceObject::visibleVoicesForLocaleIdentifier(
+                     QStringLiteral("en_US"), {P + QStringLiteral("it")}, false)),
             QStringList({QStringLiteral("Orin"), QStringLiteral("fr"), QStringLiteral("it")}));
     }
 
@@ -211,12 +236,15 @@ private Q_SLOTS:
         QVERIFY(two->compare(*ten) < 0);
         QCOMPARE(two->genderDisplayString(), QStringLiteral("Female"));
         QCOMPARE(two->description(),
-            QStringLiteral("Name: Voice 2, Identifier: %1v2, Locale: en_GB, Language: English, Country: United Kingdom, "
-                           "Gender: Female, Download: 0 (0.000000)")
+            QStringLiteral(
+                "Name: Voice 2, Identifier: %1v2, Locale: en_GB, Language: English, Country: United Kingdom, "
+                "Gender: Female, Download: 0 (0.000000)")
                 .arg(P));
-        m_speech->addVoice(QVariantMap {{QStringLiteral("VoiceIdentifier"), QString(P + QStringLiteral("odd"))},
-            {QStringLiteral("VoiceName"), QStringLiteral("Odd")}, {QStringLiteral("VoiceGender"), QStringLiteral("Robot")},
-            {QStringLiteral("VoiceRelativeDesirability"), QStringLiteral("9")}});
+        m_speech->addVoice(
+            QVariantMap {{QStringLiteral("VoiceIdentifier"), QString(P + QStringLiteral("odd"))},
+                {QStringLiteral("VoiceName"), QStringLiteral("Odd")},
+                {QStringLiteral("VoiceGender"), QStringLiteral("Robot")},
+                {QStringLiteral("VoiceRelativeDesirability"), QStringLiteral("9")}});
         const auto odd = CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("odd"));
         QVERIFY(odd->genderDisplayString().isNull());
         QCOMPARE(odd->relativeDesirability(), 0);
@@ -225,13 +253,17 @@ private Q_SLOTS:
 
     void downloadableVoicesComeFromTheCatalogue()
     {
-        CZVoiceObject::setVisibleVoicesTable({{P + QStringLiteral("new.premium"), 1}, {P + QStringLiteral("twin.premium"), 0}});
-        const QVariantMap entry {{QStringLiteral("VoiceAttributes"),
-                                     QVariantMap {{QStringLiteral("VoiceIdentifier"), QStringLiteral("wrong")},
-                                         {QStringLiteral("VoiceName"), QStringLiteral("New Premium")},
-                                         {QStringLiteral("VoiceLocaleIdentifier"), QStringLiteral("sv_SE")}}},
-            {QStringLiteral("VoiceByteSize"), qint64(1500000)}, {QStringLiteral("VoiceVersion"), QStringLiteral("1.0")},
-            {QStringLiteral("VoiceTag"), QStringLiteral("VOICEID:new")}, {QStringLiteral("FullSizeByteSize"), QStringLiteral("big")},
+        CZVoiceObject::setVisibleVoicesTable(
+            {{P + QStringLiteral("new.premium"), 1}, {P + QStringLiteral("twin.premium"), 0}});
+        const QVariantMap entry {
+            {QStringLiteral("VoiceAttributes"),
+                QVariantMap {{QStringLiteral("VoiceIdentifier"), QStringLiteral("wrong")},
+                    {QStringLiteral("VoiceName"), QStringLiteral("New Premium")},
+                    {QStringLiteral("VoiceLocaleIdentifier"), QStringLiteral("sv_SE")}}},
+            {QStringLiteral("VoiceByteSize"), qint64(1500000)},
+            {QStringLiteral("VoiceVersion"), QStringLiteral("1.0")},
+            {QStringLiteral("VoiceTag"), QStringLiteral("VOICEID:new")},
+            {QStringLiteral("FullSizeByteSize"), QStringLiteral("big")},
             {QStringLiteral("FullSizeTagName"), QStringLiteral("VOICEID:new.full")}};
         const auto voice = DownloadableVoice::initWithVoiceID(P + QStringLiteral("new.premium"), entry);
         QVERIFY(voice);
@@ -246,11 +278,13 @@ private Q_SLOTS:
         QCOMPARE(voice->displayNameRoot(), QStringLiteral("New"));
         // No premium fallback for a compact download.
         QCOMPARE(DownloadableVoice::initWithVoiceID(P + QStringLiteral("twin"), entry)->visibility(), 2);
-        QVERIFY(!DownloadableVoice::initWithVoiceID(P + QStringLiteral("x"), QStringLiteral("not a dictionary")));
+        QVERIFY(
+            !DownloadableVoice::initWithVoiceID(P + QStringLiteral("x"), QStringLiteral("not a dictionary")));
     }
 
 private:
-    void addVoice(const QString &suffix, const QString &name, const QString &locale, bool fullListOnly = false)
+    void addVoice(
+        const QString &suffix, const QString &name, const QString &locale, bool fullListOnly = false)
     {
         QVariantMap attributes = TestEnvironment::voiceAttributes(P + suffix, name, locale);
         if (fullListOnly) {
