@@ -1,0 +1,26 @@
+#include "CZSystemBehaviorManager.h"
+
+namespace Cadenza {
+
+CZSystemBehaviorManager &CZSystemBehaviorManager::sharedCZSystemBehaviorManager()
+{
+    static CZSystemBehaviorManager *manager = new CZSystemBehaviorManager; // never released
+    return *manager;
+}
+
+quintptr CZSystemBehaviorManager::_numberObjectFromTimer(const CZPowerSavvyTimer *timer)
+{
+    return reinterpret_cast<quintptr>(timer);
+}
+
+void CZSystemBehaviorManager::addTimer(const CZPowerSavvyTimer *timer)
+{
+    _registeredTimers.insert(_numberObjectFromTimer(timer));
+}
+
+void CZSystemBehaviorManager::removeTimer(const CZPowerSavvyTimer *timer)
+{
+    _registeredTimers.remove(_numberObjectFromTimer(timer));
+}
+
+} // namespace Cadenza
