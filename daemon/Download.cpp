@@ -218,13 +218,16 @@ void Download::onReplyFinished()
         return;
     }
     const int status = reply->attribute(QNetworkRequest::HttpStatusCodeAttribute).toInt();
-    if (reply->error() == QNetworkReply::NoError && (status == 200 || status == 206)) {
+    // A connection that closed early can look like a complete answer; the catalogue's size says not.
+    const bool shortAnswer = m_received.load() < m_expectedSize;
+    if (reply->error() == QNetworkReply::NoError && (status == 200 || status == 206) && !shortAnswer) {
         succeed();
         return;
     }
     // A dropped connection after some data is resumed where it stopped; anything else moves on.
     const bool connectionLost
-        = reply->error() != QNetworkReply::NoError && reply->error() < QNetworkReply::ContentAccessDenied;
+        = (reply->error() != QNetworkReply::NoError && reply->error() < QNetworkReply::ContentAccessDenied)
+        || (reply->error() == QNetworkReply::NoError && shortAnswer);
     const bool transient = connectionLost || status >= 500;
     if (transient && m_received.load() > 0 && m_resumes < MaximumResumes) {
         ++m_resumes;

@@ -1,9 +1,11 @@
 #include "Services.h"
 
+#include "AdministratorService.h"
 #include "BundleSpeechSynthesisService.h"
 #include "DBusNotificationCenter.h"
 #include "EnvironmentUserLocaleService.h"
 #include "FilePreferencesStore.h"
+#include "PowerSourcesInfo.h"
 #include "RecognitionService.h"
 #include "UnixMessagePortService.h"
 
@@ -22,6 +24,8 @@ struct Registry
     std::shared_ptr<MessagePortService> messagePorts;
     std::shared_ptr<DistributedNotificationCenter> notifications;
     std::shared_ptr<RecognitionService> recognition;
+    std::shared_ptr<PowerSourcesInfo> powerSources;
+    std::shared_ptr<AdministratorService> administrator;
 };
 
 Registry &registry()
@@ -118,6 +122,34 @@ RecognitionService &Services::recognition()
 void Services::setRecognition(std::shared_ptr<RecognitionService> service)
 {
     replace(&Registry::recognition, std::move(service));
+}
+
+} // namespace Cadenza::Platform
+
+namespace Cadenza::Platform {
+
+PowerSourcesInfo &Services::powerSources()
+{
+    return serviceOf<PowerSourcesInfo, SysfsPowerSourcesInfo>(&Registry::powerSources);
+}
+
+void Services::setPowerSources(std::shared_ptr<PowerSourcesInfo> info)
+{
+    replace(&Registry::powerSources, std::move(info));
+}
+
+} // namespace Cadenza::Platform
+
+namespace Cadenza::Platform {
+
+AdministratorService &Services::administrator()
+{
+    return serviceOf<AdministratorService, PolkitAdministratorService>(&Registry::administrator);
+}
+
+void Services::setAdministrator(std::shared_ptr<AdministratorService> service)
+{
+    replace(&Registry::administrator, std::move(service));
 }
 
 } // namespace Cadenza::Platform

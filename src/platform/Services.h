@@ -7,8 +7,10 @@
 
 namespace Cadenza::Platform {
 
+class AdministratorService;
 class DistributedNotificationCenter;
 class MessagePortService;
+class PowerSourcesInfo;
 class PreferencesStore;
 class RecognitionService;
 class SpeechSynthesisService;
@@ -27,6 +29,8 @@ public:
     static MessagePortService &messagePorts();
     static DistributedNotificationCenter &notifications();
     static RecognitionService &recognition();
+    static PowerSourcesInfo &powerSources();
+    static AdministratorService &administrator();
 
     /// Replaces a service; passing nullptr returns to the Linux implementation.
     static void setPreferences(std::shared_ptr<PreferencesStore> store);
@@ -35,6 +39,8 @@ public:
     static void setMessagePorts(std::shared_ptr<MessagePortService> service);
     static void setNotifications(std::shared_ptr<DistributedNotificationCenter> center);
     static void setRecognition(std::shared_ptr<RecognitionService> service);
+    static void setPowerSources(std::shared_ptr<PowerSourcesInfo> info);
+    static void setAdministrator(std::shared_ptr<AdministratorService> service);
 };
 
 } // namespace Cadenza::Platform
