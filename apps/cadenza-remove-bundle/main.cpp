@@ -28,8 +28,8 @@ int main(int argc, char *argv[])
     // pkexec clears the environment: the folders are the system's, never a caller's choice.
     QString error;
     if (!Cadenza::Platform::BundleRemoval::remove(arguments.at(1), &error)) {
-        std::fprintf(stderr, "cadenza-remove-bundle: refusing to remove %s: %s\n", qPrintable(arguments.at(1)),
-            qPrintable(error));
+        std::fprintf(stderr, "cadenza-remove-bundle: refusing to remove %s: %s\n",
+            qPrintable(arguments.at(1)), qPrintable(error));
         return 1;
     }
     return 0;

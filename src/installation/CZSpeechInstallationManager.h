@@ -11,8 +11,27 @@
 
 #include <memory>
 #include <optional>
+#include <variant>
 
 namespace Cadenza {
+
+class CZSRLanguageItem;
+class CZSpeechItem;
+class CZVoiceObject;
+class DownloadableVoice;
+using CZSRLanguageItemPtr = std::shared_ptr<CZSRLanguageItem>;
+using CZSpeechItemPtr = std::shared_ptr<CZSpeechItem>;
+using CZVoiceObjectPtr = std::shared_ptr<CZVoiceObject>;
+using DownloadableVoicePtr = std::shared_ptr<DownloadableVoice>;
+
+/// An installed bundle on disk.
+struct CADENZACORE_EXPORT SpeechBundle
+{
+    QString path;
+};
+
+/// Something the user asked to remove: a voice or a recognition language.
+using RemovableSpeechItem = std::variant<CZVoiceObjectPtr, CZSRLanguageItemPtr>;
 
 namespace Platform {
 class LocalMessagePort;
@@ -45,6 +64,12 @@ public:
     explicit CZSpeechInstallationManager(QObject *parent = nullptr);
     ~CZSpeechInstallationManager() override;
 
+    /// Where the default voice lives, and the default voice's identifier.
+    static const QString DefaultVoiceIdentifier;
+    static const QString InstallationLogKey; ///< "SpeechDataInstallationLog"
+    static const QString VoicePreferencesDomain;
+    static const QString RecognitionPreferencesDomain;
+
     [[nodiscard]] std::shared_ptr<CZSpeechInstallationManagerDelegate> delegate() const;
     void setDelegate(std::shared_ptr<CZSpeechInstallationManagerDelegate> delegate);
 
@@ -54,6 +79,45 @@ public:
     [[nodiscard]] QVariantList activeVoiceInstallations();
     void showProgressWindow();
     void cancelAllInstallations();
+
+    // Downloadable speech data.
+    /// The catalogue's voices that are not installed, or whose installed quality can be upgraded,
+    /// with their status from the running installations.
+    [[nodiscard]] QList<DownloadableVoicePtr> downloadableVoices();
+    /// The catalogue's recognition languages that are not installed here.
+    [[nodiscard]] QList<CZSRLanguageItemPtr> downloadableSRLanguageItems();
+    [[nodiscard]] DownloadableVoicePtr downloadableVoiceUpgradeForVoice(
+        const CZVoiceObject &voice, const QList<DownloadableVoicePtr> &fromDownloadableVoices);
+    /// There are no upgrades of recognition languages: always null.
+    [[nodiscard]] CZSpeechItemPtr downloadableSpeechItemUpgradeForExistingSpeechItem(
+        const CZSpeechItemPtr &item, const QList<CZSRLanguageItemPtr> &fromDownloadableItems);
+    /// One request per voice; true when at least one was sent. "DoNotDownloadVoices" set to 0 blocks.
+    bool startInstallingDownloadableVoices(
+        const QList<DownloadableVoicePtr> &voices, bool useRootNames, qint64 userInteractionMode);
+    /// One request per language; true when at least one was sent. "DoNotDownloadLanguages" set to 0 blocks.
+    bool startInstallingDownloadableSpeechItems(
+        const QList<CZSRLanguageItemPtr> &items, qint64 userInteractionMode);
+    /// Removes the items' bundles with administrator rights, later on the main thread, and logs each removal.
+    void startRemovingDownloadedSpeechItems(const QList<RemovableSpeechItem> &items);
+    [[nodiscard]] std::optional<SpeechBundle> bundleForRemovableVoice(
+        const CZVoiceObject &voice, QString *passingBackTagName);
+    [[nodiscard]] std::optional<SpeechBundle> bundleForRemovableLanguage(
+        const CZSRLanguageItem &item, QString *passingBackTagName);
+    [[nodiscard]] QString onDiskVersionForBundlePath(const QString &bundlePath);
+    [[nodiscard]] std::optional<QVariantMap> installationLogEntryForTag(const QString &tag);
+    [[nodiscard]] std::optional<QVariantMap> installationLogEntryForTag(
+        const QString &tag, const QString &preferenceDomain);
+
+    // The background download policy.
+    [[nodiscard]] bool isRunningOnACPower();
+    void markDownloadableVoiceObject(const DownloadableVoice &voice, bool withAutoDownloadProhibitFlag);
+    [[nodiscard]] bool isAutoDownloadProhibitedForDownloadableVoiceObject(const DownloadableVoice &voice);
+    /// The best installed quality of the voice @p rootIdentifier names; may start fetching a better one.
+    [[nodiscard]] QString highestQualityVoiceIdentifierForRootVoiceIdentifier(
+        const QString &rootIdentifier, bool startDownloading);
+    /// Starts fetching the premium quality of @p voiceIdentifier when the rules allow it.
+    bool startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(const QString &voiceIdentifier);
+    [[nodiscard]] bool doesLanguageDataNeedToBeDownloadedForLocaleIdentifier(const QString &localeIdentifier);
 
     /// Sends one installation request (message 1) with its own local port; false when none was sent.
     bool _requestInstallation(const QString &tagName, const QString &itemName, quint64 byteSize,
@@ -78,12 +142,19 @@ private:
     friend std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port, qint32 messageId,
         const QByteArray &data, CZSpeechInstallationManager *info);
     void releaseLocalPort(const QString &name);
+    void removeNow(const QList<RemovableSpeechItem> &items);
+    void logRemoval(const QString &tag);
 
     mutable QMutex m_delegateMutex;
     std::shared_ptr<CZSpeechInstallationManagerDelegate> _delegate;
     std::unique_ptr<Platform::RemoteMessagePort> _serverPortRef;
     QHash<QString, std::shared_ptr<Platform::LocalMessagePort>> m_localPorts;
 };
+
+/// The exported entry point of the background policy: the shared manager's
+/// startDownloadingHighestQualityIfNecessaryForVoiceIdentifier().
+CADENZACORE_EXPORT bool StartDownloadingHighestQualityIfNecessaryForVoiceIdentifier(
+    const QString &voiceIdentifier);
 
 /// A local port's callback: hands a completion to the manager's delegate and closes the port.
 CADENZACORE_EXPORT std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port,

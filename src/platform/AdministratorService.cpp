@@ -17,7 +17,8 @@ AdministratorService::~AdministratorService() = default;
 QString PolkitAdministratorService::helperPath()
 {
     const QString fromEnvironment = qEnvironmentVariable("CADENZA_REMOVE_HELPER");
-    return fromEnvironment.isEmpty() ? QStringLiteral(CADENZA_LIBEXECDIR "/cadenza-remove-bundle") : fromEnvironment;
+    return fromEnvironment.isEmpty() ? QStringLiteral(CADENZA_LIBEXECDIR "/cadenza-remove-bundle")
+                                     : fromEnvironment;
 }
 
 bool PolkitAdministratorService::obtainRight(const QString &, int)
@@ -52,7 +53,8 @@ AdministratorService::Removal PolkitAdministratorService::removeBundle(const QSt
     }
     helper.waitForFinished(-1);
     // pkexec answers 126 when the user refused or could not authenticate, 127 when not allowed.
-    if (helper.exitStatus() == QProcess::NormalExit && (helper.exitCode() == 126 || helper.exitCode() == 127)) {
+    if (helper.exitStatus() == QProcess::NormalExit
+        && (helper.exitCode() == 126 || helper.exitCode() == 127)) {
         return Removal::Refused;
     }
     if (helper.exitStatus() != QProcess::NormalExit || helper.exitCode() != 0) {

@@ -41,7 +41,9 @@ bool removeContents(int fd, QString *error, int depth)
         if (std::strcmp(name, ".") == 0 || std::strcmp(name, "..") == 0) {
             continue;
         }
-        struct stat st {};
+        struct stat st
+        {
+        };
         if (::fstatat(::dirfd(dir), name, &st, AT_SYMLINK_NOFOLLOW) != 0) {
             *error = systemError();
             ok = false;
@@ -113,7 +115,9 @@ QString BundleRemoval::refusal(const QString &path, const QStringList &folders)
     if (real.isEmpty() || real != parent) {
         return QStringLiteral("%1 is reached through a symbolic link").arg(parent.left(200));
     }
-    struct stat st {};
+    struct stat st
+    {
+    };
     if (::lstat(QFile::encodeName(clean).constData(), &st) != 0) {
         return QStringLiteral("%1: %2").arg(clean.left(200), systemError());
     }
@@ -141,7 +145,8 @@ bool BundleRemoval::remove(const QString &path, QString *error, const QStringLis
         *error = systemError();
         return false;
     }
-    const int bundleFd = ::openat(parentFd, name.constData(), O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC);
+    const int bundleFd
+        = ::openat(parentFd, name.constData(), O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC);
     if (bundleFd < 0) {
         *error = QStringLiteral("%1: %2").arg(clean.left(200), systemError());
         ::close(parentFd);

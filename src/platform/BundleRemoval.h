@@ -24,7 +24,8 @@ public:
     /// Why @p path may not be removed, or an empty string when it may.
     [[nodiscard]] static QString refusal(const QString &path, const QStringList &folders = knownFolders());
     /// Removes the bundle at @p path; false, with @p error set, when refused or when it failed.
-    [[nodiscard]] static bool remove(const QString &path, QString *error, const QStringList &folders = knownFolders());
+    [[nodiscard]] static bool remove(
+        const QString &path, QString *error, const QStringList &folders = knownFolders());
 };
 
 } // namespace Cadenza::Platform

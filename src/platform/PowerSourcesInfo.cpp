@@ -32,7 +32,8 @@ std::optional<QList<QVariantMap>> SysfsPowerSourcesInfo::powerSources()
         return std::nullopt;
     }
     QList<QVariantMap> sources;
-    const QStringList supplies = folder.entryList(QDir::Dirs | QDir::NoDotAndDotDot | QDir::System, QDir::Name);
+    const QStringList supplies
+        = folder.entryList(QDir::Dirs | QDir::NoDotAndDotDot | QDir::System, QDir::Name);
     for (const QString &supply : supplies) {
         const QString base = folder.filePath(supply);
         const QString type = readLine(base + QStringLiteral("/type"));

@@ -5,6 +5,7 @@
 #include "PropertyList.h"
 
 #include <QDir>
+#include <QFileInfo>
 
 namespace Cadenza::Platform {
 
@@ -36,6 +37,42 @@ std::optional<QStringList> BundleRecognitionService::installedLanguages()
         }
     }
     return languages;
+}
+
+QString BundleRecognitionService::bundlePathForIdentifier(const QString &bundleIdentifier)
+{
+    if (bundleIdentifier.isEmpty()) {
+        return {};
+    }
+    for (const QString &folder : Paths::recognizerFolders()) {
+        const QDir dir(folder);
+        const QStringList bundles = dir.entryList(
+            {QStringLiteral("*.SpeechRecognition")}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Name);
+        for (const QString &bundle : bundles) {
+            const auto info = PropertyList::readFile(dir.filePath(bundle) + QStringLiteral("/Info.plist"));
+            if (info
+                && info->toMap().value(QStringLiteral("BundleIdentifier")).toString() == bundleIdentifier) {
+                return dir.filePath(bundle);
+            }
+        }
+    }
+    return {};
+}
+
+QString BundleRecognitionService::bundlePathForLocale(const QString &localeIdentifier)
+{
+    if (localeIdentifier.isEmpty() || localeIdentifier.contains(QLatin1Char('/'))
+        || localeIdentifier.startsWith(QLatin1Char('.'))) {
+        return {};
+    }
+    for (const QString &folder : Paths::recognizerFolders()) {
+        const QString path
+            = folder + QLatin1Char('/') + localeIdentifier + QStringLiteral(".SpeechRecognition");
+        if (QFileInfo(path).isDir()) {
+            return path;
+        }
+    }
+    return {};
 }
 
 } // namespace Cadenza::Platform
