@@ -1,5 +1,6 @@
 // cadenza: Cadenza's command-line tool.
 
+#include "DownloadCommands.h"
 #include "InstallerCommands.h"
 #include "LanguagesCommand.h"
 #include "PostCommand.h"
@@ -25,6 +26,10 @@ void printUsage(FILE *to)
                "  status   show what the installer daemon is installing\n"
                "  install  install a voice or recognition language by its tag\n"
                "  cancel   cancel every installation\n"
+               "  downloadables list what can be downloaded or upgraded\n"
+               "  remove   remove a downloaded voice or recognition language\n"
+               "  upgrade  fetch the best quality of a voice in the background, when allowed\n"
+               "  power    say whether this computer runs on mains power\n"
                "\n"
                "Run 'cadenza COMMAND --help' for the options of a command.\n",
         to);
@@ -66,6 +71,18 @@ int main(int argc, char *argv[])
     }
     if (command == u"install") {
         return InstallerCommands::install(arguments);
+    }
+    if (command == u"downloadables") {
+        return DownloadCommands::downloadables(arguments);
+    }
+    if (command == u"remove") {
+        return DownloadCommands::remove(arguments);
+    }
+    if (command == u"upgrade") {
+        return DownloadCommands::upgrade(arguments);
+    }
+    if (command == u"power") {
+        return DownloadCommands::power(arguments);
     }
     if (command == u"cancel") {
         return InstallerCommands::cancel(arguments);

@@ -8,6 +8,8 @@
 #include "platform/PropertyList.h"
 #include "platform/Services.h"
 #include "platform/UnixMessagePortService.h"
+#include "speech-items/CZSpeechItem_p.h"
+#include "voices/DownloadableVoice.h"
 
 #include <QCryptographicHash>
 #include <QDBusConnection>
@@ -280,6 +282,36 @@ private Q_SLOTS:
         QVERIFY(request(SmallTag));
         QVERIFY(waitForCompletion(InstalledCompletion));
         QCOMPARE(m_finished->last().at(0).toString(), SmallTag);
+    }
+
+    void downloadableVoicesFollowAnInstallation()
+    {
+        SpeechItemPrivate::setInstallationDictionary(QVariantMap {{QStringLiteral("DownloadableVoices"),
+            QVariantMap {{QStringLiteral("com.vendra.test.big.premium"),
+                QVariantMap {{QStringLiteral("VoiceAttributes"),
+                                 QVariantMap {{QStringLiteral("VoiceName"), QStringLiteral("Big Premium")}}},
+                    {QStringLiteral("VoiceTag"), BigTag},
+                    {QStringLiteral("VoiceByteSize"), qint64(m_bigSize)}}}}}});
+        m_http->setBytesPerSecond(2 * 1024 * 1024);
+        startTestDaemon();
+        auto status = [this]() -> qint64 {
+            for (const auto &voice : m_manager->downloadableVoices()) {
+                if (voice->identifier() == u"com.vendra.test.big.premium") {
+                    return voice->downloadStatus();
+                }
+            }
+            return -1; // not listed: installed
+        };
+        QCOMPARE(status(), qint64(NotInstalledStatus));
+        // A request waiting behind another shows 4, the running one 3, and an installed voice is gone.
+        QVERIFY(request(SmallTag));
+        const auto voices = m_manager->downloadableVoices();
+        QVERIFY(m_manager->startInstallingDownloadableVoices(voices, true, 0));
+        QTRY_VERIFY_WITH_TIMEOUT(status() == WaitingStatus || status() == DownloadingStatus, 10000);
+        QTRY_COMPARE_WITH_TIMEOUT(status(), qint64(DownloadingStatus), 10000);
+        QVERIFY(waitForCompletions(2, 30000));
+        QTRY_COMPARE_WITH_TIMEOUT(status(), qint64(-1), 5000);
+        SpeechItemPrivate::setInstallationDictionary(std::nullopt);
     }
 
     void hostileClientsDoNotStopTheDaemon()
