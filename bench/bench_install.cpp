@@ -2,6 +2,7 @@
 // and tar -x of the same archive, in the same run.
 
 #include "BenchTable.h"
+#include "BenchWorld.h"
 
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/InstallerProtocol.h"
@@ -45,13 +46,7 @@ int main(int argc, char *argv[])
     const qint64 megabytes = argc > 1 ? std::atoll(argv[1]) : 100;
     const int runs = argc > 2 ? std::atoi(argv[2]) : 3;
     QTemporaryDir world;
-    for (const char *name :
-        {"XDG_DATA_HOME", "XDG_CONFIG_HOME", "XDG_CACHE_HOME", "XDG_RUNTIME_DIR", "CADENZA_ROOT"}) {
-        const QString folder = world.filePath(QString::fromLatin1(name));
-        QDir().mkpath(folder);
-        qputenv(name, QFile::encodeName(folder));
-    }
-    ::chmod(QFile::encodeName(world.filePath(QStringLiteral("XDG_RUNTIME_DIR"))).constData(), 0700);
+    enterPrivateWorld(world);
 
     // A bundle of incompressible data, so that the archive is as large as what it holds.
     const QString sources = world.filePath(QStringLiteral("sources"));

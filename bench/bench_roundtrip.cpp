@@ -2,6 +2,7 @@
 // bare Unix-socket ping-pong that moves the same number of bytes, in the same run.
 
 #include "BenchTable.h"
+#include "BenchWorld.h"
 
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/InstallerProtocol.h"
@@ -86,13 +87,7 @@ int main(int argc, char *argv[])
     QCoreApplication app(argc, argv);
     const int rounds = argc > 1 ? std::atoi(argv[1]) : 2000;
     QTemporaryDir world;
-    for (const char *name :
-        {"XDG_DATA_HOME", "XDG_CONFIG_HOME", "XDG_CACHE_HOME", "XDG_RUNTIME_DIR", "CADENZA_ROOT"}) {
-        const QString folder = world.filePath(QString::fromLatin1(name));
-        QDir().mkpath(folder);
-        qputenv(name, QFile::encodeName(folder));
-    }
-    ::chmod(QFile::encodeName(world.filePath(QStringLiteral("XDG_RUNTIME_DIR"))).constData(), 0700);
+    enterPrivateWorld(world);
 
     // Every package points at a pipe nobody writes to: the first download waits for ever, the rest queue.
     const QString pipe = world.filePath(QStringLiteral("repository/stalled"));

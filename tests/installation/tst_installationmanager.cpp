@@ -1,3 +1,4 @@
+#include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
 #include "installation/CZSpeechInstallationManager.h"
@@ -49,29 +50,6 @@ QVariantMap downloadable(
         {QStringLiteral("FullSizeVersion"), version}};
 }
 
-/// A daemon of fake ports: records requests and answers message 3 with the records a test sets.
-struct FakeDaemon
-{
-    explicit FakeDaemon(FakeMessagePortService &ports)
-    {
-        requestPort = ports.createLocalPort(ServicePortName,
-            [this](qint32 id, const QByteArray &data, const MessagePeer &) -> std::optional<QByteArray> {
-                if (id == ActiveInstallationsMessage) {
-                    return CZEncodeSecureObject(records);
-                }
-                if (id == StartInstallingMessage) {
-                    requests.append(CZDecodeSecureDictionary(data).value_or(QVariantMap()));
-                }
-                return std::nullopt;
-            });
-        livenessPort = ports.createLocalPort(LivenessPortName,
-            [](qint32, const QByteArray &, const MessagePeer &) { return std::optional<QByteArray>(); });
-    }
-    std::unique_ptr<LocalMessagePort> requestPort;
-    std::unique_ptr<LocalMessagePort> livenessPort;
-    QList<QVariantMap> requests;
-    QVariantList records;
-};
 } // namespace
 
 class InstallationManagerTest : public QObject
@@ -95,7 +73,7 @@ private Q_SLOTS:
         Services::setRecognition(m_recognition);
         Services::setUserLocale(std::make_shared<FakeUserLocaleService>());
         Services::setNotifications(std::make_shared<InProcessNotificationCenter>());
-        m_daemon = std::make_unique<FakeDaemon>(*m_ports);
+        m_daemon = std::make_unique<Testing::FakeInstallerDaemon>(*m_ports);
         m_manager = std::make_unique<CZSpeechInstallationManager>();
         SpeechItemPrivate::setInstallationDictionary(QVariantMap {
             {QStringLiteral("DownloadableVoices"),
@@ -126,8 +104,8 @@ private Q_SLOTS:
 
     void downloadableVoicesAndTheirStatus()
     {
-        m_daemon->records = {QVariantMap {{ObjectIDKey, QString(P + QStringLiteral("new.premium"))},
-            {ItemDownloadStatusKey, qint64(3)}, {ItemPercentCompleteKey, 42.0}}};
+        m_daemon->setActiveRecords({QVariantMap {{ObjectIDKey, QString(P + QStringLiteral("new.premium"))},
+            {ItemDownloadStatusKey, qint64(3)}, {ItemPercentCompleteKey, 42.0}}});
         const auto voices = byIdentifier(m_manager->downloadableVoices());
         QVERIFY(!voices.contains(P + QStringLiteral("have.premium"))); // installed
         QCOMPARE(
@@ -137,7 +115,7 @@ private Q_SLOTS:
         // The default voice: installed 1.2, catalogue 1.3: an upgrade, always at full size.
         QCOMPARE(voices.value(Orin)->downloadStatus(), 1);
         QVERIFY(voices.value(Orin)->downloadFullSize());
-        m_daemon->records.clear();
+        m_daemon->setActiveRecords({});
         QCOMPARE(byIdentifier(m_manager->downloadableVoices())
                      .value(P + QStringLiteral("new.premium"))
                      ->downloadStatus(),
@@ -164,22 +142,24 @@ private Q_SLOTS:
         const QList<DownloadableVoicePtr> two {
             voices.value(P + QStringLiteral("maren.premium")), voices.value(Orin)};
         QVERIFY(m_manager->startInstallingDownloadableVoices(two, true, 0));
-        QCOMPARE(m_daemon->requests.size(), 2);
-        QCOMPARE(m_daemon->requests.at(0).value(ItemNameKey).toString(), QStringLiteral("Maren"));
-        QCOMPARE(
-            m_daemon->requests.at(0).value(TagNameKey).toString(), QStringLiteral("VOICEID:Maren Premium"));
-        QCOMPARE(m_daemon->requests.at(1).value(TagNameKey).toString(), QStringLiteral("VOICEID:full.Orin"));
-        QCOMPARE(m_daemon->requests.at(1).value(ItemByteSizeKey).toULongLong(), 5000u);
-        QVERIFY(m_daemon->requests.at(0).value(ClientPortNameKey)
-            != m_daemon->requests.at(1).value(ClientPortNameKey));
+        QCOMPARE(m_daemon->installRequests().size(), 2);
+        QCOMPARE(m_daemon->installRequests().at(0).value(ItemNameKey).toString(), QStringLiteral("Maren"));
+        QCOMPARE(m_daemon->installRequests().at(0).value(TagNameKey).toString(),
+            QStringLiteral("VOICEID:Maren Premium"));
+        QCOMPARE(m_daemon->installRequests().at(1).value(TagNameKey).toString(),
+            QStringLiteral("VOICEID:full.Orin"));
+        QCOMPARE(m_daemon->installRequests().at(1).value(ItemByteSizeKey).toULongLong(), 5000u);
+        QVERIFY(m_daemon->installRequests().at(0).value(ClientPortNameKey)
+            != m_daemon->installRequests().at(1).value(ClientPortNameKey));
         // The gate lives in the recognition domain, and a zero blocks.
         m_preferences->setValue(QStringLiteral("DoNotDownloadVoices"), 1, RecognitionDomain);
         QVERIFY(m_manager->startInstallingDownloadableVoices(two, false, 0));
-        QCOMPARE(m_daemon->requests.size(), 4);
-        QCOMPARE(m_daemon->requests.at(2).value(ItemNameKey).toString(), QStringLiteral("Maren Premium"));
+        QCOMPARE(m_daemon->installRequests().size(), 4);
+        QCOMPARE(
+            m_daemon->installRequests().at(2).value(ItemNameKey).toString(), QStringLiteral("Maren Premium"));
         m_preferences->setValue(QStringLiteral("DoNotDownloadVoices"), 0, RecognitionDomain);
         QVERIFY(!m_manager->startInstallingDownloadableVoices(two, false, 0));
-        QCOMPARE(m_daemon->requests.size(), 4);
+        QCOMPARE(m_daemon->installRequests().size(), 4);
         m_preferences->setValue(
             QStringLiteral("DoNotDownloadVoices"), 256, VoiceDomain); // the wrong domain: no effect
     }
@@ -187,16 +167,17 @@ private Q_SLOTS:
     void recognitionLanguages()
     {
         m_recognition->setInstalledLanguages(QStringList {QStringLiteral("fr_FR")});
-        m_daemon->records
-            = {QVariantMap {{ObjectIDKey, QStringLiteral("de-de")}, {ItemDownloadStatusKey, qint64(4)}}};
+        m_daemon->setActiveRecords(
+            {QVariantMap {{ObjectIDKey, QStringLiteral("de-de")}, {ItemDownloadStatusKey, qint64(4)}}});
         const auto items = m_manager->downloadableSRLanguageItems();
         QCOMPARE(items.size(), 1);
         QCOMPARE(items.first()->localeIdentifier(), QStringLiteral("de_DE"));
         QCOMPARE(items.first()->downloadStatus(), 4);
         items.first()->setShowCountryInDisplayTitle(true);
         QVERIFY(m_manager->startInstallingDownloadableSpeechItems(items, 1));
-        QCOMPARE(m_daemon->requests.last().value(ItemNameKey).toString(), QStringLiteral("German (Germany)"));
-        QCOMPARE(m_daemon->requests.last().value(ObjectIDKey).toString(), QStringLiteral("de_DE"));
+        QCOMPARE(m_daemon->installRequests().last().value(ItemNameKey).toString(),
+            QStringLiteral("German (Germany)"));
+        QCOMPARE(m_daemon->installRequests().last().value(ObjectIDKey).toString(), QStringLiteral("de_DE"));
         QVERIFY(!items.first()->showCountryInDisplayTitle()); // switched off, not restored
         m_preferences->setValue(QStringLiteral("DoNotDownloadLanguages"), false, RecognitionDomain);
         QVERIFY(!m_manager->startInstallingDownloadableSpeechItems(items, 1));
@@ -279,13 +260,13 @@ private Q_SLOTS:
         QCOMPARE(
             m_manager->highestQualityVoiceIdentifierForRootVoiceIdentifier(P + QStringLiteral("maren"), true),
             compact);
-        QVERIFY(m_daemon->requests.isEmpty());
+        QVERIFY(m_daemon->installRequests().isEmpty());
 
         m_power->setPowerSources(std::nullopt); // no information: mains
         QVERIFY(m_manager->isRunningOnACPower());
         QVERIFY(m_manager->startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(
             P + QStringLiteral("x.premium")));
-        QVERIFY(m_daemon->requests.isEmpty());
+        QVERIFY(m_daemon->installRequests().isEmpty());
 
         setLog(tag, {{QStringLiteral("BackgroundAttempts"), 4}});
         QVERIFY(!m_manager->startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(compact));
@@ -295,22 +276,22 @@ private Q_SLOTS:
         QVERIFY(!m_manager->startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(compact));
         setLog(tag, {{QStringLiteral("AutoAttemptProhibited"), true}});
         QVERIFY(!m_manager->startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(compact));
-        QVERIFY(m_daemon->requests.isEmpty());
+        QVERIFY(m_daemon->installRequests().isEmpty());
 
         setLog(tag,
             {{QStringLiteral("BackgroundAttempts"), 3},
                 {QStringLiteral("LastBackgroundAttemptDate"), now() - 342000.0 - 5},
                 {QStringLiteral("AutoAttemptProhibited"), QStringLiteral("yes")}});
         QVERIFY(m_manager->startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(compact));
-        QCOMPARE(m_daemon->requests.size(), 1);
-        QCOMPARE(m_daemon->requests.first().value(UserInteractionModeKey).toLongLong(), 1);
-        QCOMPARE(m_daemon->requests.first().value(ItemNameKey).toString(), QStringLiteral("Maren"));
+        QCOMPARE(m_daemon->installRequests().size(), 1);
+        QCOMPARE(m_daemon->installRequests().first().value(UserInteractionModeKey).toLongLong(), 1);
+        QCOMPARE(m_daemon->installRequests().first().value(ItemNameKey).toString(), QStringLiteral("Maren"));
 
         // Already running: no second request.
-        m_daemon->records = {QVariantMap {
-            {ObjectIDKey, QString(P + QStringLiteral("maren.premium"))}, {ItemDownloadStatusKey, qint64(3)}}};
+        m_daemon->setActiveRecords({QVariantMap {{ObjectIDKey, QString(P + QStringLiteral("maren.premium"))},
+            {ItemDownloadStatusKey, qint64(3)}}});
         QVERIFY(m_manager->startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(compact));
-        QCOMPARE(m_daemon->requests.size(), 1);
+        QCOMPARE(m_daemon->installRequests().size(), 1);
     }
 
     void prohibitionFlag()
@@ -331,7 +312,7 @@ private Q_SLOTS:
         QCOMPARE(
             m_manager->highestQualityVoiceIdentifierForRootVoiceIdentifier(P + QStringLiteral("maren"), true),
             P + QStringLiteral("maren.compact"));
-        QCOMPARE(m_daemon->requests.size(), 1);
+        QCOMPARE(m_daemon->installRequests().size(), 1);
         QVERIFY(m_manager->highestQualityVoiceIdentifierForRootVoiceIdentifier(QString(), true).isNull());
         QCOMPARE(
             m_manager->highestQualityVoiceIdentifierForRootVoiceIdentifier(P + QStringLiteral("have"), false),
@@ -341,7 +322,7 @@ private Q_SLOTS:
     void languageDataNeeds()
     {
         m_recognition->setInstalledLanguages(QStringList {QStringLiteral("fr_FR")});
-        m_daemon->records = {QVariantMap {{ObjectIDKey, QStringLiteral("de_DE")}}};
+        m_daemon->setActiveRecords({QVariantMap {{ObjectIDKey, QStringLiteral("de_DE")}}});
         QVERIFY(!m_manager->doesLanguageDataNeedToBeDownloadedForLocaleIdentifier(QStringLiteral("fr-fr")));
         QVERIFY(!m_manager->doesLanguageDataNeedToBeDownloadedForLocaleIdentifier(QStringLiteral("de_DE")));
         QVERIFY(m_manager->doesLanguageDataNeedToBeDownloadedForLocaleIdentifier(QStringLiteral("ja_JP")));
@@ -392,7 +373,7 @@ private:
     std::shared_ptr<FakePowerSourcesInfo> m_power;
     std::shared_ptr<FakeAdministratorService> m_administrator;
     std::shared_ptr<FakeRecognitionService> m_recognition;
-    std::unique_ptr<FakeDaemon> m_daemon;
+    std::unique_ptr<Testing::FakeInstallerDaemon> m_daemon;
     std::unique_ptr<CZSpeechInstallationManager> m_manager;
 };
 

@@ -1,3 +1,4 @@
+#include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
 #include "installation/CZSpeechInstallationManager.h"
@@ -20,31 +21,6 @@ class RecordingDelegate : public CZSpeechInstallationManagerDelegate
 public:
     void speechItemTags(const QStringList &tags, qint32 message) override { calls.append({tags, message}); }
     QList<std::pair<QStringList, qint32>> calls;
-};
-
-/// A daemon made of fake ports: records requests, answers message 3 with what the test sets.
-struct FakeDaemon
-{
-    explicit FakeDaemon(FakeMessagePortService &ports)
-    {
-        requestPort = ports.createLocalPort(ServicePortName,
-            [this](qint32 id, const QByteArray &data,
-                const Platform::MessagePeer &) -> std::optional<QByteArray> {
-                requests.append({id, data});
-                if (id == ActiveInstallationsMessage) {
-                    return answer;
-                }
-                return std::nullopt;
-            });
-        livenessPort = ports.createLocalPort(
-            LivenessPortName, [](qint32, const QByteArray &, const Platform::MessagePeer &) {
-                return std::optional<QByteArray>();
-            });
-    }
-    std::unique_ptr<Platform::LocalMessagePort> requestPort;
-    std::unique_ptr<Platform::LocalMessagePort> livenessPort;
-    QList<std::pair<qint32, QByteArray>> requests;
-    std::optional<QByteArray> answer;
 };
 
 } // namespace
@@ -95,17 +71,17 @@ private Q_SLOTS:
 
     void aRequestCarriesEightEntriesAndItsOwnPort()
     {
-        FakeDaemon daemon(*m_ports);
+        Testing::FakeInstallerDaemon daemon(*m_ports);
         QVERIFY(m_manager->_requestInstallation(
             QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1234, QStringLiteral("v.premium"), 1));
         QVERIFY(m_manager->_requestInstallation(
             QStringLiteral("VOICEID:w.premium"), QStringLiteral("W"), 99, QStringLiteral("w.premium"), 1));
-        QCOMPARE(daemon.requests.size(), 2);
+        QCOMPARE(daemon.messages().size(), 2);
         const QVariantMap first
-            = CZDecodeSecureDictionary(daemon.requests.at(0).second).value_or(QVariantMap());
+            = CZDecodeSecureDictionary(daemon.messages().at(0).second).value_or(QVariantMap());
         const QVariantMap second
-            = CZDecodeSecureDictionary(daemon.requests.at(1).second).value_or(QVariantMap());
-        QCOMPARE(daemon.requests.at(0).first, qint32(StartInstallingMessage));
+            = CZDecodeSecureDictionary(daemon.messages().at(1).second).value_or(QVariantMap());
+        QCOMPARE(daemon.messages().at(0).first, qint32(StartInstallingMessage));
         QCOMPARE(first.size(), 8);
         QCOMPARE(first.value(ItemDownloadStatusKey).toLongLong(), 4);
         QCOMPARE(first.value(ItemByteSizeKey).toULongLong(), 1234u);
@@ -131,18 +107,18 @@ private Q_SLOTS:
 
     void incompleteItemsAreSkipped()
     {
-        FakeDaemon daemon(*m_ports);
+        Testing::FakeInstallerDaemon daemon(*m_ports);
         QVERIFY(!m_manager->_requestInstallation(QString(), QStringLiteral("V"), 1, QStringLiteral("v"), 0));
         QVERIFY(!m_manager->_requestInstallation(
             QStringLiteral("VOICEID:v"), QString(), 1, QStringLiteral("v"), 0));
         QVERIFY(!m_manager->_requestInstallation(
             QStringLiteral("VOICEID:v"), QStringLiteral("V"), 1, QString(), 0));
-        QVERIFY(daemon.requests.isEmpty());
+        QVERIFY(daemon.messages().isEmpty());
     }
 
     void otherCompletionIdsLeaveThePortOpen()
     {
-        FakeDaemon daemon(*m_ports);
+        Testing::FakeInstallerDaemon daemon(*m_ports);
         QVERIFY(m_manager->_requestInstallation(
             QStringLiteral("SRCLANGID:de_DE"), QStringLiteral("German"), 1, QStringLiteral("de_DE"), 0));
         const QString port = m_manager->pendingLocalPortNames().value(0);
@@ -164,23 +140,23 @@ private Q_SLOTS:
 
     void activeInstallationsDecodeOnlyArrays()
     {
-        FakeDaemon daemon(*m_ports);
+        Testing::FakeInstallerDaemon daemon(*m_ports);
         const QVariantMap record {{TagNameKey, QStringLiteral("VOICEID:x")}, {ItemPercentCompleteKey, 12.5}};
-        daemon.answer = CZEncodeSecureObject(QVariantList {record, record});
+        daemon.setActiveRecords({record, record});
         QCOMPARE(m_manager->activeInstallations().size(), 2);
-        QCOMPARE(daemon.requests.last().first, qint32(ActiveInstallationsMessage));
-        QCOMPARE(CZDecodeSecureDictionary(daemon.requests.last().second).value_or(QVariantMap()).keys(),
+        QCOMPARE(daemon.messages().last().first, qint32(ActiveInstallationsMessage));
+        QCOMPARE(CZDecodeSecureDictionary(daemon.messages().last().second).value_or(QVariantMap()).keys(),
             QStringList {ClientProcessIDKey});
-        daemon.answer = CZEncodeSecureObject(record); // a dictionary, not an array
+        daemon.setAnswer(CZEncodeSecureObject(record)); // a dictionary, not an array
         QVERIFY(m_manager->activeInstallations().isEmpty());
-        daemon.answer = std::nullopt;
+        daemon.setAnswer(std::nullopt);
         QTest::ignoreMessage(QtWarningMsg, "client got NULL return data\n");
         QVERIFY(m_manager->activeInstallations().isEmpty());
     }
 
     void failedSendsAreLogged()
     {
-        FakeDaemon daemon(*m_ports);
+        Testing::FakeInstallerDaemon daemon(*m_ports);
         m_ports->setSendStatus(Platform::MessagePortStatus::SendTimeout);
         QTest::ignoreMessage(QtWarningMsg, "failed to send request 2: -1\n");
         m_manager->cancelAllInstallations();
@@ -190,16 +166,16 @@ private Q_SLOTS:
 
     void aRestartedDaemonIsFoundAgain()
     {
-        auto daemon = std::make_unique<FakeDaemon>(*m_ports);
-        daemon->answer = CZEncodeSecureObject(QVariantList());
+        auto daemon = std::make_unique<Testing::FakeInstallerDaemon>(*m_ports);
+        daemon->setActiveRecords({});
         QVERIFY(m_manager->_createServerPortIfNeeded());
         daemon.reset();
         QVERIFY(!m_manager->_createServerPortIfNeeded());
-        daemon = std::make_unique<FakeDaemon>(*m_ports);
+        daemon = std::make_unique<Testing::FakeInstallerDaemon>(*m_ports);
         QVERIFY(m_manager->_createServerPortIfNeeded());
         m_manager->cancelAllInstallations();
-        QCOMPARE(daemon->requests.size(), 1);
-        QCOMPARE(daemon->requests.first().first, qint32(CancelAllMessage));
+        QCOMPARE(daemon->messages().size(), 1);
+        QCOMPARE(daemon->messages().first().first, qint32(CancelAllMessage));
     }
 
 private:
