@@ -41,7 +41,12 @@ std::optional<QList<QVariantMap>> SysfsPowerSourcesInfo::powerSources()
         if (type == u"Mains" || type == u"USB") {
             state = readLine(base + QStringLiteral("/online")) == u"1" ? ACPower : OffLine;
         } else if (type == u"Battery") {
-            state = readLine(base + QStringLiteral("/status")) == u"Discharging" ? BatteryPower : ACPower;
+            // Mice and headsets have batteries too ("scope" Device, often without a status): not ours.
+            const QString status = readLine(base + QStringLiteral("/status"));
+            if (status.isEmpty() || readLine(base + QStringLiteral("/scope")) == u"Device") {
+                continue;
+            }
+            state = status == u"Discharging" ? BatteryPower : ACPower;
         } else {
             continue; // peripherals' batteries say nothing about this machine
         }

@@ -12,6 +12,7 @@
 #include "voices/WordStem.h"
 
 #include <QCollator>
+#include <QHash>
 #include <QLocale>
 
 #include <cstdlib>
@@ -94,12 +95,32 @@ QString conversionDisplayName(const QString &key, const QString &code)
     if (code.isEmpty()) {
         return {};
     }
+    // Lists ask for the names of the same few codes thousands of times. Names ICU knew are kept;
+    // a code that fell back to itself is asked again, so its log line is written every time.
+    struct Cache
+    {
+        QString localeIdentifier;
+        QHash<QString, QString> names;
+    };
+    thread_local Cache cache;
+    const Platform::Locale locale = CZSpeechItem::_conversionLocale();
+    if (cache.localeIdentifier != locale.identifier() || cache.names.size() > 4096) {
+        cache = {locale.identifier(), {}};
+    }
+    const QString cacheKey = key + QLatin1Char('|') + code;
+    if (const auto it = cache.names.constFind(cacheKey); it != cache.names.cend()) {
+        return *it;
+    }
+    QString name;
     try {
-        return displayNameForKey(CZSpeechItem::_conversionLocale(), key, code,
-            LocaleDisplayNameOptions::CapitalizationForListOrMenu);
+        name = displayNameForKey(locale, key, code, LocaleDisplayNameOptions::CapitalizationForListOrMenu);
     } catch (const Platform::AssertionFailure &) {
         return {}; // a code without a language name: the caller decides what that means
     }
+    if (!name.isNull() && name != code) {
+        cache.names.insert(cacheKey, name);
+    }
+    return name;
 }
 
 int compareForDisplay(const QString &a, const QString &b)
