@@ -1,6 +1,12 @@
 #include "TestEnvironment.h"
 
+#include "platform/FilePreferencesStore.h"
+#include "platform/Paths.h"
 #include "platform/WaveFile.h"
+
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
 
 #include <QJsonArray>
 #include <QJsonDocument>
@@ -159,6 +165,55 @@ private Q_SLOTS:
         QCOMPARE(first.value(QStringLiteral("title")).toString(), QStringLiteral("German (Germany)"));
         QCOMPARE(first.value(QStringLiteral("visibility")).toInt(), 2);
         QCOMPARE(first.value(QStringLiteral("tag")).toString(), QStringLiteral("SRCLANGID:de_DE"));
+    }
+
+    void downloadablesRemoveAndUpgrade()
+    {
+        // Jonas is installed compact: its premium quality is an upgrade. Orin 1.2 is older than the
+        // catalogue's.
+        Result r = cadenza({QStringLiteral("downloadables"), QStringLiteral("--json")});
+        QCOMPARE(r.exitCode, 0);
+        QHash<QString, int> status;
+        for (const auto &value : QJsonDocument::fromJson(r.out.toUtf8()).array()) {
+            status.insert(value.toObject().value(QStringLiteral("identifier")).toString(),
+                value.toObject().value(QStringLiteral("status")).toInt());
+        }
+        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.jonas.premium")), 1);
+        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.premium")), 2);
+        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.Orin")), 1);
+        QCOMPARE(status.value(QStringLiteral("de_DE")), 2);
+        QVERIFY(
+            !status.contains(QStringLiteral("com.vendra.speech.synthesis.voice.maren.premium"))); // installed
+
+        // A premium voice the user installed goes at once, and the log remembers it.
+        const QString bundle
+            = Cadenza::Platform::Paths::userVoicesFolder() + QStringLiteral("/JonasPremium.SpeechVoice");
+        QDir().mkpath(bundle);
+        QVERIFY(QFile::copy(QStringLiteral(CADENZA_SOURCE_DIR
+                                "/data/sample-repository/voices/JonasPremium.SpeechVoice/Info.plist"),
+            bundle + QStringLiteral("/Info.plist")));
+        r = cadenza(
+            {QStringLiteral("remove"), QStringLiteral("com.vendra.speech.synthesis.voice.jonas.premium")});
+        QVERIFY2(r.exitCode == 0, qPrintable(r.err));
+        QVERIFY(!QFileInfo::exists(bundle));
+        Cadenza::Platform::FilePreferencesStore preferences;
+        const QVariantMap log = preferences
+                                    .value(QStringLiteral("SpeechDataInstallationLog"),
+                                        QStringLiteral("com.vendra.speech.voice.prefs"))
+                                    .toMap();
+        QVERIFY(log.value(QStringLiteral("VOICEID:com.vendra.speech.synthesis.voice.jonas.premium"))
+                    .toMap()
+                    .contains(QStringLiteral("RemovalDate")));
+        r = cadenza(
+            {QStringLiteral("remove"), QStringLiteral("com.vendra.speech.synthesis.voice.maren.compact")});
+        QCOMPARE(r.exitCode, 1);
+        QVERIFY(r.err.contains(QStringLiteral("can be removed")));
+
+        // The user removed it: the background policy does not fetch it again.
+        r = cadenza(
+            {QStringLiteral("upgrade"), QStringLiteral("com.vendra.speech.synthesis.voice.jonas.compact")});
+        QCOMPARE(r.exitCode, 1);
+        QCOMPARE(r.out, QStringLiteral("no\n"));
     }
 
     void everyCommandHasHelp()
