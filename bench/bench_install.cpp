@@ -85,18 +85,8 @@ int main(int argc, char *argv[])
             {QStringLiteral("ByteSize"), archiveSize}, {QStringLiteral("Kind"), QStringLiteral("voice")},
             {QStringLiteral("BundleName"), QStringLiteral("Large.SpeechVoice")},
             {QStringLiteral("ObjectID"), QStringLiteral("bench.large")}}}};
-    const QString catalogue = world.filePath(QStringLiteral("catalogue.plist"));
-    QFile file(catalogue);
-    file.open(QIODevice::WriteOnly);
-    file.write(Platform::PropertyList::serialize(QVariantMap {{QStringLiteral("Packages"), packages}}));
-    file.close();
-
-    qputenv("QT_LOGGING_RULES", "quillond*=false");
     QProcess daemon;
-    daemon.setProcessChannelMode(QProcess::ForwardedErrorChannel);
-    daemon.start(QStringLiteral(QUILLOND_PATH),
-        {QStringLiteral("--catalogue"), catalogue, QStringLiteral("--repository"),
-            QUrl::fromLocalFile(repository).toString()});
+    startDaemon(daemon, world, packages, repository);
     CZSpeechInstallationManager manager;
     for (int i = 0; i < 100 && !manager._serverIsRunning(); ++i) {
         QThread::msleep(50);

@@ -103,19 +103,8 @@ int main(int argc, char *argv[])
                 {QStringLiteral("BundleName"), QStringLiteral("Bench%1.SpeechVoice").arg(i)},
                 {QStringLiteral("ObjectID"), QStringLiteral("bench.%1").arg(i)}});
     }
-    const QString catalogue = world.filePath(QStringLiteral("catalogue.plist"));
-    QFile file(catalogue);
-    file.open(QIODevice::WriteOnly);
-    file.write(Platform::PropertyList::serialize(QVariantMap {{QStringLiteral("Packages"), packages}}));
-    file.close();
-
-    qputenv("QT_LOGGING_RULES", "quillond*=false");
     QProcess daemon;
-    daemon.setProcessChannelMode(QProcess::ForwardedErrorChannel);
-    daemon.start(QStringLiteral(QUILLOND_PATH),
-        {QStringLiteral("--catalogue"), catalogue, QStringLiteral("--repository"),
-            QUrl::fromLocalFile(world.filePath(QStringLiteral("repository"))).toString()});
-    daemon.waitForStarted();
+    startDaemon(daemon, world, packages, world.filePath(QStringLiteral("repository")));
     CZSpeechInstallationManager manager;
     for (int i = 0; i < 100 && !manager._serverIsRunning(); ++i) {
         QThread::msleep(50);
