@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <chrono>
 #include <cstdio>
+#include <cstdlib>
 #include <functional>
 #include <string>
 #include <vector>
@@ -72,6 +73,25 @@ inline void printTable(const char *title, const std::vector<Row> &rows)
             row.floorName.c_str(), row.floorValue, ratio);
     }
     std::fflush(stdout);
+}
+
+/// Forty locales for generated voices.
+inline const char *const Locales[] = {"en_US", "en_GB", "de_DE", "fr_FR", "es_ES", "es_MX", "it_IT", "pt_BR",
+    "ja_JP", "hi_IN", "nl_NL", "sv_SE", "pl_PL", "ru_RU", "tr_TR", "ko_KR", "zh_CN", "ar_SA", "fi_FI",
+    "da_DK", "nb_NO", "cs_CZ", "el_GR", "he_IL", "hu_HU", "id_ID", "ms_MY", "ro_RO", "sk_SK", "th_TH",
+    "uk_UA", "vi_VN", "ca_ES", "hr_HR", "bg_BG", "sl_SI", "lt_LT", "lv_LV", "et_EE", "is_IS"};
+
+/// The sizes given on the command line, or 1,000 and 10,000.
+inline std::vector<int> countsFromArguments(int argc, char *argv[])
+{
+    std::vector<int> counts;
+    for (int i = 1; i < argc; ++i) {
+        counts.push_back(std::atoi(argv[i]));
+    }
+    if (counts.empty()) {
+        counts = {1000, 10000};
+    }
+    return counts;
 }
 
 } // namespace CadenzaBench

@@ -25,9 +25,6 @@ using namespace CadenzaBench;
 
 namespace {
 
-const char *Languages[] = {"en_US", "en_GB", "de_DE", "fr_FR", "es_ES", "es_MX", "it_IT", "pt_BR", "ja_JP",
-    "hi_IN", "nl_NL", "sv_SE", "pl_PL", "ru_RU", "tr_TR", "ko_KR", "zh_CN", "ar_SA", "fi_FI", "da_DK"};
-
 void generate(const QString &folder, int count)
 {
     QDir().mkpath(folder);
@@ -39,7 +36,7 @@ void generate(const QString &folder, int count)
         const QString identifier = base + quality;
         const QVariantMap attributes {{QStringLiteral("VoiceIdentifier"), identifier},
             {QStringLiteral("VoiceName"), QStringLiteral("Voice %1%2").arg(i / 3).arg(quality)},
-            {QStringLiteral("VoiceLocaleIdentifier"), QString::fromLatin1(Languages[(i / 3) % 20])},
+            {QStringLiteral("VoiceLocaleIdentifier"), QString::fromLatin1(Locales[(i / 3) % 20])},
             {QStringLiteral("VoiceGender"),
                 i % 2 ? QStringLiteral("VoiceGenderFemale") : QStringLiteral("VoiceGenderMale")},
             {QStringLiteral("VoiceCreator"), 1}, {QStringLiteral("VoiceID"), i}};
@@ -154,14 +151,7 @@ int main(int argc, char *argv[])
 {
     QCoreApplication app(argc, argv);
     const QString cadenza = QStringLiteral(CADENZA_CLI_PATH);
-    QList<int> counts;
-    for (int i = 1; i < argc; ++i) {
-        counts.append(std::atoi(argv[i]));
-    }
-    if (counts.isEmpty()) {
-        counts = {1000, 10000};
-    }
-    for (const int count : counts) {
+    for (const int count : countsFromArguments(argc, argv)) {
         measure(count, cadenza);
     }
     return 0;

@@ -19,11 +19,6 @@ using namespace CadenzaBench;
 
 namespace {
 
-const char *Locales[] = {"en_US", "en_GB", "de_DE", "fr_FR", "es_ES", "es_MX", "it_IT", "pt_BR", "ja_JP",
-    "hi_IN", "nl_NL", "sv_SE", "pl_PL", "ru_RU", "tr_TR", "ko_KR", "zh_CN", "ar_SA", "fi_FI", "da_DK",
-    "nb_NO", "cs_CZ", "el_GR", "he_IL", "hu_HU", "id_ID", "ms_MY", "ro_RO", "sk_SK", "th_TH", "uk_UA",
-    "vi_VN", "ca_ES", "hr_HR", "bg_BG", "sl_SI", "lt_LT", "lv_LV", "et_EE", "is_IS"};
-
 void measure(int count)
 {
     auto speech = std::make_shared<Platform::FakeSpeechSynthesisService>();
@@ -99,14 +94,7 @@ int main(int argc, char *argv[])
     Platform::Services::setUserLocale(std::make_shared<Platform::FakeUserLocaleService>());
     Platform::Services::setPreferences(std::make_shared<Platform::MemoryPreferencesStore>());
     Platform::Services::setNotifications(std::make_shared<Platform::InProcessNotificationCenter>());
-    QList<int> counts;
-    for (int i = 1; i < argc; ++i) {
-        counts.append(std::atoi(argv[i]));
-    }
-    if (counts.isEmpty()) {
-        counts = {1000, 10000};
-    }
-    for (const int count : counts) {
+    for (const int count : countsFromArguments(argc, argv)) {
         measure(count);
     }
     return 0;

@@ -3,6 +3,7 @@
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
 #include "platform/SpeechSynthesisService.h"
+#include "speech-items/CZSpeechItem_p.h"
 
 namespace Cadenza {
 
@@ -12,19 +13,6 @@ using Platform::SpeechSynthesisService;
 namespace {
 const QString VoicePreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
 
-bool isStoredNumber(const QVariant &v)
-{
-    switch (v.typeId()) {
-    case QMetaType::LongLong:
-    case QMetaType::Int:
-    case QMetaType::ULongLong:
-    case QMetaType::Double:
-    case QMetaType::Bool:
-        return true;
-    default:
-        return false;
-    }
-}
 } // namespace
 
 QStringList SpeechSynthesizer::allVoices()
@@ -45,9 +33,9 @@ QString SpeechSynthesizer::defaultVoiceFromAllVoices()
     const QVariant creator
         = preferences.value(QStringLiteral("SelectedVoiceCreator"), VoicePreferencesDomain);
     SpeechSynthesisService &service = Services::speechSynthesis();
-    if (isStoredNumber(creator)) {
+    if (SpeechItemPrivate::isNumber(creator)) {
         const QVariant id = preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain);
-        const qint32 idValue = isStoredNumber(id) ? qint32(id.toLongLong()) : 0;
+        const qint32 idValue = SpeechItemPrivate::isNumber(id) ? qint32(id.toLongLong()) : 0;
         const QString identifier = service.voiceIdentifierForSpec(qint32(creator.toLongLong()), idValue);
         if (!identifier.isEmpty()) {
             return identifier;
