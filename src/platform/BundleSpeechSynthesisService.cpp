@@ -183,6 +183,7 @@ quint64 BundleSpeechSynthesisService::startSpeaking(const SpeechRequest &request
     stopSpeaking();
     const quint64 requestId = m_nextRequest++;
     m_currentRequest = requestId;
+    m_renderedVolume = request.volume;
     QPointer<BundleSpeechSynthesisService> self(this);
     QThreadPool::globalInstance()->start([self, requestId, voice = *voice, request] {
         QString error;
@@ -262,6 +263,16 @@ void BundleSpeechSynthesisService::finishCurrent(bool completed)
     if (finished) {
         Q_EMIT speakingFinished(finished, completed);
     }
+}
+
+void BundleSpeechSynthesisService::setSpeakingVolume(double volume)
+{
+    if (!m_sink) {
+        return;
+    }
+    // The samples already carry the volume they were rendered at; the sink can only attenuate.
+    const double scale = m_renderedVolume > 0 ? volume / m_renderedVolume : 0.0;
+    m_sink->setVolume(qBound(0.0, scale, 1.0));
 }
 
 void BundleSpeechSynthesisService::stopSpeaking()

@@ -34,6 +34,7 @@ public:
     quint64 startSpeaking(const SpeechRequest &request) override;
     void stopSpeaking() override;
     bool isSpeaking() const override { return m_currentRequest != 0; }
+    void setSpeakingVolume(double volume) override;
     bool renderToFile(const SpeechRequest &request, const QString &wavPath, QString *error) override;
 
     /// Reads one bundle; nothing, with one log line naming it, when its Info.plist is unreadable.
@@ -62,6 +63,7 @@ private:
     quint64 m_currentRequest = 0;
     QPointer<QAudioSink> m_sink;
     QBuffer *m_buffer = nullptr;
+    double m_renderedVolume = 1.0; ///< the loudness the playing samples were rendered at
 };
 
 } // namespace Cadenza::Platform

@@ -23,6 +23,7 @@ public:
     quint64 startSpeaking(const SpeechRequest &request) override;
     void stopSpeaking() override;
     bool isSpeaking() const override { return !m_pending.isEmpty(); }
+    void setSpeakingVolume(double volume) override { m_speakingVolume = volume; }
     bool renderToFile(const SpeechRequest &request, const QString &wavPath, QString *error) override;
 
     /// Adds or replaces a voice; the list stays ordered by identifier.
@@ -37,6 +38,8 @@ public:
     void finishHeldRequests(bool completed);
     /// Every request made so far, oldest first.
     [[nodiscard]] QList<SpeechRequest> requests() const { return m_requests; }
+    /// The last volume given to the speech in progress; negative when never given.
+    [[nodiscard]] double speakingVolume() const { return m_speakingVolume; }
 
 private:
     QList<VoiceDescription> m_voices;
@@ -47,6 +50,7 @@ private:
     quint64 m_nextRequest = 1;
     bool m_speakingFails = false;
     bool m_holdsSpeaking = false;
+    double m_speakingVolume = -1;
 };
 
 } // namespace Cadenza::Platform

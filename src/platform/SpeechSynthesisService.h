@@ -59,6 +59,8 @@ public:
     /// Stops every request; each ends with speakingFinished(id, false).
     virtual void stopSpeaking() = 0;
     [[nodiscard]] virtual bool isSpeaking() const = 0;
+    /// Changes the loudness (0..1) of the speech now playing, without restarting it.
+    virtual void setSpeakingVolume(double volume) = 0;
     /// Renders @p request into a 16-bit mono WAV file; blocks until done.
     [[nodiscard]] virtual bool renderToFile(
         const SpeechRequest &request, const QString &wavPath, QString *error)

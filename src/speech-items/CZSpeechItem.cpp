@@ -67,6 +67,7 @@ bool isNumber(const QVariant &value)
     case QMetaType::Int:
     case QMetaType::UInt:
     case QMetaType::Double:
+    case QMetaType::Float:
     case QMetaType::Bool:
         return true;
     default:
