@@ -179,5 +179,73 @@
         <source>%1 (%2)</source>
         <translation>%1 (%2)</translation>
     </message>
+    <message id="VoiceSettingsWindowTitle">
+        <source>Voice Settings</source>
+        <translation>Stimmeinstellungen</translation>
+    </message>
+    <message id="VoiceSettingsVoiceLabel">
+        <source>Voice:</source>
+        <translation>Stimme:</translation>
+    </message>
+    <message id="VoiceSettingsCustomRateCheckbox">
+        <source>Use custom speaking rate</source>
+        <translation>Eigene Sprechgeschwindigkeit verwenden</translation>
+    </message>
+    <message id="VoiceSettingsCustomVolumeCheckbox">
+        <source>Use custom volume</source>
+        <translation>Eigene Lautstärke verwenden</translation>
+    </message>
+    <message id="VoiceSettingsSlowLabel">
+        <source>Slow</source>
+        <translation>Langsam</translation>
+    </message>
+    <message id="VoiceSettingsFastLabel">
+        <source>Fast</source>
+        <translation>Schnell</translation>
+    </message>
+    <message id="VoiceSettingsRateSlider">
+        <source>Speaking rate</source>
+        <translation>Sprechgeschwindigkeit</translation>
+    </message>
+    <message id="VoiceSettingsVolumeSlider">
+        <source>Volume</source>
+        <translation>Lautstärke</translation>
+    </message>
+    <message id="VoiceSettingsQuietIcon">
+        <source>Quiet</source>
+        <translation>Leise</translation>
+    </message>
+    <message id="VoiceSettingsLoudIcon">
+        <source>Loud</source>
+        <translation>Laut</translation>
+    </message>
+    <message id="VoiceCustomizationTitle">
+        <source>Customize Voices</source>
+        <translation>Stimmen anpassen</translation>
+    </message>
+    <message id="VoiceCustomizationExplanation">
+        <source>Tick the voices to show in voice menus and the voices to download.</source>
+        <translation>Markieren Sie die Stimmen, die in Stimmenmenüs erscheinen sollen, und die Stimmen, die geladen werden sollen.</translation>
+    </message>
+    <message id="VoiceCustomizationSearchPlaceholder">
+        <source>Search</source>
+        <translation>Suchen</translation>
+    </message>
+    <message id="VoiceCustomizationNoResults">
+        <source>No Results</source>
+        <translation>Keine Treffer</translation>
+    </message>
+    <message id="VoiceCustomizationTable">
+        <source>Voices</source>
+        <translation>Stimmen</translation>
+    </message>
+    <message id="DownloadVariantCompactItem">
+        <source>Compact</source>
+        <translation>Kompakt</translation>
+    </message>
+    <message id="DownloadVariantFullSizeItem">
+        <source>Full Size</source>
+        <translation>Volle Größe</translation>
+    </message>
 </context>
 </TS>

@@ -179,5 +179,73 @@
         <source>%1 (%2)</source>
         <translation>%1 (%2)</translation>
     </message>
+    <message id="VoiceSettingsWindowTitle">
+        <source>Voice Settings</source>
+        <translation>Voice Settings</translation>
+    </message>
+    <message id="VoiceSettingsVoiceLabel">
+        <source>Voice:</source>
+        <translation>Voice:</translation>
+    </message>
+    <message id="VoiceSettingsCustomRateCheckbox">
+        <source>Use custom speaking rate</source>
+        <translation>Use custom speaking rate</translation>
+    </message>
+    <message id="VoiceSettingsCustomVolumeCheckbox">
+        <source>Use custom volume</source>
+        <translation>Use custom volume</translation>
+    </message>
+    <message id="VoiceSettingsSlowLabel">
+        <source>Slow</source>
+        <translation>Slow</translation>
+    </message>
+    <message id="VoiceSettingsFastLabel">
+        <source>Fast</source>
+        <translation>Fast</translation>
+    </message>
+    <message id="VoiceSettingsRateSlider">
+        <source>Speaking rate</source>
+        <translation>Speaking rate</translation>
+    </message>
+    <message id="VoiceSettingsVolumeSlider">
+        <source>Volume</source>
+        <translation>Volume</translation>
+    </message>
+    <message id="VoiceSettingsQuietIcon">
+        <source>Quiet</source>
+        <translation>Quiet</translation>
+    </message>
+    <message id="VoiceSettingsLoudIcon">
+        <source>Loud</source>
+        <translation>Loud</translation>
+    </message>
+    <message id="VoiceCustomizationTitle">
+        <source>Customize Voices</source>
+        <translation>Customize Voices</translation>
+    </message>
+    <message id="VoiceCustomizationExplanation">
+        <source>Tick the voices to show in voice menus and the voices to download.</source>
+        <translation>Tick the voices to show in voice menus and the voices to download.</translation>
+    </message>
+    <message id="VoiceCustomizationSearchPlaceholder">
+        <source>Search</source>
+        <translation>Search</translation>
+    </message>
+    <message id="VoiceCustomizationNoResults">
+        <source>No Results</source>
+        <translation>No Results</translation>
+    </message>
+    <message id="VoiceCustomizationTable">
+        <source>Voices</source>
+        <translation>Voices</translation>
+    </message>
+    <message id="DownloadVariantCompactItem">
+        <source>Compact</source>
+        <translation>Compact</translation>
+    </message>
+    <message id="DownloadVariantFullSizeItem">
+        <source>Full Size</source>
+        <translation>Full Size</translation>
+    </message>
 </context>
 </TS>

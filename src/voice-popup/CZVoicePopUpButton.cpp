@@ -54,7 +54,7 @@ struct SharedState
     QStringList excluded;
     QHash<QString, quint64> required;
     QString fallback;
-    std::unique_ptr<QFileSystemWatcher> watcher;
+    QPointer<QFileSystemWatcher> watcher; // owned by the application: gone before static destruction
     QPointer<CZVoicePopUpButton> firstPopUp;
     QMetaObject::Connection preferenceNotifications;
     bool registered = false;
@@ -88,14 +88,14 @@ void registerProcessWideObservers()
                 CZVoicePopUpButton::_startDelayedForceAllVoicePopupsToUpdate();
             }
         });
-    state.watcher = std::make_unique<QFileSystemWatcher>();
+    state.watcher = new QFileSystemWatcher(qApp);
     for (const QString &folder : {Platform::Paths::systemVoicesFolder(), Platform::Paths::localVoicesFolder(),
              Platform::Paths::userVoicesFolder()}) {
         if (QDir(folder).exists()) {
             (void)state.watcher->addPath(folder);
         }
     }
-    QObject::connect(state.watcher.get(), &QFileSystemWatcher::directoryChanged, qApp, [] {
+    QObject::connect(state.watcher.data(), &QFileSystemWatcher::directoryChanged, qApp, [] {
         // Installers write a bundle in several steps; look once they are likely done.
         QTimer::singleShot(2000, qApp, [] {
             if (CZVoicePopUpButton *first = shared().firstPopUp) {
@@ -630,7 +630,7 @@ void resetProcessState()
 {
     SharedState &state = shared();
     QObject::disconnect(state.preferenceNotifications);
-    state.watcher.reset();
+    delete state.watcher.data();
     state.popUps.clear();
     state.menu.clear();
     state.rows.clear();

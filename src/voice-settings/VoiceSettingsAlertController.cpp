@@ -1,0 +1,20 @@
+#include "VoiceSettingsAlertController.h"
+
+#include "ui_VoiceSettingsWindow.h"
+
+namespace Cadenza {
+
+namespace {
+QDialog *makeWindowFromInterfaceFile()
+{
+    auto *window = new QDialog;
+    Ui::VoiceSettingsWindow().setupUi(window);
+    return window;
+}
+} // namespace
+
+VoiceSettingsAlertController::VoiceSettingsAlertController(QObject *parent)
+    : VoiceSettingsWindowController(&makeWindowFromInterfaceFile, parent)
+{ }
+
+} // namespace Cadenza
