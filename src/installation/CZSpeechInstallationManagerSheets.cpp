@@ -1,6 +1,8 @@
 #include "CZSpeechInstallationManagerSheets.h"
 
-#include "platform/Logging.h"
+#include "customize-voices/CustomizeVoicesWindowController.h"
+
+#include <QDialog>
 
 namespace Cadenza {
 
@@ -12,6 +14,17 @@ CZSpeechInstallationManagerSheets::VoiceSheetPresenter &presenter()
 }
 } // namespace
 
+CustomizeVoicesWindowController *CZSpeechInstallationManagerSheets::voiceSelectionWindowController()
+{
+    // Made once and kept for the life of the process; never deleted after the application object.
+    static CustomizeVoicesWindowController *controller = [] {
+        auto *made = new CustomizeVoicesWindowController;
+        made->window()->ensurePolished();
+        return made;
+    }();
+    return controller;
+}
+
 void CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(
     QWidget *window, bool showIndividualVoiceQualities)
 {
@@ -19,7 +32,7 @@ void CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(
         presenter()(window, showIndividualVoiceQualities);
         return;
     }
-    qCWarning(Platform::lcInstallation, "The customise voices sheet is not available");
+    voiceSelectionWindowController()->showSheetForWindow(window, showIndividualVoiceQualities);
 }
 
 void CZSpeechInstallationManagerSheets::setVoiceSheetPresenter(VoiceSheetPresenter present)
