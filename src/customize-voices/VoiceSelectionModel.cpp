@@ -56,8 +56,6 @@ QVariant VoiceSelectionModel::data(const QModelIndex &index, int role) const
             return bold;
         }
         return {};
-    case Qt::CheckStateRole:
-        return row->isGroupRow() ? QVariant() : QVariant(row->isSelected() ? Qt::Checked : Qt::Unchecked);
     case GroupRowRole:
         return row->isGroupRow();
     case VoiceIdentifierRole:

@@ -18,6 +18,8 @@ VoiceTableCellView::VoiceTableCellView(QWidget *parent)
     , m_downloadVariantPopUpButton(new QComboBox(this))
 {
     setObjectName(QStringLiteral("VoiceRow"));
+    // A row view lies over the table's own drawing of the row; it must hide it.
+    setAutoFillBackground(true);
     m_activeCheckbox->setObjectName(QStringLiteral("activeCheckbox"));
     m_textField->setObjectName(QStringLiteral("textField"));
     m_downloadMessageTextField->setObjectName(QStringLiteral("downloadMessageTextField"));

@@ -1,0 +1,84 @@
+// cadenza-settings: a small speech settings application hosting Cadenza's controls.
+#include "SettingsWindow.h"
+
+#include "customize-voices/CustomizeVoicesWindowController.h"
+#include "installation/CZSpeechInstallationManagerSheets.h"
+#include "voice-settings/VoiceSettingsAlertController.h"
+#include "voice-settings/VoiceSettingsSheetController.h"
+
+#include <QApplication>
+#include <QCommandLineParser>
+#include <QDialog>
+#include <QDir>
+#include <QTimer>
+
+#include <cstdio>
+
+namespace {
+// Renders the windows the way they look now and writes them as PNG files into @p folder.
+int writeScreenshots(SettingsWindow &window, const QString &folder)
+{
+    if (!QDir().mkpath(folder)) {
+        std::fprintf(stderr, "cadenza-settings: cannot create the folder %s\n", qPrintable(folder));
+        return 1;
+    }
+    int failures = 0;
+    auto save = [&](QWidget *widget, const char *name) {
+        QCoreApplication::processEvents();
+        const QString path = QDir(folder).filePath(QLatin1String(name));
+        if (!widget->grab().save(path)) {
+            std::fprintf(stderr, "cadenza-settings: cannot write %s\n", qPrintable(path));
+            ++failures;
+            return;
+        }
+        std::printf("%s\n", qPrintable(path));
+    };
+    window.resize(520, 240);
+    window.show();
+    save(&window, "main-window.png");
+
+    window.openVoiceSettingsWindow();
+    QDialog *dialog = Cadenza::VoiceSettingsWindowController::defaultVoiceSettingsAlertController()->window();
+    save(dialog, "voice-settings-window.png");
+    Cadenza::VoiceSettingsWindowController::defaultVoiceSettingsAlertController()->cancelVoiceSettings();
+
+    window.openVoiceSettingsSheet();
+    dialog = Cadenza::VoiceSettingsWindowController::defaultVoiceSettingsSheetController()->window();
+    save(dialog, "voice-settings-sheet.png");
+    Cadenza::VoiceSettingsWindowController::defaultVoiceSettingsSheetController()->cancelVoiceSettings();
+
+    Cadenza::CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(&window, false);
+    Cadenza::CustomizeVoicesWindowController *sheet
+        = Cadenza::CZSpeechInstallationManagerSheets::voiceSelectionWindowController();
+    sheet->window()->resize(680, 520);
+    QTimer::singleShot(100, [] {});
+    QCoreApplication::processEvents();
+    save(sheet->window(), "customize-voices.png");
+    sheet->cancelVoiceSelection();
+    return failures == 0 ? 0 : 1;
+}
+} // namespace
+
+int main(int argc, char *argv[])
+{
+    QApplication app(argc, argv);
+    QApplication::setApplicationName(QStringLiteral("cadenza-settings"));
+    QApplication::setDesktopFileName(QStringLiteral("org.cadenza.Settings"));
+
+    QCommandLineParser parser;
+    parser.setApplicationDescription(QStringLiteral("Speech settings: the system voice, the voices to show "
+                                                    "and download, and the voice settings dialog."));
+    parser.addHelpOption();
+    const QCommandLineOption screenshots(QStringLiteral("screenshots"),
+        QStringLiteral("Write screenshots of every window into <folder> and exit."),
+        QStringLiteral("folder"));
+    parser.addOption(screenshots);
+    parser.process(app);
+
+    SettingsWindow window;
+    if (parser.isSet(screenshots)) {
+        return writeScreenshots(window, parser.value(screenshots));
+    }
+    window.show();
+    return app.exec();
+}
