@@ -7,6 +7,8 @@
 #include <QTcpSocket>
 #include <QTimer>
 
+#include <algorithm>
+
 namespace Cadenza::Testing {
 
 TestHttpServer::TestHttpServer(QString root, QObject *parent)
@@ -77,20 +79,22 @@ void TestHttpServer::serve(QTcpSocket *socket)
     socket->write(header);
 
     const qint64 dropAfter = std::exchange(m_dropAfter, -1);
-    constexpr qint64 Chunk = 64 * 1024;
-    const int interval = m_bytesPerSecond > 0 ? int(qMax<qint64>(1, Chunk * 1000 / m_bytesPerSecond)) : 0;
+    // Throttled: a tenth of a second's bytes every tenth of a second, so small files trickle too.
+    const qint64 chunk
+        = m_bytesPerSecond > 0 ? std::clamp<qint64>(m_bytesPerSecond / 10, 1, 64 * 1024) : 64 * 1024;
+    const int interval = m_bytesPerSecond > 0 ? 100 : 0;
     auto *timer = new QTimer(socket);
     timer->setInterval(interval);
     auto sent = std::make_shared<qint64>(0);
     QPointer<QTcpSocket> guard(socket);
-    connect(timer, &QTimer::timeout, socket, [guard, timer, file, sent, dropAfter] {
+    connect(timer, &QTimer::timeout, socket, [guard, timer, file, sent, dropAfter, chunk] {
         if (!guard) {
             return;
         }
-        if (guard->bytesToWrite() > 4 * Chunk) {
+        if (guard->bytesToWrite() > 4 * chunk) {
             return; // let the client catch up
         }
-        qint64 want = Chunk;
+        qint64 want = chunk;
         if (dropAfter >= 0) {
             want = qMin(want, dropAfter - *sent);
         }

@@ -1,0 +1,120 @@
+// From the voice pop-up to an installed voice, with the real daemon on the sample repository.
+#include "TestEnvironment.h"
+#include "TestHttpServer.h"
+
+#include "customize-voices/CZVoiceRowCheckboxButton.h"
+#include "customize-voices/CustomizeVoicesWindowController.h"
+#include "customize-voices/VoiceTableCellView.h"
+#include "installation/CZSpeechInstallationManagerSheets.h"
+#include "installation/InstallerProtocol.h"
+#include "platform/Paths.h"
+#include "platform/Services.h"
+#include "platform/UnixMessagePortService.h"
+#include "voice-popup/CZVoicePopUpButton.h"
+
+#include <QDialog>
+#include <QDir>
+#include <QLabel>
+#include <QProcess>
+#include <QProgressBar>
+#include <QPushButton>
+#include <QTableView>
+#include <QTest>
+
+#include <signal.h>
+
+using namespace Cadenza;
+using Cadenza::Testing::TestEnvironment;
+
+namespace {
+const QString Femke = QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact");
+} // namespace
+
+class VoiceInstallationTest : public QObject
+{
+    Q_OBJECT
+private Q_SLOTS:
+    void initTestCase()
+    {
+        m_environment = std::make_unique<TestEnvironment>();
+        m_environment->installSampleVoices();
+        // A slow server, so the download lasts long enough to be watched.
+        m_http = std::make_unique<Testing::TestHttpServer>(QStringLiteral(CADENZA_SAMPLE_REPOSITORY));
+        QVERIFY(m_http->listen());
+        m_http->setBytesPerSecond(120);
+        m_daemon.setProcessChannelMode(QProcess::ForwardedErrorChannel);
+        m_daemon.start(
+            QStringLiteral(QUILLOND_PATH), {QStringLiteral("--repository"), m_http->baseUrl().toString()});
+        QVERIFY(m_daemon.waitForStarted(5000));
+        Platform::UnixMessagePortService ports;
+        QVERIFY(QTest::qWaitFor(
+            [&] { return ports.createRemotePort(InstallerProtocol::LivenessPortName) != nullptr; }, 5000));
+    }
+    void cleanupTestCase()
+    {
+        m_daemon.terminate();
+        m_daemon.waitForFinished(5000);
+        m_environment.reset();
+    }
+
+    void tickDownloadAndChooseTheNewVoice()
+    {
+        QWidget window;
+        auto *popUp = new CZVoicePopUpButton(&window);
+        auto *status = new QLabel(&window);
+        auto *spinner = new QProgressBar(&window);
+        popUp->setDownloadStatusTextField(status);
+        popUp->setDownloadStatusProgressIndicator(spinner);
+        window.resize(600, 400);
+        window.show();
+        popUp->buildPopUpButtonWithSelectVoiceIdentifier(QString());
+        QCOMPARE(popUp->findText(QStringLiteral("Femke")), -1);
+
+        // The customise item opens the sheet.
+        popUp->setCurrentIndex(popUp->count() - 1);
+        QVERIFY(!popUp->sendAction());
+        CustomizeVoicesWindowController *sheet
+            = CZSpeechInstallationManagerSheets::voiceSelectionWindowController();
+        QVERIFY(sheet->window()->isVisible());
+        int femkeRow = -1;
+        const QList<VoiceTableRowPtr> rows = sheet->currentlyDisplayedVoiceRows();
+        for (int row = 0; row < rows.size(); ++row) {
+            if (rows.at(row)->voiceObject() && rows.at(row)->voiceObject()->identifier() == Femke) {
+                femkeRow = row;
+            }
+        }
+        QVERIFY(femkeRow >= 0);
+        sheet->voiceSelectionTableView()->scrollTo(
+            sheet->voiceSelectionTableView()->model()->index(femkeRow, 0));
+        QTRY_VERIFY(sheet->existingViewForRow(femkeRow));
+        sheet->existingViewForRow(femkeRow)->activeCheckbox()->click();
+        sheet->window()->findChild<QPushButton *>(QStringLiteral("okButton"))->click();
+        QVERIFY(!sheet->window()->isVisible());
+
+        // The upgrade of Orin was ticked in advance and goes first; then Femke. While she downloads,
+        // the pop-up's status line says so, with the time left.
+        QTRY_VERIFY_WITH_TIMEOUT(status->text().startsWith(QStringLiteral("Downloading Femke")), 30000);
+        QTRY_VERIFY_WITH_TIMEOUT(status->text().contains(QStringLiteral("remaining")), 10000);
+        QVERIFY(spinner->isVisible());
+        qInfo("status line: %s", qPrintable(status->text()));
+
+        // Installed from the repository; the menu lists the new voice and it can be chosen.
+        QTRY_VERIFY_WITH_TIMEOUT(popUp->findText(QStringLiteral("Femke")) >= 0, 30000);
+        QVERIFY(
+            QDir(Platform::Paths::userVoicesFolder() + QStringLiteral("/FemkeCompact.SpeechVoice")).exists());
+        QTRY_VERIFY_WITH_TIMEOUT(status->text().isEmpty(), 5000);
+        QVERIFY(!spinner->isVisible());
+        popUp->setCurrentIndex(popUp->findText(QStringLiteral("Femke")));
+        QVERIFY(popUp->sendAction());
+        QCOMPARE(
+            popUp->selectedVoiceAttributes()->value(QStringLiteral("VoiceIdentifier")).toString(), Femke);
+    }
+
+private:
+    std::unique_ptr<TestEnvironment> m_environment;
+    std::unique_ptr<Testing::TestHttpServer> m_http;
+    QProcess m_daemon;
+};
+
+QTEST_MAIN(VoiceInstallationTest)
+#include "tst_voiceinstallation.moc"
