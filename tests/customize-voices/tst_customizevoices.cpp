@@ -19,6 +19,7 @@
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-popup/CZVoicePopUpButton_p.h"
 #include "voices/CZVoiceObject.h"
+#include "voices/DownloadableVoice.h"
 #include "voices/SpeechSynthesizer.h"
 
 #include <QAbstractItemModelTester>
@@ -314,11 +315,18 @@ private Q_SLOTS:
         QTableView *table = m_controller->voiceSelectionTableView();
         QPushButton *play = button("playStopButton");
         QVERIFY(!play->isEnabled());
-        table->selectRow(rowIndex(QStringLiteral("Femke")));
-        QVERIFY(!play->isEnabled()); // no recorded sample for Femke
+        table->selectRow(rowIndex(QStringLiteral("Iris")));
+        QVERIFY(!play->isEnabled()); // no recorded sample for Iris
         m_controller->startStopPlayingSelection();
         QCOMPARE(Alert::beepCount(), 1);
         QCOMPARE(play->text(), QStringLiteral("Play"));
+
+        // Voices of the sample repository come with a recorded sample.
+        const DownloadableVoicePtr recorded
+            = DownloadableVoice::initWithVoiceID(P + QStringLiteral("femke.compact"),
+                downloadable(QStringLiteral("Femke Compact"), QStringLiteral("nl_NL")));
+        QVERIFY(m_controller->_isSampleAvailableForVoiceObject(recorded));
+        QVERIFY(!m_controller->_isSampleAvailableForVoiceObject(nullptr));
 
         table->selectRow(rowIndex(QStringLiteral("Maren")));
         QVERIFY(play->isEnabled());
