@@ -2,6 +2,7 @@
 
 #include "customize-voices/CZVoiceRowCheckboxButton.h"
 #include "customize-voices/CZVoiceRowTextView.h"
+#include "customize-voices/VoiceRowDelegate.h"
 #include "customize-voices/VoiceSelectionModel.h"
 #include "customize-voices/VoiceTableCellView.h"
 #include "installation/CZSpeechInstallationManager.h"
@@ -83,6 +84,17 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
     m_voiceSelectionTableView->setAccessibleName(texts().text(QStringLiteral("VoiceCustomizationTable")));
 
     m_voiceSelectionTableView->setModel(m_model);
+    m_voiceSelectionTableView->setItemDelegate(new VoiceRowDelegate(
+        [this](QWidget *view) {
+            // A row view the table let go of waits, hidden, for the next row that needs one.
+            if (auto *rowView = qobject_cast<VoiceTableCellView *>(view)) {
+                rowView->hide();
+                m_spareRowViews.append(rowView);
+            } else {
+                view->deleteLater();
+            }
+        },
+        this));
     // One height for all rows: the view can then place 10,000 rows without measuring them.
     m_voiceSelectionTableView->verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
     m_voiceSelectionTableView->verticalHeader()->setDefaultSectionSize(
@@ -115,7 +127,11 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
 CustomizeVoicesWindowController::~CustomizeVoicesWindowController()
 {
     _stopAndResetAllVoicePlaying();
+    m_voiceSelectionTableView->setItemDelegate(nullptr);
     delete m_window;
+    for (const QPointer<VoiceTableCellView> &spare : std::as_const(m_spareRowViews)) {
+        delete spare.data();
+    }
 }
 
 bool CustomizeVoicesWindowController::eventFilter(QObject *watched, QEvent *event)
@@ -379,15 +395,21 @@ VoiceTableCellView *CustomizeVoicesWindowController::viewForRow(int row)
     if (entry->isGroupRow()) {
         return nullptr; // headings are drawn by the table itself
     }
-    auto *view = new VoiceTableCellView;
+    VoiceTableCellView *view = nullptr;
+    while (!view && !m_spareRowViews.isEmpty()) {
+        view = m_spareRowViews.takeLast();
+    }
+    if (!view) {
+        view = new VoiceTableCellView;
+        connect(view->activeCheckbox(), &QAbstractButton::clicked, this,
+            [this, box = view->activeCheckbox()] { _propagateCheckboxSelection(box); });
+        connect(view->downloadCheckbox(), &QAbstractButton::clicked, this,
+            [this, box = view->downloadCheckbox()] { _propagateDownloadCheckboxSelection(box); });
+        connect(view->downloadVariantPopUpButton(), &QComboBox::activated, this,
+            [this, sizes = view->downloadVariantPopUpButton()](
+                int index) { _propagateDownloadVariantSelection(sizes, index); });
+    }
     fillRowView(view, entry);
-    connect(view->activeCheckbox(), &QAbstractButton::clicked, this,
-        [this, box = view->activeCheckbox()] { _propagateCheckboxSelection(box); });
-    connect(view->downloadCheckbox(), &QAbstractButton::clicked, this,
-        [this, box = view->downloadCheckbox()] { _propagateDownloadCheckboxSelection(box); });
-    connect(view->downloadVariantPopUpButton(), &QComboBox::activated, this,
-        [this, sizes = view->downloadVariantPopUpButton()](
-            int index) { _propagateDownloadVariantSelection(sizes, index); });
     return view;
 }
 

@@ -137,6 +137,7 @@ private:
     bool m_popUpWasInitiallyBeenBuilt = false;
     mutable QRecursiveMutex m_lock;
     QHash<int, QPointer<VoiceTableCellView>> m_rowViews;
+    QList<QPointer<VoiceTableCellView>> m_spareRowViews;
     QMetaObject::Connection m_installationObservation;
 };
 
