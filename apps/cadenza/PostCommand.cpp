@@ -13,9 +13,11 @@ using namespace Cadenza::Platform;
 int PostCommand::run(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(
-        QStringLiteral("Posts the distributed notification NAME to every process of this session, such as "
-                       "com.vendra.speech.DefaultVoiceChangedNotification."));
+    parser.setApplicationDescription(QStringLiteral(
+        "Posts the distributed notification NAME to every process of this session, such as "
+        "com.vendra.speech.DefaultVoiceChangedNotification, or the dictation engine's "
+        "DictationIMNotificationRecognizerDidPreHeat and DictationIMNotificationWillStartListening. "
+        "'cadenza notify' is the same command."));
     const QCommandLineOption object(
         QStringLiteral("object"), QStringLiteral("The notification's object."), QStringLiteral("TEXT"));
     const QCommandLineOption info(QStringLiteral("info"),

@@ -16,22 +16,24 @@ namespace {
 
 void printUsage(FILE *to)
 {
-    std::fputs("Usage: cadenza COMMAND [OPTIONS]\n"
-               "\n"
-               "Commands:\n"
-               "  voices   list the installed voices\n"
-               "  say      speak a text, or write it to a WAV file\n"
-               "  languages list the installed and downloadable recognition languages\n"
-               "  post     post a notification to every process of the session\n"
-               "  status   show what the installer daemon is installing\n"
-               "  install  install a voice or recognition language by its tag\n"
-               "  cancel   cancel every installation\n"
-               "  downloadables list what can be downloaded or upgraded\n"
-               "  remove   remove a downloaded voice or recognition language\n"
-               "  upgrade  fetch the best quality of a voice in the background, when allowed\n"
-               "  power    say whether this computer runs on mains power\n"
-               "\n"
-               "Run 'cadenza COMMAND --help' for the options of a command.\n",
+    std::fputs(
+        "Usage: cadenza COMMAND [OPTIONS]\n"
+        "\n"
+        "Commands:\n"
+        "  voices   list the installed voices\n"
+        "  say      speak a text, or write it to a WAV file\n"
+        "  languages list the installed and downloadable recognition languages\n"
+        "  post     post a notification to every process of the session\n"
+        "  notify   the same as post, e.g. cadenza notify DictationIMNotificationRecognizerDidPreHeat\n"
+        "  status   show what the installer daemon is installing\n"
+        "  install  install a voice or recognition language by its tag\n"
+        "  cancel   cancel every installation\n"
+        "  downloadables list what can be downloaded or upgraded\n"
+        "  remove   remove a downloaded voice or recognition language\n"
+        "  upgrade  fetch the best quality of a voice in the background, when allowed\n"
+        "  power    say whether this computer runs on mains power\n"
+        "\n"
+        "Run 'cadenza COMMAND --help' for the options of a command.\n",
         to);
 }
 
@@ -63,7 +65,7 @@ int main(int argc, char *argv[])
     if (command == u"languages") {
         return LanguagesCommand::run(arguments);
     }
-    if (command == u"post") {
+    if (command == u"post" || command == u"notify") {
         return PostCommand::run(arguments);
     }
     if (command == u"status") {

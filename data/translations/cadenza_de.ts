@@ -247,5 +247,17 @@
         <source>Full Size</source>
         <translation>Volle Größe</translation>
     </message>
+    <message id="SRLanguageCustomizationTitle">
+        <source>Customize Dictation Languages</source>
+        <translation>Diktiersprachen anpassen</translation>
+    </message>
+    <message id="SRLanguageCustomizationExplanation">
+        <source>Tick the dictation languages to list and the languages to download.</source>
+        <translation>Markieren Sie die Diktiersprachen, die aufgeführt werden sollen, und die Sprachen, die geladen werden sollen.</translation>
+    </message>
+    <message id="SRLanguageCustomizationTable">
+        <source>Dictation languages</source>
+        <translation>Diktiersprachen</translation>
+    </message>
 </context>
 </TS>

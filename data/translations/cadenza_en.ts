@@ -247,5 +247,17 @@
         <source>Full Size</source>
         <translation>Full Size</translation>
     </message>
+    <message id="SRLanguageCustomizationTitle">
+        <source>Customize Dictation Languages</source>
+        <translation>Customize Dictation Languages</translation>
+    </message>
+    <message id="SRLanguageCustomizationExplanation">
+        <source>Tick the dictation languages to list and the languages to download.</source>
+        <translation>Tick the dictation languages to list and the languages to download.</translation>
+    </message>
+    <message id="SRLanguageCustomizationTable">
+        <source>Dictation languages</source>
+        <translation>Dictation languages</translation>
+    </message>
 </context>
 </TS>

@@ -1,29 +1,9 @@
 #include "CZVoiceRowTextView.h"
 
-#include <QCoreApplication>
-#include <QMouseEvent>
-
 namespace Cadenza {
 
 CZVoiceRowTextView::CZVoiceRowTextView(QWidget *parent)
-    : QLabel(parent)
-{
-    setTextInteractionFlags(Qt::NoTextInteraction);
-}
-
-void CZVoiceRowTextView::mousePressEvent(QMouseEvent *event)
-{
-    QWidget *nextResponder = parentWidget();
-    if (!nextResponder) {
-        event->accept(); // nobody to hand it to: dropped
-        return;
-    }
-    // The same press, in the holder's coordinates, so it lands where the user clicked.
-    const QPointF position = mapTo(nextResponder, event->position().toPoint());
-    QMouseEvent forwarded(event->type(), position, event->scenePosition(), event->globalPosition(),
-        event->button(), event->buttons(), event->modifiers(), event->pointingDevice());
-    QCoreApplication::sendEvent(nextResponder, &forwarded);
-    event->accept(); // handed on once; Qt must not propagate the original a second time
-}
+    : Platform::ClickThroughLabel(parent)
+{ }
 
 } // namespace Cadenza

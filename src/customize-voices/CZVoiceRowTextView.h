@@ -2,24 +2,16 @@
 #define CADENZA_CUSTOMIZEVOICES_CZVOICEROWTEXTVIEW_H
 
 #include "cadenza_export.h"
-
-#include <QLabel>
+#include "platform/ClickThroughLabel.h"
 
 namespace Cadenza {
 
-/**
- * The label of a voice row. A press on its text goes on to the widget that holds it, so clicking a
- * voice's name selects the row instead of being swallowed by the label; a label with no holder
- * drops the press.
- */
-class CADENZA_EXPORT CZVoiceRowTextView : public QLabel
+/// The label of a voice row: a click on it selects the row rather than stopping at the label.
+class CADENZA_EXPORT CZVoiceRowTextView : public Platform::ClickThroughLabel
 {
     Q_OBJECT
 public:
     explicit CZVoiceRowTextView(QWidget *parent = nullptr);
-
-protected:
-    void mousePressEvent(QMouseEvent *event) override;
 };
 
 } // namespace Cadenza

@@ -2,7 +2,6 @@
 
 #include "customize-voices/CZVoiceRowCheckboxButton.h"
 #include "customize-voices/CZVoiceRowTextView.h"
-#include "customize-voices/VoiceRowDelegate.h"
 #include "customize-voices/VoiceSelectionModel.h"
 #include "customize-voices/VoiceTableCellView.h"
 #include "installation/CZSpeechInstallationManager.h"
@@ -12,6 +11,7 @@
 #include "platform/LocalizationTable.h"
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
+#include "platform/VisibleRowViews.h"
 #include "platform/VoiceDescription.h"
 #include "speech-items/CZSpeechItem.h"
 #include "voices/DownloadableVoice.h"
@@ -84,22 +84,16 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
     m_voiceSelectionTableView->setAccessibleName(texts().text(QStringLiteral("VoiceCustomizationTable")));
 
     m_voiceSelectionTableView->setModel(m_model);
-    m_voiceSelectionTableView->setItemDelegate(new VoiceRowDelegate(
-        [this](QWidget *view) {
-            // A row view the table let go of waits, hidden, for the next row that needs one.
-            if (auto *rowView = qobject_cast<VoiceTableCellView *>(view)) {
-                rowView->hide();
-                m_spareRowViews.append(rowView);
-            } else {
-                view->deleteLater();
-            }
+    m_rowViews = new Platform::VisibleRowViews(
+        m_voiceSelectionTableView,
+        [this](int row, QWidget *spare) -> QWidget * {
+            return viewForRow(row, qobject_cast<VoiceTableCellView *>(spare));
         },
-        this));
+        this);
     // One height for all rows: the view can then place 10,000 rows without measuring them.
     m_voiceSelectionTableView->verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
     m_voiceSelectionTableView->verticalHeader()->setDefaultSectionSize(
         VoiceTableCellView().sizeHint().height());
-    m_voiceSelectionTableView->viewport()->installEventFilter(this);
     m_voiceSelectionTableView->installEventFilter(this);
 
     connect(m_okButton, &QPushButton::clicked, this, &CustomizeVoicesWindowController::acceptVoiceSelection);
@@ -109,14 +103,8 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
         &CustomizeVoicesWindowController::startStopPlayingSelection);
     connect(
         m_searchField, &QLineEdit::textChanged, this, &CustomizeVoicesWindowController::searchFieldChanged);
-    connect(m_voiceSelectionTableView->verticalScrollBar(), &QScrollBar::valueChanged, this,
-        &CustomizeVoicesWindowController::syncRowViews);
     connect(m_voiceSelectionTableView->selectionModel(), &QItemSelectionModel::selectionChanged, this,
         &CustomizeVoicesWindowController::tableViewSelectionDidChange);
-    connect(m_model, &QAbstractItemModel::modelReset, this, [this] {
-        m_rowViews.clear(); // the view dropped its index widgets
-        QTimer::singleShot(0, this, &CustomizeVoicesWindowController::syncRowViews);
-    });
     connect(m_window, &QDialog::rejected, this, [this] {
         if (m_window->isVisible() || m_downloadStatusUpdateTimer) {
             cancelVoiceSelection();
@@ -127,18 +115,13 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
 CustomizeVoicesWindowController::~CustomizeVoicesWindowController()
 {
     _stopAndResetAllVoicePlaying();
-    m_voiceSelectionTableView->setItemDelegate(nullptr);
+    delete m_rowViews; // before the table it works on
     delete m_window;
-    for (const QPointer<VoiceTableCellView> &spare : std::as_const(m_spareRowViews)) {
-        delete spare.data();
-    }
 }
 
 bool CustomizeVoicesWindowController::eventFilter(QObject *watched, QEvent *event)
 {
-    if (watched == m_voiceSelectionTableView->viewport() && event->type() == QEvent::Resize) {
-        QTimer::singleShot(0, this, &CustomizeVoicesWindowController::syncRowViews);
-    } else if (watched == m_voiceSelectionTableView && event->type() == QEvent::KeyPress
+    if (watched == m_voiceSelectionTableView && event->type() == QEvent::KeyPress
         && static_cast<QKeyEvent *>(event)->key() == Qt::Key_Space) {
         // Space ticks the current voice, as a click on its checkbox would.
         const int row = m_voiceSelectionTableView->currentIndex().row();
@@ -195,7 +178,7 @@ void CustomizeVoicesWindowController::showSheetForWindow(QWidget *window, bool s
     }
     m_window->setWindowModality(window ? Qt::WindowModal : Qt::ApplicationModal);
     m_window->show();
-    syncRowViews();
+    m_rowViews->sync();
 
     stopObservingInstallations();
     // The installer spells the notification so.
@@ -352,40 +335,10 @@ bool CustomizeVoicesWindowController::isGroupRow(int row) const
 
 VoiceTableCellView *CustomizeVoicesWindowController::existingViewForRow(int row) const
 {
-    return m_rowViews.value(row);
+    return qobject_cast<VoiceTableCellView *>(m_rowViews->viewForRow(row));
 }
 
-void CustomizeVoicesWindowController::syncRowViews()
-{
-    QTableView *table = m_voiceSelectionTableView;
-    const int rowCount = m_model->rowCount();
-    if (!m_window->isVisible() || rowCount == 0) {
-        return;
-    }
-    int first = table->rowAt(0);
-    int last = table->rowAt(table->viewport()->height() - 1);
-    first = first < 0 ? 0 : first;
-    last = last < 0 ? rowCount - 1 : last;
-    // Views for rows that scrolled away go; the visible rows get one each.
-    for (auto it = m_rowViews.begin(); it != m_rowViews.end();) {
-        if (it.key() < first || it.key() > last || !it.value()) {
-            table->setIndexWidget(m_model->index(it.key(), 0), nullptr);
-            it = m_rowViews.erase(it);
-        } else {
-            ++it;
-        }
-    }
-    for (int row = first; row <= last; ++row) {
-        if (!m_rowViews.contains(row)) {
-            if (VoiceTableCellView *view = viewForRow(row)) {
-                table->setIndexWidget(m_model->index(row, 0), view);
-                m_rowViews.insert(row, view);
-            }
-        }
-    }
-}
-
-VoiceTableCellView *CustomizeVoicesWindowController::viewForRow(int row)
+VoiceTableCellView *CustomizeVoicesWindowController::viewForRow(int row, VoiceTableCellView *spare)
 {
     QMutexLocker locker(&m_lock);
     if (row < 0 || row >= m_currentlyDisplayedVoiceRows.size()) {
@@ -395,10 +348,7 @@ VoiceTableCellView *CustomizeVoicesWindowController::viewForRow(int row)
     if (entry->isGroupRow()) {
         return nullptr; // headings are drawn by the table itself
     }
-    VoiceTableCellView *view = nullptr;
-    while (!view && !m_spareRowViews.isEmpty()) {
-        view = m_spareRowViews.takeLast();
-    }
+    VoiceTableCellView *view = spare;
     if (!view) {
         view = new VoiceTableCellView;
         connect(view->activeCheckbox(), &QAbstractButton::clicked, this,

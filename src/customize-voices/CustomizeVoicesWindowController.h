@@ -27,6 +27,9 @@ namespace Cadenza {
 
 class CZVoiceRowCheckboxButton;
 class SpeechSynthesizer;
+namespace Platform {
+class VisibleRowViews;
+}
 class VoiceSelectionModel;
 class VoiceTableCellView;
 
@@ -62,8 +65,8 @@ public:
     [[nodiscard]] int numberOfRowsInTableView() const;
     [[nodiscard]] bool isGroupRow(int row) const;
     [[nodiscard]] bool shouldSelectRow(int row) const { return !isGroupRow(row); }
-    /// The row view of voice row @p row, made and filled in; null for headings.
-    [[nodiscard]] VoiceTableCellView *viewForRow(int row);
+    /// The row view of voice row @p row: @p spare (or a new view) filled in; null for headings.
+    [[nodiscard]] VoiceTableCellView *viewForRow(int row, VoiceTableCellView *spare = nullptr);
     /// The row view the table holds for @p row now; null when it has none.
     [[nodiscard]] VoiceTableCellView *existingViewForRow(int row) const;
     void tableViewSelectionDidChange();
@@ -105,7 +108,6 @@ protected:
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 private:
-    void syncRowViews();
     void fillRowView(VoiceTableCellView *view, const VoiceTableRowPtr &row);
     [[nodiscard]] int displayedRowOfVoice(const QString &identifier) const;
     [[nodiscard]] std::shared_ptr<class DownloadableVoice> downloadableObjectOf(
@@ -136,8 +138,7 @@ private:
     bool m_showIndividualVoiceQualities = false;
     bool m_popUpWasInitiallyBeenBuilt = false;
     mutable QRecursiveMutex m_lock;
-    QHash<int, QPointer<VoiceTableCellView>> m_rowViews;
-    QList<QPointer<VoiceTableCellView>> m_spareRowViews;
+    Platform::VisibleRowViews *m_rowViews;
     QMetaObject::Connection m_installationObservation;
 };
 

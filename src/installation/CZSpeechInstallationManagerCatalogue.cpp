@@ -265,9 +265,10 @@ bool CZSpeechInstallationManager::startInstallingDownloadableSpeechItems(
         item->setShowCountryInDisplayTitle(true);
         const QString name = item->displayTitle();
         item->setShowCountryInDisplayTitle(false);
-        sent = _requestInstallation(
-                   item->tagName(), name, item->byteSize(), item->localeIdentifier(), userInteractionMode)
-            || sent;
+        // As for voices, a language to be fetched at full size asks for the full-size package.
+        const QString tag = item->downloadFullSize() ? item->fullSizeTagName() : item->tagName();
+        const quint64 size = item->downloadFullSize() ? item->fullSizeByteSize() : item->byteSize();
+        sent = _requestInstallation(tag, name, size, item->localeIdentifier(), userInteractionMode) || sent;
     }
     return sent;
 }

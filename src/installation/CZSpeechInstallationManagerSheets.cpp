@@ -1,6 +1,7 @@
 #include "CZSpeechInstallationManagerSheets.h"
 
 #include "customize-voices/CustomizeVoicesWindowController.h"
+#include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 
 #include <QDialog>
 
@@ -10,6 +11,11 @@ namespace {
 CZSpeechInstallationManagerSheets::VoiceSheetPresenter &presenter()
 {
     static CZSpeechInstallationManagerSheets::VoiceSheetPresenter present;
+    return present;
+}
+CZSpeechInstallationManagerSheets::SRLanguageSheetPresenter &languagePresenter()
+{
+    static CZSpeechInstallationManagerSheets::SRLanguageSheetPresenter present;
     return present;
 }
 } // namespace
@@ -38,6 +44,35 @@ void CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(
 void CZSpeechInstallationManagerSheets::setVoiceSheetPresenter(VoiceSheetPresenter present)
 {
     presenter() = std::move(present);
+}
+
+CZCustomizeSRLanguagesWindowController *
+CZSpeechInstallationManagerSheets::srLanguagesSelectionWindowController()
+{
+    static CZCustomizeSRLanguagesWindowController *controller = [] {
+        auto *made = new CZCustomizeSRLanguagesWindowController;
+        made->window()->ensurePolished();
+        return made;
+    }();
+    return controller;
+}
+
+void CZSpeechInstallationManagerSheets::showSRLanguagesSelectionSheetForWindow(QWidget *window,
+    const std::optional<QStringList> &networkSupportedLocaleIdentifiers,
+    const QString &requiredLocaleIdentifier, bool supportDownloads)
+{
+    if (languagePresenter()) {
+        languagePresenter()(
+            window, networkSupportedLocaleIdentifiers, requiredLocaleIdentifier, supportDownloads);
+        return;
+    }
+    srLanguagesSelectionWindowController()->showSheetForWindow(
+        window, networkSupportedLocaleIdentifiers, requiredLocaleIdentifier, supportDownloads);
+}
+
+void CZSpeechInstallationManagerSheets::setSRLanguageSheetPresenter(SRLanguageSheetPresenter presenter)
+{
+    languagePresenter() = std::move(presenter);
 }
 
 } // namespace Cadenza

@@ -1,0 +1,19 @@
+#include "RecyclingItemDelegate.h"
+
+namespace Cadenza::Platform {
+
+RecyclingItemDelegate::RecyclingItemDelegate(Recycler recycler, QObject *parent)
+    : QStyledItemDelegate(parent)
+    , m_recycler(std::move(recycler))
+{ }
+
+void RecyclingItemDelegate::destroyEditor(QWidget *editor, const QModelIndex &index) const
+{
+    if (m_recycler) {
+        m_recycler(editor);
+        return;
+    }
+    QStyledItemDelegate::destroyEditor(editor, index);
+}
+
+} // namespace Cadenza::Platform
