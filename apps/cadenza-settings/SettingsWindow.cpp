@@ -1,10 +1,13 @@
 #include "SettingsWindow.h"
 
+#include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-settings/SpeechSynthesizerVoiceSettings.h"
 #include "voices/SpeechSynthesizer.h"
 
+#include <QComboBox>
 #include <QFormLayout>
+#include <QGroupBox>
 #include <QHBoxLayout>
 #include <QLabel>
 #include <QProgressBar>
@@ -19,6 +22,10 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     , m_downloadStatus(new QLabel(this))
     , m_downloadIndicator(new QProgressBar(this))
     , m_voiceSettingsSummary(new QLabel(this))
+    , m_languagePopUp(new CZSRLanguagePopUpButton(this))
+    , m_languageStatus(new QLabel(this))
+    , m_languageIndicator(new QProgressBar(this))
+    , m_localeLists(new QComboBox(this))
 {
     setObjectName(QStringLiteral("settingsWindow"));
     setWindowTitle(tr("Speech"));
@@ -48,19 +55,69 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     buttons->addWidget(asSheet);
     buttons->addStretch(1);
 
+    auto *voiceBox = new QGroupBox(tr("Speech"), this);
     auto *form = new QFormLayout;
     form->addRow(voiceLabel, m_voicePopUp);
     form->addRow(QString(), status);
+    auto *voiceLayout = new QVBoxLayout(voiceBox);
+    voiceLayout->addLayout(form);
+    voiceLayout->addLayout(buttons);
+    voiceLayout->addWidget(m_voiceSettingsSummary);
+
+    // Dictation: the language pop-up, its status, and which locale lists the recognition service offers.
+    m_languagePopUp->setAccessibleName(tr("Dictation language"));
+    m_languagePopUp->setLanguagesAreDownloadable(true);
+    m_languageStatus->setObjectName(QStringLiteral("languageStatusTextField"));
+    m_languageIndicator->setObjectName(QStringLiteral("languageStatusProgressIndicator"));
+    m_languageIndicator->setMaximumWidth(60);
+    m_languagePopUp->setDownloadStatusTextField(m_languageStatus);
+    m_languagePopUp->setDownloadStatusProgressIndicator(m_languageIndicator);
+    m_localeLists->setObjectName(QStringLiteral("localeLists"));
+    m_localeLists->setAccessibleName(tr("Recognition service"));
+    m_localeLists->addItem(tr("Installed recognizers"));
+    m_localeLists->addItem(tr("Network service (English, German, French, Spanish, Japanese)"));
+    m_localeLists->addItem(tr("Offline only (English, German)"));
+    connect(m_localeLists, &QComboBox::activated, this, &SettingsWindow::rebuildLanguages);
+    auto *languageLabel = new QLabel(tr("&Language:"), this);
+    languageLabel->setBuddy(m_languagePopUp);
+    auto *languageStatus = new QHBoxLayout;
+    languageStatus->addWidget(m_languageIndicator);
+    languageStatus->addWidget(m_languageStatus, 1);
+    auto *dictationBox = new QGroupBox(tr("Dictation"), this);
+    auto *dictationForm = new QFormLayout(dictationBox);
+    dictationForm->addRow(languageLabel, m_languagePopUp);
+    dictationForm->addRow(QString(), languageStatus);
+    dictationForm->addRow(tr("&Offer:"), m_localeLists);
+
     auto *layout = new QVBoxLayout(this);
-    layout->addLayout(form);
-    layout->addSpacing(12);
-    layout->addLayout(buttons);
-    layout->addWidget(m_voiceSettingsSummary);
+    layout->addWidget(voiceBox);
+    layout->addWidget(dictationBox);
     layout->addStretch(1);
 
     m_voicePopUp->buildPopUpButtonWithSelectVoiceIdentifier(
         SpeechSynthesizer::defaultVoiceFromMainstreamVoices());
     showVoiceSettings();
+    rebuildLanguages();
+}
+
+void SettingsWindow::rebuildLanguages()
+{
+    const QStringList network {QStringLiteral("en_US"), QStringLiteral("en_GB"), QStringLiteral("de_DE"),
+        QStringLiteral("fr_FR"), QStringLiteral("es_ES"), QStringLiteral("ja_JP")};
+    const QStringList offline {QStringLiteral("en_US"), QStringLiteral("de_DE")};
+    const QString chosen = m_languagePopUp->previouslyChosenLocaleIdentifier();
+    switch (m_localeLists->currentIndex()) {
+    case 1:
+        m_languagePopUp->buildPopUpButtonAndSelectLocaleIdentifier(chosen, network, offline);
+        break;
+    case 2:
+        m_languagePopUp->buildPopUpButtonAndSelectLocaleIdentifier(chosen, std::nullopt, offline);
+        break;
+    default:
+        m_languagePopUp->buildPopUpButtonAndSelectLocaleIdentifier(chosen, std::nullopt, std::nullopt);
+        break;
+    }
+    m_languagePopUp->setEnabled(true); // the pop-up leaves enabling to its host
 }
 
 void SettingsWindow::openVoiceSettingsWindow()

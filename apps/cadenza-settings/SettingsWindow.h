@@ -7,13 +7,17 @@
 class QLabel;
 class QProgressBar;
 
+class QComboBox;
+
 namespace Cadenza {
+class CZSRLanguagePopUpButton;
 class CZVoicePopUpButton;
-}
+} // namespace Cadenza
 
 /**
- * The main window of cadenza-settings: the voice pop-up with its download status line, and buttons
- * that open the voice settings dialog as a window and as a sheet and show what it returned.
+ * The main window of cadenza-settings: the voice pop-up with its download status line; buttons that
+ * open the voice settings dialog as a window and as a sheet and show what it returned; the dictation
+ * language pop-up with its status line and a choice of the locale lists it offers.
  */
 class SettingsWindow : public QWidget
 {
@@ -22,6 +26,7 @@ public:
     explicit SettingsWindow(QWidget *parent = nullptr);
 
     [[nodiscard]] Cadenza::CZVoicePopUpButton *voicePopUp() const { return m_voicePopUp; }
+    [[nodiscard]] Cadenza::CZSRLanguagePopUpButton *languagePopUp() const { return m_languagePopUp; }
     /// The voice settings the dialog returned last.
     [[nodiscard]] QVariantMap voiceSettings() const { return m_voiceSettings; }
 
@@ -33,11 +38,16 @@ public:
 
 private:
     void showVoiceSettings();
+    void rebuildLanguages();
 
     Cadenza::CZVoicePopUpButton *m_voicePopUp;
     QLabel *m_downloadStatus;
     QProgressBar *m_downloadIndicator;
     QLabel *m_voiceSettingsSummary;
+    Cadenza::CZSRLanguagePopUpButton *m_languagePopUp;
+    QLabel *m_languageStatus;
+    QProgressBar *m_languageIndicator;
+    QComboBox *m_localeLists;
     QVariantMap m_voiceSettings;
 };
 

@@ -3,6 +3,8 @@
 
 #include "customize-voices/CustomizeVoicesWindowController.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
+#include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
+#include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-settings/VoiceSettingsAlertController.h"
 #include "voice-settings/VoiceSettingsSheetController.h"
 
@@ -33,7 +35,7 @@ int writeScreenshots(SettingsWindow &window, const QString &folder)
         }
         std::printf("%s\n", qPrintable(path));
     };
-    window.resize(520, 240);
+    window.resize(560, 360);
     window.show();
     save(&window, "main-window.png");
 
@@ -51,10 +53,19 @@ int writeScreenshots(SettingsWindow &window, const QString &folder)
     Cadenza::CustomizeVoicesWindowController *sheet
         = Cadenza::CZSpeechInstallationManagerSheets::voiceSelectionWindowController();
     sheet->window()->resize(680, 520);
-    QTimer::singleShot(100, [] {});
     QCoreApplication::processEvents();
     save(sheet->window(), "customize-voices.png");
     sheet->cancelVoiceSelection();
+
+    Cadenza::CZSpeechInstallationManagerSheets::showSRLanguagesSelectionSheetForWindow(&window,
+        QStringList {QStringLiteral("en_US"), QStringLiteral("de_DE"), QStringLiteral("fr_FR")},
+        window.languagePopUp()->previouslyChosenLocaleIdentifier(), true);
+    Cadenza::CZCustomizeSRLanguagesWindowController *languages
+        = Cadenza::CZSpeechInstallationManagerSheets::srLanguagesSelectionWindowController();
+    languages->window()->resize(640, 420);
+    QCoreApplication::processEvents();
+    save(languages->window(), "customize-languages.png");
+    languages->cancelSelection();
     return failures == 0 ? 0 : 1;
 }
 } // namespace
