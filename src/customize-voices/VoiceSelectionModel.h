@@ -3,21 +3,15 @@
 
 #include "cadenza_export.h"
 #include "customize-voices/VoiceTableRow.h"
-
-#include <QAbstractTableModel>
+#include "platform/GroupedRowsModel.h"
 
 namespace Cadenza {
 
-/**
- * The rows of the customise voices table as a one-column model ("title"): headings, which cannot be
- * selected and are drawn bold, and voices, labelled by their name or root name.
- */
-class CADENZA_EXPORT VoiceSelectionModel : public QAbstractTableModel
+/// The rows of the customise voices table: headings, and voices labelled by their name or root name.
+class CADENZA_EXPORT VoiceSelectionModel : public Platform::GroupedRowsModel
 {
     Q_OBJECT
 public:
-    enum Role { GroupRowRole = Qt::UserRole + 1, VoiceIdentifierRole };
-
     explicit VoiceSelectionModel(QObject *parent = nullptr);
 
     /// Replaces every row; voices are labelled with full names when @p showIndividualVoiceQualities.
@@ -25,14 +19,14 @@ public:
     [[nodiscard]] const QList<VoiceTableRowPtr> &rows() const { return m_rows; }
     /// The label of a voice row.
     [[nodiscard]] QString labelForVoice(const CZVoiceObject &voice) const;
-    /// Tells views that the voice rows' texts or states changed.
+    /// Tells views that a voice row's text or state changed.
     void refreshVoiceRow(int row);
 
-    int rowCount(const QModelIndex &parent = QModelIndex()) const override;
-    int columnCount(const QModelIndex &parent = QModelIndex()) const override;
-    QVariant data(const QModelIndex &index, int role = Qt::DisplayRole) const override;
-    QVariant headerData(int section, Qt::Orientation orientation, int role = Qt::DisplayRole) const override;
-    Qt::ItemFlags flags(const QModelIndex &index) const override;
+protected:
+    int rowTotal() const override { return int(m_rows.size()); }
+    bool isGroupRowAt(int row) const override { return m_rows.at(row)->isGroupRow(); }
+    QString textAt(int row) const override;
+    QString identifierAt(int row) const override;
 
 private:
     QList<VoiceTableRowPtr> m_rows;

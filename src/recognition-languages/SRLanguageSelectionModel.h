@@ -2,32 +2,26 @@
 #define CADENZA_RECOGNITIONLANGUAGES_SRLANGUAGESELECTIONMODEL_H
 
 #include "cadenza_export.h"
+#include "platform/GroupedRowsModel.h"
 #include "recognition-languages/CZSRLanguageRow.h"
-
-#include <QAbstractTableModel>
 
 namespace Cadenza {
 
-/**
- * The rows of the customise recognition languages table as a one-column model ("title"): language
- * headings, which cannot be selected and are drawn bold, and countries.
- */
-class CADENZA_EXPORT SRLanguageSelectionModel : public QAbstractTableModel
+/// The rows of the customise recognition languages table: language headings, and countries.
+class CADENZA_EXPORT SRLanguageSelectionModel : public Platform::GroupedRowsModel
 {
     Q_OBJECT
 public:
-    enum Role { GroupRowRole = Qt::UserRole + 1, LocaleIdentifierRole };
-
     explicit SRLanguageSelectionModel(QObject *parent = nullptr);
 
     void setRows(const QList<CZSRLanguageRowPtr> &rows);
     [[nodiscard]] const QList<CZSRLanguageRowPtr> &rows() const { return m_rows; }
 
-    int rowCount(const QModelIndex &parent = QModelIndex()) const override;
-    int columnCount(const QModelIndex &parent = QModelIndex()) const override;
-    QVariant data(const QModelIndex &index, int role = Qt::DisplayRole) const override;
-    QVariant headerData(int section, Qt::Orientation orientation, int role = Qt::DisplayRole) const override;
-    Qt::ItemFlags flags(const QModelIndex &index) const override;
+protected:
+    int rowTotal() const override { return int(m_rows.size()); }
+    bool isGroupRowAt(int row) const override { return m_rows.at(row)->isGroupRow(); }
+    QString textAt(int row) const override;
+    QString identifierAt(int row) const override;
 
 private:
     QList<CZSRLanguageRowPtr> m_rows;

@@ -1,4 +1,5 @@
 // From the voice pop-up to an installed voice, with the real daemon on the sample repository.
+#include "QuillondProcess.h"
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
 
@@ -9,7 +10,6 @@
 #include "installation/InstallerProtocol.h"
 #include "platform/Paths.h"
 #include "platform/Services.h"
-#include "platform/UnixMessagePortService.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 
 #include <QDialog>
@@ -42,18 +42,12 @@ private Q_SLOTS:
         m_http = std::make_unique<Testing::TestHttpServer>(QStringLiteral(CADENZA_SAMPLE_REPOSITORY));
         QVERIFY(m_http->listen());
         m_http->setBytesPerSecond(120);
-        m_daemon.setProcessChannelMode(QProcess::ForwardedErrorChannel);
-        m_daemon.start(
-            QStringLiteral(QUILLOND_PATH), {QStringLiteral("--repository"), m_http->baseUrl().toString()});
-        QVERIFY(m_daemon.waitForStarted(5000));
-        Platform::UnixMessagePortService ports;
-        QVERIFY(QTest::qWaitFor(
-            [&] { return ports.createRemotePort(InstallerProtocol::LivenessPortName) != nullptr; }, 5000));
+        QVERIFY2(m_daemon.start({QStringLiteral("--repository"), m_http->baseUrl().toString()}),
+            "quillond did not start");
     }
     void cleanupTestCase()
     {
         m_daemon.terminate();
-        m_daemon.waitForFinished(5000);
         m_environment.reset();
     }
 
@@ -113,7 +107,7 @@ private Q_SLOTS:
 private:
     std::unique_ptr<TestEnvironment> m_environment;
     std::unique_ptr<Testing::TestHttpServer> m_http;
-    QProcess m_daemon;
+    Testing::QuillondProcess m_daemon;
 };
 
 QTEST_MAIN(VoiceInstallationTest)

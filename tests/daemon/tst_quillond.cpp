@@ -1,3 +1,4 @@
+#include "QuillondProcess.h"
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
 
@@ -34,44 +35,6 @@ const QString BigTag = QStringLiteral("VOICEID:com.vendra.test.big.premium");
 const QString SmallTag = QStringLiteral("VOICEID:com.vendra.test.small.premium");
 const QString BadSumTag = QStringLiteral("VOICEID:com.vendra.test.badsum.premium");
 const QString MissingTag = QStringLiteral("VOICEID:com.vendra.test.missing.premium");
-
-/// A real quillond, started and stopped by the test.
-class Daemon
-{
-public:
-    bool start(const QStringList &arguments)
-    {
-        m_process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
-        m_process.start(QStringLiteral(QUILLOND_PATH), arguments);
-        if (!m_process.waitForStarted(5000)) {
-            return false;
-        }
-        Platform::UnixMessagePortService ports;
-        for (int i = 0; i < 100; ++i) {
-            if (ports.createRemotePort(LivenessPortName)) {
-                return true;
-            }
-            QTest::qWait(50);
-        }
-        return false;
-    }
-    void kill()
-    {
-        ::kill(pid_t(m_process.processId()), SIGKILL);
-        m_process.waitForFinished(5000);
-    }
-    void terminate()
-    {
-        if (m_process.state() != QProcess::NotRunning) {
-            m_process.terminate();
-            m_process.waitForFinished(5000);
-        }
-    }
-    ~Daemon() { terminate(); }
-
-private:
-    QProcess m_process;
-};
 
 QString voicesFolder()
 {
@@ -401,7 +364,7 @@ private:
 
     void startDaemon(const QStringList &arguments)
     {
-        m_daemon = std::make_unique<Daemon>();
+        m_daemon = std::make_unique<Testing::QuillondProcess>();
         QVERIFY2(m_daemon->start(arguments), "quillond did not start");
     }
     void startTestDaemon()
@@ -449,7 +412,7 @@ private:
 
     std::unique_ptr<TestEnvironment> m_environment;
     std::unique_ptr<TestHttpServer> m_http;
-    std::unique_ptr<Daemon> m_daemon;
+    std::unique_ptr<Testing::QuillondProcess> m_daemon;
     std::unique_ptr<CZSpeechInstallationManager> m_manager;
     std::unique_ptr<QSignalSpy> m_finished;
     QString m_catalogue;

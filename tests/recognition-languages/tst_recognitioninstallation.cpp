@@ -1,5 +1,6 @@
 // A dictation language from the pop-up's sheet to the menu, with the real daemon, the session bus and a
 // second process that plays the dictation engine.
+#include "QuillondProcess.h"
 #include "TestEnvironment.h"
 
 #include "installation/CZSpeechInstallationManager.h"
@@ -7,7 +8,6 @@
 #include "installation/InstallerProtocol.h"
 #include "platform/Paths.h"
 #include "platform/PropertyList.h"
-#include "platform/UnixMessagePortService.h"
 #include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 
@@ -75,19 +75,13 @@ private Q_SLOTS:
             {QStringLiteral("Packages"), QVariantMap {{QStringLiteral("SRCLANGID:de_DE"), package}}}}));
         file.close();
 
-        m_daemon.setProcessChannelMode(QProcess::ForwardedErrorChannel);
-        m_daemon.start(QStringLiteral(QUILLOND_PATH),
-            {QStringLiteral("--catalogue"), catalogue, QStringLiteral("--repository"),
-                QUrl::fromLocalFile(repository).toString()});
-        QVERIFY(m_daemon.waitForStarted(5000));
-        Platform::UnixMessagePortService ports;
-        QVERIFY(QTest::qWaitFor(
-            [&] { return ports.createRemotePort(InstallerProtocol::LivenessPortName) != nullptr; }, 5000));
+        QVERIFY2(m_daemon.start({QStringLiteral("--catalogue"), catalogue, QStringLiteral("--repository"),
+                     QUrl::fromLocalFile(repository).toString()}),
+            "quillond did not start");
     }
     void cleanupTestCase()
     {
         m_daemon.terminate();
-        m_daemon.waitForFinished(5000);
         m_environment.reset();
     }
 
@@ -158,7 +152,7 @@ private Q_SLOTS:
 
 private:
     std::unique_ptr<TestEnvironment> m_environment;
-    QProcess m_daemon;
+    Testing::QuillondProcess m_daemon;
 };
 
 QTEST_MAIN(RecognitionInstallationTest)

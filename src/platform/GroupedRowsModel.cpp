@@ -1,0 +1,69 @@
+#include "GroupedRowsModel.h"
+
+#include <QFont>
+
+namespace Cadenza::Platform {
+
+GroupedRowsModel::GroupedRowsModel(QObject *parent)
+    : QAbstractTableModel(parent)
+{ }
+
+bool GroupedRowsModel::isValidRow(const QModelIndex &index) const
+{
+    // Views ask about invalid indexes routinely; that is not an error.
+    return index.isValid() && !index.parent().isValid() && index.row() < rowTotal();
+}
+
+int GroupedRowsModel::rowCount(const QModelIndex &parent) const
+{
+    return parent.isValid() ? 0 : rowTotal();
+}
+
+int GroupedRowsModel::columnCount(const QModelIndex &parent) const
+{
+    return parent.isValid() ? 0 : 1;
+}
+
+QVariant GroupedRowsModel::data(const QModelIndex &index, int role) const
+{
+    if (!isValidRow(index)) {
+        return {};
+    }
+    switch (role) {
+    case Qt::DisplayRole:
+    case Qt::AccessibleTextRole:
+        return textAt(index.row());
+    case Qt::FontRole:
+        if (isGroupRowAt(index.row())) {
+            QFont bold;
+            bold.setBold(true);
+            return bold;
+        }
+        return {};
+    case GroupRowRole:
+        return isGroupRowAt(index.row());
+    case IdentifierRole:
+        return identifierAt(index.row());
+    default:
+        return {};
+    }
+}
+
+QVariant GroupedRowsModel::headerData(int section, Qt::Orientation orientation, int role) const
+{
+    if (orientation == Qt::Horizontal && section == 0 && role == Qt::DisplayRole) {
+        return QStringLiteral("title");
+    }
+    return {};
+}
+
+Qt::ItemFlags GroupedRowsModel::flags(const QModelIndex &index) const
+{
+    if (!isValidRow(index)) {
+        return Qt::NoItemFlags;
+    }
+    return isGroupRowAt(index.row()) ? Qt::ItemIsEnabled | Qt::ItemNeverHasChildren
+                                     : Qt::ItemIsEnabled | Qt::ItemIsSelectable | Qt::ItemNeverHasChildren;
+}
+
+} // namespace Cadenza::Platform

@@ -1,0 +1,28 @@
+#ifndef CADENZA_TESTS_QUILLONDPROCESS_H
+#define CADENZA_TESTS_QUILLONDPROCESS_H
+
+#include <QProcess>
+#include <QStringList>
+
+namespace Cadenza::Testing {
+
+/// A real quillond for a test: started with arguments, ready once its liveness port answers.
+class QuillondProcess
+{
+public:
+    ~QuillondProcess() { terminate(); }
+
+    /// Starts the daemon and waits up to 5 s for it to serve; false when it does not.
+    [[nodiscard]] bool start(const QStringList &arguments);
+    /// Kills it without warning, as a crash would.
+    void kill();
+    /// Asks it to stop and waits for it.
+    void terminate();
+
+private:
+    QProcess m_process;
+};
+
+} // namespace Cadenza::Testing
+
+#endif
