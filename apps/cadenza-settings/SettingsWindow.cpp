@@ -1,5 +1,6 @@
 #include "SettingsWindow.h"
 
+#include "platform/LocalizationTable.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-settings/SpeechSynthesizerVoiceSettings.h"
@@ -16,6 +17,14 @@
 
 using namespace Cadenza;
 
+namespace {
+// The application speaks the user's language through the same tables as the library.
+QString text(const char *key)
+{
+    return Platform::LocalizationTable::shared().text(QLatin1String(key));
+}
+} // namespace
+
 SettingsWindow::SettingsWindow(QWidget *parent)
     : QWidget(parent)
     , m_voicePopUp(new CZVoicePopUpButton(this))
@@ -28,7 +37,7 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     , m_localeLists(new QComboBox(this))
 {
     setObjectName(QStringLiteral("settingsWindow"));
-    setWindowTitle(tr("Speech"));
+    setWindowTitle(text("SettingsSpeech"));
     m_downloadStatus->setObjectName(QStringLiteral("downloadStatusTextField"));
     m_downloadIndicator->setObjectName(QStringLiteral("downloadStatusProgressIndicator"));
     m_downloadIndicator->setMaximumWidth(60);
@@ -36,17 +45,17 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     m_voiceSettingsSummary->setWordWrap(true);
     m_voicePopUp->setDownloadStatusTextField(m_downloadStatus);
     m_voicePopUp->setDownloadStatusProgressIndicator(m_downloadIndicator);
-    m_voicePopUp->setAccessibleName(tr("System voice"));
+    m_voicePopUp->setAccessibleName(text("SettingsSystemVoiceName"));
 
-    auto *voiceLabel = new QLabel(tr("System &voice:"), this);
+    auto *voiceLabel = new QLabel(text("SettingsSystemVoiceLabel"), this);
     voiceLabel->setBuddy(m_voicePopUp);
     auto *status = new QHBoxLayout;
     status->addWidget(m_downloadIndicator);
     status->addWidget(m_downloadStatus, 1);
 
-    auto *asWindow = new QPushButton(tr("Voice Settings…"), this);
+    auto *asWindow = new QPushButton(text("SettingsVoiceSettingsButton"), this);
     asWindow->setObjectName(QStringLiteral("voiceSettingsWindowButton"));
-    auto *asSheet = new QPushButton(tr("Voice Settings as Sheet…"), this);
+    auto *asSheet = new QPushButton(text("SettingsVoiceSettingsSheetButton"), this);
     asSheet->setObjectName(QStringLiteral("voiceSettingsSheetButton"));
     connect(asWindow, &QPushButton::clicked, this, &SettingsWindow::openVoiceSettingsWindow);
     connect(asSheet, &QPushButton::clicked, this, &SettingsWindow::openVoiceSettingsSheet);
@@ -55,7 +64,7 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     buttons->addWidget(asSheet);
     buttons->addStretch(1);
 
-    auto *voiceBox = new QGroupBox(tr("Speech"), this);
+    auto *voiceBox = new QGroupBox(text("SettingsSpeech"), this);
     auto *form = new QFormLayout;
     form->addRow(voiceLabel, m_voicePopUp);
     form->addRow(QString(), status);
@@ -65,7 +74,7 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     voiceLayout->addWidget(m_voiceSettingsSummary);
 
     // Dictation: the language pop-up, its status, and which locale lists the recognition service offers.
-    m_languagePopUp->setAccessibleName(tr("Dictation language"));
+    m_languagePopUp->setAccessibleName(text("SettingsDictationLanguageName"));
     m_languagePopUp->setLanguagesAreDownloadable(true);
     m_languageStatus->setObjectName(QStringLiteral("languageStatusTextField"));
     m_languageIndicator->setObjectName(QStringLiteral("languageStatusProgressIndicator"));
@@ -73,21 +82,21 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     m_languagePopUp->setDownloadStatusTextField(m_languageStatus);
     m_languagePopUp->setDownloadStatusProgressIndicator(m_languageIndicator);
     m_localeLists->setObjectName(QStringLiteral("localeLists"));
-    m_localeLists->setAccessibleName(tr("Recognition service"));
-    m_localeLists->addItem(tr("Installed recognizers"));
-    m_localeLists->addItem(tr("Network service (English, German, French, Spanish, Japanese)"));
-    m_localeLists->addItem(tr("Offline only (English, German)"));
+    m_localeLists->setAccessibleName(text("SettingsRecognitionServiceName"));
+    m_localeLists->addItem(text("SettingsInstalledRecognizers"));
+    m_localeLists->addItem(text("SettingsNetworkService"));
+    m_localeLists->addItem(text("SettingsOfflineOnly"));
     connect(m_localeLists, &QComboBox::activated, this, &SettingsWindow::rebuildLanguages);
-    auto *languageLabel = new QLabel(tr("&Language:"), this);
+    auto *languageLabel = new QLabel(text("SettingsLanguageLabel"), this);
     languageLabel->setBuddy(m_languagePopUp);
     auto *languageStatus = new QHBoxLayout;
     languageStatus->addWidget(m_languageIndicator);
     languageStatus->addWidget(m_languageStatus, 1);
-    auto *dictationBox = new QGroupBox(tr("Dictation"), this);
+    auto *dictationBox = new QGroupBox(text("SettingsDictation"), this);
     auto *dictationForm = new QFormLayout(dictationBox);
     dictationForm->addRow(languageLabel, m_languagePopUp);
     dictationForm->addRow(QString(), languageStatus);
-    dictationForm->addRow(tr("&Offer:"), m_localeLists);
+    dictationForm->addRow(text("SettingsOfferLabel"), m_localeLists);
 
     auto *layout = new QVBoxLayout(this);
     layout->addWidget(voiceBox);
@@ -122,7 +131,7 @@ void SettingsWindow::rebuildLanguages()
 
 void SettingsWindow::openVoiceSettingsWindow()
 {
-    SpeechSynthesizerVoiceSettings::beginAlertForVoiceSettings(m_voiceSettings, this, tr("Reading Voice"));
+    SpeechSynthesizerVoiceSettings::beginAlertForVoiceSettings(m_voiceSettings, this, text("SettingsReadingVoiceTitle"));
 }
 
 void SettingsWindow::openVoiceSettingsSheet()
@@ -142,14 +151,14 @@ void SettingsWindow::showVoiceSettings()
 {
     QStringList parts;
     const QString voice = m_voiceSettings.value(kVoiceSettingsVoiceIdentifierKey).toString();
-    parts.append(tr("Reading voice: %1").arg(voice.isEmpty() ? tr("system voice") : voice));
+    parts.append(text("SettingsReadingVoiceFormat").arg(voice.isEmpty() ? text("SettingsSystemVoiceText") : voice));
     if (m_voiceSettings.contains(kVoiceSettingsCustomRelativeRateKey)) {
         parts.append(
-            tr("rate %1 %")
+            text("SettingsRateFormat")
                 .arg(qRound(m_voiceSettings.value(kVoiceSettingsCustomRelativeRateKey).toDouble() * 100)));
     }
     if (m_voiceSettings.contains(kVoiceSettingsCustomVolumeKey)) {
-        parts.append(tr("volume %1 %")
+        parts.append(text("SettingsVolumeFormat")
                          .arg(qRound(m_voiceSettings.value(kVoiceSettingsCustomVolumeKey).toDouble() * 100)));
     }
     m_voiceSettingsSummary->setText(parts.join(QStringLiteral(", ")));

@@ -259,5 +259,77 @@
         <source>Dictation languages</source>
         <translation>Diktiersprachen</translation>
     </message>
+    <message id="SettingsSpeech">
+        <source>Speech</source>
+        <translation>Sprache</translation>
+    </message>
+    <message id="SettingsSystemVoiceName">
+        <source>System voice</source>
+        <translation>Systemstimme</translation>
+    </message>
+    <message id="SettingsSystemVoiceLabel">
+        <source>System &amp;voice:</source>
+        <translation>System&amp;stimme:</translation>
+    </message>
+    <message id="SettingsVoiceSettingsButton">
+        <source>Voice Settings…</source>
+        <translation>Stimmeinstellungen …</translation>
+    </message>
+    <message id="SettingsVoiceSettingsSheetButton">
+        <source>Voice Settings as Sheet…</source>
+        <translation>Stimmeinstellungen als Blatt …</translation>
+    </message>
+    <message id="SettingsDictationLanguageName">
+        <source>Dictation language</source>
+        <translation>Diktiersprache</translation>
+    </message>
+    <message id="SettingsRecognitionServiceName">
+        <source>Recognition service</source>
+        <translation>Erkennungsdienst</translation>
+    </message>
+    <message id="SettingsInstalledRecognizers">
+        <source>Installed recognizers</source>
+        <translation>Installierte Erkenner</translation>
+    </message>
+    <message id="SettingsNetworkService">
+        <source>Network service (English, German, French, Spanish, Japanese)</source>
+        <translation>Netzwerkdienst (Englisch, Deutsch, Französisch, Spanisch, Japanisch)</translation>
+    </message>
+    <message id="SettingsOfflineOnly">
+        <source>Offline only (English, German)</source>
+        <translation>Nur offline (Englisch, Deutsch)</translation>
+    </message>
+    <message id="SettingsLanguageLabel">
+        <source>&amp;Language:</source>
+        <translation>S&amp;prache:</translation>
+    </message>
+    <message id="SettingsDictation">
+        <source>Dictation</source>
+        <translation>Diktat</translation>
+    </message>
+    <message id="SettingsOfferLabel">
+        <source>&amp;Offer:</source>
+        <translation>&amp;Angebot:</translation>
+    </message>
+    <message id="SettingsReadingVoiceTitle">
+        <source>Reading Voice</source>
+        <translation>Vorlesestimme</translation>
+    </message>
+    <message id="SettingsReadingVoiceFormat">
+        <source>Reading voice: %1</source>
+        <translation>Vorlesestimme: %1</translation>
+    </message>
+    <message id="SettingsSystemVoiceText">
+        <source>system voice</source>
+        <translation>Systemstimme</translation>
+    </message>
+    <message id="SettingsRateFormat">
+        <source>rate %1 %</source>
+        <translation>Tempo %1 %</translation>
+    </message>
+    <message id="SettingsVolumeFormat">
+        <source>volume %1 %</source>
+        <translation>Lautstärke %1 %</translation>
+    </message>
 </context>
 </TS>

@@ -259,5 +259,77 @@
         <source>Dictation languages</source>
         <translation>Dictation languages</translation>
     </message>
+    <message id="SettingsSpeech">
+        <source>Speech</source>
+        <translation>Speech</translation>
+    </message>
+    <message id="SettingsSystemVoiceName">
+        <source>System voice</source>
+        <translation>System voice</translation>
+    </message>
+    <message id="SettingsSystemVoiceLabel">
+        <source>System &amp;voice:</source>
+        <translation>System &amp;voice:</translation>
+    </message>
+    <message id="SettingsVoiceSettingsButton">
+        <source>Voice Settings…</source>
+        <translation>Voice Settings…</translation>
+    </message>
+    <message id="SettingsVoiceSettingsSheetButton">
+        <source>Voice Settings as Sheet…</source>
+        <translation>Voice Settings as Sheet…</translation>
+    </message>
+    <message id="SettingsDictationLanguageName">
+        <source>Dictation language</source>
+        <translation>Dictation language</translation>
+    </message>
+    <message id="SettingsRecognitionServiceName">
+        <source>Recognition service</source>
+        <translation>Recognition service</translation>
+    </message>
+    <message id="SettingsInstalledRecognizers">
+        <source>Installed recognizers</source>
+        <translation>Installed recognizers</translation>
+    </message>
+    <message id="SettingsNetworkService">
+        <source>Network service (English, German, French, Spanish, Japanese)</source>
+        <translation>Network service (English, German, French, Spanish, Japanese)</translation>
+    </message>
+    <message id="SettingsOfflineOnly">
+        <source>Offline only (English, German)</source>
+        <translation>Offline only (English, German)</translation>
+    </message>
+    <message id="SettingsLanguageLabel">
+        <source>&amp;Language:</source>
+        <translation>&amp;Language:</translation>
+    </message>
+    <message id="SettingsDictation">
+        <source>Dictation</source>
+        <translation>Dictation</translation>
+    </message>
+    <message id="SettingsOfferLabel">
+        <source>&amp;Offer:</source>
+        <translation>&amp;Offer:</translation>
+    </message>
+    <message id="SettingsReadingVoiceTitle">
+        <source>Reading Voice</source>
+        <translation>Reading Voice</translation>
+    </message>
+    <message id="SettingsReadingVoiceFormat">
+        <source>Reading voice: %1</source>
+        <translation>Reading voice: %1</translation>
+    </message>
+    <message id="SettingsSystemVoiceText">
+        <source>system voice</source>
+        <translation>system voice</translation>
+    </message>
+    <message id="SettingsRateFormat">
+        <source>rate %1 %</source>
+        <translation>rate %1 %</translation>
+    </message>
+    <message id="SettingsVolumeFormat">
+        <source>volume %1 %</source>
+        <translation>volume %1 %</translation>
+    </message>
 </context>
 </TS>

@@ -1,0 +1,28 @@
+#!/usr/bin/env bash
+# Installs the build into a temporary prefix, validates the desktop entry and the AppStream metadata,
+# and builds and runs the example host application against the installed CMake package.
+# Usage: check-install.sh BUILD_DIR SOURCE_DIR
+set -euo pipefail
+build=$1
+source=$2
+work=$(mktemp -d)
+trap 'rm -rf "$work"' EXIT
+prefix="$work/prefix"
+
+cmake --install "$build" --prefix "$prefix" >/dev/null
+for f in lib/cmake/Cadenza/CadenzaConfig.cmake include/cadenza/voice-popup/CZVoicePopUpButton.h \
+         include/cadenza/cadenza_export.h bin/quillond bin/cadenza bin/cadenza-settings \
+         share/applications/org.cadenza.Settings.desktop share/metainfo/org.cadenza.Settings.metainfo.xml \
+         share/polkit-1/actions/org.cadenza.remove-speech-bundle.policy share/cadenza/SpeechDataDefaults.plist; do
+  [ -e "$prefix/$f" ] || { echo "not installed: $f" >&2; exit 1; }
+done
+if find "$prefix/include" -name '*_p.h' | grep -q .; then
+  echo "private headers were installed" >&2
+  exit 1
+fi
+desktop-file-validate "$prefix/share/applications/org.cadenza.Settings.desktop"
+appstreamcli validate --no-net --pedantic "$prefix/share/metainfo/org.cadenza.Settings.metainfo.xml"
+
+cmake -S "$source/examples/minimal-host" -B "$work/example" -DCMAKE_PREFIX_PATH="$prefix" >/dev/null
+cmake --build "$work/example" --parallel "$(nproc)" >/dev/null
+LD_LIBRARY_PATH="$prefix/lib" QT_QPA_PLATFORM=offscreen "$work/example/minimal-host" --check
