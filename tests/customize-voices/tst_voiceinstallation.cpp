@@ -12,6 +12,8 @@
 #include "platform/Services.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 
+#include <QAbstractItemView>
+#include <QBoxLayout>
 #include <QDialog>
 #include <QDir>
 #include <QLabel>
@@ -59,7 +61,15 @@ private Q_SLOTS:
         auto *spinner = new QProgressBar(&window);
         popUp->setDownloadStatusTextField(status);
         popUp->setDownloadStatusProgressIndicator(spinner);
-        window.resize(600, 400);
+        auto *layout = new QVBoxLayout(&window);
+        auto *statusRow = new QHBoxLayout;
+        spinner->setMaximumWidth(60);
+        statusRow->addWidget(spinner);
+        statusRow->addWidget(status, 1);
+        layout->addWidget(popUp);
+        layout->addLayout(statusRow);
+        layout->addStretch(1);
+        window.resize(520, 110);
         window.show();
         popUp->buildPopUpButtonWithSelectVoiceIdentifier(QString());
         QCOMPARE(popUp->findText(QStringLiteral("Femke")), -1);
@@ -91,6 +101,7 @@ private Q_SLOTS:
         QTRY_VERIFY_WITH_TIMEOUT(status->text().contains(QStringLiteral("remaining")), 10000);
         QVERIFY(spinner->isVisible());
         qInfo("status line: %s", qPrintable(status->text()));
+        saveScreenshot(&window, "voice-popup-status.png");
 
         // Installed from the repository; the menu lists the new voice and it can be chosen.
         QTRY_VERIFY_WITH_TIMEOUT(popUp->findText(QStringLiteral("Femke")) >= 0, 30000);
@@ -102,9 +113,25 @@ private Q_SLOTS:
         QVERIFY(popUp->sendAction());
         QCOMPARE(
             popUp->selectedVoiceAttributes()->value(QStringLiteral("VoiceIdentifier")).toString(), Femke);
+        saveScreenshot(&window, "voice-popup-closed.png");
+        popUp->showPopup();
+        QTRY_VERIFY(popUp->view()->isVisible());
+        saveScreenshot(popUp->view()->window(), "voice-popup-open.png");
+        popUp->hidePopup();
     }
 
 private:
+    // With CADENZA_SCREENSHOTS set to a folder, the windows are saved there as the test sees them.
+    static void saveScreenshot(QWidget *widget, const char *name)
+    {
+        const QString folder = qEnvironmentVariable("CADENZA_SCREENSHOTS");
+        if (folder.isEmpty()) {
+            return;
+        }
+        QDir().mkpath(folder);
+        QVERIFY(widget->grab().save(QDir(folder).filePath(QLatin1String(name))));
+    }
+
     std::unique_ptr<TestEnvironment> m_environment;
     std::unique_ptr<Testing::TestHttpServer> m_http;
     Testing::QuillondProcess m_daemon;
