@@ -1,6 +1,9 @@
 #include "SettingsWindow.h"
 
+#include "platform/DistributedNotificationCenter.h"
 #include "platform/LocalizationTable.h"
+#include "platform/PreferencesStore.h"
+#include "platform/Services.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-settings/SpeechSynthesizerVoiceSettings.h"
@@ -46,6 +49,7 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     m_voicePopUp->setDownloadStatusTextField(m_downloadStatus);
     m_voicePopUp->setDownloadStatusProgressIndicator(m_downloadIndicator);
     m_voicePopUp->setAccessibleName(text("SettingsSystemVoiceName"));
+    connect(m_voicePopUp, &CZVoicePopUpButton::voiceActivated, this, &SettingsWindow::systemVoiceChosen);
 
     auto *voiceLabel = new QLabel(text("SettingsSystemVoiceLabel"), this);
     voiceLabel->setBuddy(m_voicePopUp);
@@ -127,6 +131,25 @@ void SettingsWindow::rebuildLanguages()
         break;
     }
     m_languagePopUp->setEnabled(true); // the pop-up leaves enabling to its host
+}
+
+void SettingsWindow::systemVoiceChosen()
+{
+    const auto attributes = m_voicePopUp->selectedVoiceAttributes();
+    if (!attributes) {
+        return;
+    }
+    // The voice is stored by its creator and number, as the speech service reads it.
+    const QString domain = QStringLiteral("com.vendra.speech.voice.prefs");
+    Platform::PreferencesStore &preferences = Platform::Services::preferences();
+    preferences.setValue(QStringLiteral("SelectedVoiceCreator"), attributes->value(QStringLiteral("VoiceCreator")), domain);
+    preferences.setValue(QStringLiteral("SelectedVoiceID"), attributes->value(QStringLiteral("VoiceID")), domain);
+    preferences.setValue(QStringLiteral("SelectedVoiceName"), attributes->value(QStringLiteral("VoiceName")), domain);
+    if (!preferences.synchronize(domain)) {
+        qWarning("cadenza-settings: the system voice could not be saved");
+        return;
+    }
+    Platform::Services::notifications().postNotification(QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"));
 }
 
 void SettingsWindow::openVoiceSettingsWindow()

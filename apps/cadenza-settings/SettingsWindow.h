@@ -33,6 +33,8 @@ public:
     /// Receives the voice settings dialog's answer: a QVariantMap, or null when cancelled.
     Q_INVOKABLE void didEndWithVoiceSettings(const QVariant &settings);
 
+    /// Makes the voice chosen in the pop-up the user's system voice, for every process.
+    void systemVoiceChosen();
     void openVoiceSettingsWindow();
     void openVoiceSettingsSheet();
 
