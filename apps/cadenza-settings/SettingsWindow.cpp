@@ -142,19 +142,24 @@ void SettingsWindow::systemVoiceChosen()
     // The voice is stored by its creator and number, as the speech service reads it.
     const QString domain = QStringLiteral("com.vendra.speech.voice.prefs");
     Platform::PreferencesStore &preferences = Platform::Services::preferences();
-    preferences.setValue(QStringLiteral("SelectedVoiceCreator"), attributes->value(QStringLiteral("VoiceCreator")), domain);
-    preferences.setValue(QStringLiteral("SelectedVoiceID"), attributes->value(QStringLiteral("VoiceID")), domain);
-    preferences.setValue(QStringLiteral("SelectedVoiceName"), attributes->value(QStringLiteral("VoiceName")), domain);
+    preferences.setValue(
+        QStringLiteral("SelectedVoiceCreator"), attributes->value(QStringLiteral("VoiceCreator")), domain);
+    preferences.setValue(
+        QStringLiteral("SelectedVoiceID"), attributes->value(QStringLiteral("VoiceID")), domain);
+    preferences.setValue(
+        QStringLiteral("SelectedVoiceName"), attributes->value(QStringLiteral("VoiceName")), domain);
     if (!preferences.synchronize(domain)) {
         qWarning("cadenza-settings: the system voice could not be saved");
         return;
     }
-    Platform::Services::notifications().postNotification(QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"));
+    Platform::Services::notifications().postNotification(
+        QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"));
 }
 
 void SettingsWindow::openVoiceSettingsWindow()
 {
-    SpeechSynthesizerVoiceSettings::beginAlertForVoiceSettings(m_voiceSettings, this, text("SettingsReadingVoiceTitle"));
+    SpeechSynthesizerVoiceSettings::beginAlertForVoiceSettings(
+        m_voiceSettings, this, text("SettingsReadingVoiceTitle"));
 }
 
 void SettingsWindow::openVoiceSettingsSheet()
@@ -174,7 +179,8 @@ void SettingsWindow::showVoiceSettings()
 {
     QStringList parts;
     const QString voice = m_voiceSettings.value(kVoiceSettingsVoiceIdentifierKey).toString();
-    parts.append(text("SettingsReadingVoiceFormat").arg(voice.isEmpty() ? text("SettingsSystemVoiceText") : voice));
+    parts.append(
+        text("SettingsReadingVoiceFormat").arg(voice.isEmpty() ? text("SettingsSystemVoiceText") : voice));
     if (m_voiceSettings.contains(kVoiceSettingsCustomRelativeRateKey)) {
         parts.append(
             text("SettingsRateFormat")
