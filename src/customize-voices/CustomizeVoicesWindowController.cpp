@@ -25,7 +25,6 @@
 #include <QDialog>
 #include <QFile>
 #include <QHeaderView>
-#include <QKeyEvent>
 #include <QLabel>
 #include <QLineEdit>
 #include <QLocale>
@@ -94,7 +93,6 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
     m_voiceSelectionTableView->verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
     m_voiceSelectionTableView->verticalHeader()->setDefaultSectionSize(
         VoiceTableCellView().sizeHint().height());
-    m_voiceSelectionTableView->installEventFilter(this);
 
     connect(m_okButton, &QPushButton::clicked, this, &CustomizeVoicesWindowController::acceptVoiceSelection);
     connect(
@@ -117,20 +115,6 @@ CustomizeVoicesWindowController::~CustomizeVoicesWindowController()
     _stopAndResetAllVoicePlaying();
     delete m_rowViews; // before the table it works on
     delete m_window;
-}
-
-bool CustomizeVoicesWindowController::eventFilter(QObject *watched, QEvent *event)
-{
-    if (watched == m_voiceSelectionTableView && event->type() == QEvent::KeyPress
-        && static_cast<QKeyEvent *>(event)->key() == Qt::Key_Space) {
-        // Space ticks the current voice, as a click on its checkbox would.
-        const int row = m_voiceSelectionTableView->currentIndex().row();
-        if (VoiceTableCellView *view = existingViewForRow(row); view && view->activeCheckbox()->isEnabled()) {
-            view->activeCheckbox()->click();
-            return true;
-        }
-    }
-    return QObject::eventFilter(watched, event);
 }
 
 QList<VoiceTableRowPtr> CustomizeVoicesWindowController::currentlyDisplayedVoiceRows()

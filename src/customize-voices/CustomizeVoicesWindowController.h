@@ -104,9 +104,6 @@ Q_SIGNALS:
     /// The sheet ended: accepted with OK (after any delete alert), or cancelled.
     void sheetEnded(bool accepted);
 
-protected:
-    bool eventFilter(QObject *watched, QEvent *event) override;
-
 private:
     void fillRowView(VoiceTableCellView *view, const VoiceTableRowPtr &row);
     [[nodiscard]] int displayedRowOfVoice(const QString &identifier) const;

@@ -2,7 +2,8 @@
 
 #include "RecyclingItemDelegate.h"
 
-#include <QEvent>
+#include <QAbstractButton>
+#include <QKeyEvent>
 #include <QScrollBar>
 #include <QTableView>
 #include <QTimer>
@@ -17,6 +18,7 @@ VisibleRowViews::VisibleRowViews(QTableView *table, Filler filler, QObject *pare
     // The table lets go of its index widgets on scrolling out and on every reset; keep them.
     table->setItemDelegate(new RecyclingItemDelegate([this](QWidget *view) { recycle(view); }, this));
     table->viewport()->installEventFilter(this);
+    table->installEventFilter(this);
     connect(table->verticalScrollBar(), &QScrollBar::valueChanged, this, &VisibleRowViews::sync);
     connect(table->model(), &QAbstractItemModel::modelReset, this, [this] {
         m_views.clear();
@@ -36,7 +38,16 @@ VisibleRowViews::~VisibleRowViews()
 
 bool VisibleRowViews::eventFilter(QObject *watched, QEvent *event)
 {
-    if (event->type() == QEvent::Resize || event->type() == QEvent::Show) {
+    if (watched == m_table && event->type() == QEvent::KeyPress
+        && static_cast<QKeyEvent *>(event)->key() == Qt::Key_Space) {
+        // Space ticks the current row, as a click on its checkbox (the view's focus proxy) would.
+        QWidget *view = viewForRow(m_table->currentIndex().row());
+        auto *tick = view ? qobject_cast<QAbstractButton *>(view->focusProxy()) : nullptr;
+        if (tick && tick->isEnabled()) {
+            tick->click();
+            return true;
+        }
+    } else if (watched != m_table && (event->type() == QEvent::Resize || event->type() == QEvent::Show)) {
         QTimer::singleShot(0, this, &VisibleRowViews::sync);
     }
     return QObject::eventFilter(watched, event);

@@ -19,6 +19,8 @@ namespace Cadenza::Platform {
  * scroll in and go as they scroll out or the model resets. Views that go are kept and handed to the
  * next row that needs one, so a table of 10,000 rows costs a screenful of widgets.
  *
+ * Space in the table ticks the current row: it clicks the row view's focus proxy when that is a button.
+ *
  * The filler gets the row and a spare view to fill (null when there is none, then it makes one); it
  * returns the view, or null for rows that are drawn by the table itself.
  */

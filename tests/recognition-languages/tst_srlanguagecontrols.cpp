@@ -310,6 +310,18 @@ private Q_SLOTS:
                     ->text()
                     .isEmpty());
 
+        // Space ticks the current row from the keyboard.
+        QTableView *table = sheet.selectionTableView();
+        table->setFocus();
+        table->setCurrentIndex(table->model()->index(1, 0)); // United States
+        const bool ticked = sheet.currentlyDisplayedRows().at(1)->isSelected();
+        QTest::keyClick(table, Qt::Key_Space);
+        QCOMPARE(sheet.currentlyDisplayedRows().at(1)->isSelected(), !ticked);
+        QCOMPARE(sheet.existingViewForRow(1)->activeCheckbox()->isChecked(), !ticked);
+        table->setCurrentIndex(table->model()->index(5, 0)); // Germany: outside the network list
+        QTest::keyClick(table, Qt::Key_Space);
+        QVERIFY(!sheet.currentlyDisplayedRows().at(5)->isSelected()); // greyed rows do not tick
+
         // A tick on a row the filter then hides is not saved.
         CZSRLanguageRowCheckboxButton *english = sheet.existingViewForRow(1)->activeCheckbox();
         const bool before = english->isChecked();
