@@ -1,5 +1,7 @@
 #include "FilePreferencesStore.h"
 
+#include "FileLock.h"
+
 #include "Logging.h"
 #include "Paths.h"
 #include "PropertyList.h"
@@ -7,7 +9,6 @@
 #include <QDateTime>
 #include <QDir>
 #include <QFile>
-#include <QLockFile>
 #include <QSaveFile>
 
 #include <sys/stat.h>
@@ -141,10 +142,11 @@ bool FilePreferencesStore::synchronize(const QString &domain)
         qCWarning(lcPreferences, "Cannot create the preferences folder for %s", qPrintable(path));
         return false;
     }
-    QLockFile lock(path + QStringLiteral(".lock"));
-    lock.setStaleLockTime(30000);
-    if (!lock.tryLock(10000)) {
-        qCWarning(lcPreferences, "Timed out waiting for the lock of %s", qPrintable(path));
+    // A hidden lock file beside the domain's file; it stays, as the lock is the kernel's, not the file's.
+    const QFileInfo info(path);
+    FileLock lock(info.absolutePath() + QStringLiteral("/.") + info.fileName() + QStringLiteral(".lock"));
+    if (!lock.lock()) {
+        qCWarning(lcPreferences, "Cannot lock %s: %s", qPrintable(path), qPrintable(lock.errorString()));
         return false;
     }
     // Merge onto the file as it is now, so keys written meanwhile by other processes survive.

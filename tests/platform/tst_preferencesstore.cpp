@@ -160,9 +160,12 @@ private Q_SLOTS:
             store.setValue(QStringLiteral("k%1").arg(i), i, Domain);
             QVERIFY(store.synchronize(Domain));
         }
-        const QStringList files
-            = QDir(environment.path(QStringLiteral("prefs"))).entryList(QDir::Files | QDir::Hidden);
-        QCOMPARE(files, QStringList {Domain + QStringLiteral(".plist")});
+        // The domain's file and its lock file (which stays, empty, for the next writer); nothing else.
+        const QStringList files = QDir(environment.path(QStringLiteral("prefs")))
+                                      .entryList(QDir::Files | QDir::Hidden, QDir::Name);
+        QCOMPARE(files,
+            QStringList({QStringLiteral(".") + Domain + QStringLiteral(".plist.lock"),
+                Domain + QStringLiteral(".plist")}));
     }
 
     void externalChangeIsSeenWithoutSynchronize()
