@@ -24,6 +24,20 @@
 
 Q_LOGGING_CATEGORY(lcJob, "quillond.installation", QtInfoMsg)
 
+namespace {
+// Fault tests set QUILLOND_STALL_BEFORE to "verifying", "unpacking" or "renaming" to hold every job at
+// that point for ever, so that they can kill the daemon exactly there. Unset in use.
+bool stallsBefore(const char *stage)
+{
+    static const QByteArray stall = qgetenv("QUILLOND_STALL_BEFORE");
+    if (stall != stage) {
+        return false;
+    }
+    qCWarning(lcJob, "Stalled before %s (QUILLOND_STALL_BEFORE)", stage);
+    return true;
+}
+} // namespace
+
 namespace Quillond {
 
 using namespace Cadenza::InstallerProtocol;
@@ -151,6 +165,9 @@ void InstallationJob::downloadFinished(bool succeeded)
         return;
     }
     m_received = download->receivedBytes();
+    if (stallsBefore("verifying")) {
+        return;
+    }
     m_phase = Phase::Verifying;
     // Nothing is unpacked unless it is exactly the file the catalogue describes.
     if (m_received != m_package.byteSize) {
@@ -181,6 +198,9 @@ void InstallationJob::install()
     }
     staging.setAutoRemove(false);
     m_stagingPath = staging.path();
+    if (stallsBefore("unpacking")) {
+        return;
+    }
     const QString archive = m_downloadPath;
     const QString stagingPath = m_stagingPath;
     const QString bundleName = m_package.bundleName;
@@ -205,6 +225,9 @@ void InstallationJob::installFinished(const QString &error)
     }
     if (!error.isEmpty()) {
         finish(Outcome::Failed, error);
+        return;
+    }
+    if (stallsBefore("renaming")) {
         return;
     }
     const QString built = m_stagingPath + QLatin1Char('/') + m_package.bundleName;

@@ -5,13 +5,29 @@
 
 #include <QTest>
 
+#include <cstdio>
 #include <signal.h>
 
 namespace Cadenza::Testing {
 
-bool QuillondProcess::start(const QStringList &arguments)
+QuillondProcess::QuillondProcess()
 {
-    m_process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
+    // The daemon's log is kept for waitForLog() and also shown, as the test's own output.
+    QObject::connect(&m_process, &QProcess::readyReadStandardError, &m_process, [this] {
+        const QByteArray bytes = m_process.readAllStandardError();
+        m_log += QString::fromLocal8Bit(bytes);
+        std::fwrite(bytes.constData(), 1, size_t(bytes.size()), stderr);
+    });
+}
+
+bool QuillondProcess::start(const QStringList &arguments, const QStringList &environment)
+{
+    QProcessEnvironment variables = QProcessEnvironment::systemEnvironment();
+    for (const QString &entry : environment) {
+        variables.insert(entry.section(QLatin1Char('='), 0, 0), entry.section(QLatin1Char('='), 1));
+    }
+    m_process.setProcessEnvironment(variables);
+    m_log.clear();
     m_process.start(QStringLiteral(QUILLOND_PATH), arguments);
     if (!m_process.waitForStarted(5000)) {
         return false;
@@ -19,6 +35,11 @@ bool QuillondProcess::start(const QStringList &arguments)
     Platform::UnixMessagePortService ports;
     return QTest::qWaitFor(
         [&] { return ports.createRemotePort(InstallerProtocol::LivenessPortName) != nullptr; }, 5000);
+}
+
+bool QuillondProcess::waitForLog(const QString &text, int milliseconds)
+{
+    return QTest::qWaitFor([&] { return m_log.contains(text); }, milliseconds);
 }
 
 void QuillondProcess::kill()

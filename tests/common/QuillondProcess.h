@@ -10,10 +10,14 @@ namespace Cadenza::Testing {
 class QuillondProcess
 {
 public:
+    QuillondProcess();
     ~QuillondProcess() { terminate(); }
 
     /// Starts the daemon and waits up to 5 s for it to serve; false when it does not.
-    [[nodiscard]] bool start(const QStringList &arguments);
+    /// @p environment adds variables ("NAME=value") to the test's own.
+    [[nodiscard]] bool start(const QStringList &arguments, const QStringList &environment = {});
+    /// Waits up to @p milliseconds for @p text in what the daemon has logged.
+    [[nodiscard]] bool waitForLog(const QString &text, int milliseconds = 10000);
     /// Kills it without warning, as a crash would.
     void kill();
     /// Asks it to stop and waits for it.
@@ -21,6 +25,7 @@ public:
 
 private:
     QProcess m_process;
+    QString m_log;
 };
 
 } // namespace Cadenza::Testing

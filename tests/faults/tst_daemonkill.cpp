@@ -1,0 +1,110 @@
+// quillond killed with SIGKILL at each stage of an installation, then started again: the bundle is
+// wholly there or absent, nothing temporary is left, and the client carries on.
+#include "QuillondProcess.h"
+#include "TestEnvironment.h"
+#include "TestHttpServer.h"
+
+#include "installation/CZSpeechInstallationManager.h"
+#include "platform/Paths.h"
+
+#include <QDir>
+#include <QDirIterator>
+#include <QElapsedTimer>
+#include <QTest>
+
+using namespace Cadenza;
+
+namespace {
+const QString FemkeTag = QStringLiteral("VOICEID:com.vendra.speech.synthesis.voice.femke.compact");
+
+QStringList leftovers()
+{
+    QStringList found;
+    for (const QString &folder : {Platform::Paths::userVoicesFolder(), Platform::Paths::cacheFolder()}) {
+        QDirIterator it(
+            folder, QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot, QDirIterator::Subdirectories);
+        while (it.hasNext()) {
+            const QString path = it.next();
+            if (path.contains(QStringLiteral(".quillond-staging-"))
+                || path.endsWith(QStringLiteral(".part"))) {
+                found.append(path);
+            }
+        }
+    }
+    return found;
+}
+
+QString femkeBundle()
+{
+    return Platform::Paths::userVoicesFolder() + QStringLiteral("/FemkeCompact.SpeechVoice");
+}
+} // namespace
+
+class DaemonKillTest : public QObject
+{
+    Q_OBJECT
+private Q_SLOTS:
+    void killedAtEachStage_data()
+    {
+        QTest::addColumn<QString>("stage");
+        QTest::newRow("downloading") << QStringLiteral("downloading");
+        QTest::newRow("verifying") << QStringLiteral("verifying");
+        QTest::newRow("unpacking") << QStringLiteral("unpacking");
+        QTest::newRow("renaming") << QStringLiteral("renaming");
+    }
+    void killedAtEachStage()
+    {
+        QFETCH(QString, stage);
+        Testing::TestEnvironment environment;
+        Testing::TestHttpServer http(QStringLiteral(CADENZA_SAMPLE_REPOSITORY));
+        QVERIFY(http.listen());
+        const QStringList repository {QStringLiteral("--repository"), http.baseUrl().toString()};
+        CZSpeechInstallationManager manager;
+
+        Testing::QuillondProcess daemon;
+        if (stage == u"downloading") {
+            http.setBytesPerSecond(50); // the download is still running when the daemon dies
+            QVERIFY(daemon.start(repository));
+        } else {
+            QVERIFY(daemon.start(repository, {QStringLiteral("QUILLOND_STALL_BEFORE=") + stage}));
+        }
+        QVERIFY(manager._requestInstallation(FemkeTag, QStringLiteral("Femke"), 696,
+            QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"), 0));
+        if (stage == u"downloading") {
+            QTRY_VERIFY_WITH_TIMEOUT(!leftovers().isEmpty(), 10000); // the partial download
+        } else {
+            QVERIFY(daemon.waitForLog(QStringLiteral("Stalled before ") + stage));
+        }
+        if (stage == u"renaming") {
+            // Fully unpacked in the staging folder, not yet in place.
+            const QStringList staged = leftovers();
+            QVERIFY2(std::any_of(staged.cbegin(), staged.cend(),
+                         [](const QString &path) {
+                             return path.endsWith(QStringLiteral("/FemkeCompact.SpeechVoice"));
+                         }),
+                qPrintable(staged.join(u' ')));
+        }
+        daemon.kill();
+        QVERIFY(!QFileInfo::exists(femkeBundle())); // absent, not half there
+
+        // Without the daemon the client answers at once, with nothing.
+        QElapsedTimer clock;
+        clock.start();
+        QVERIFY(manager.activeInstallations().isEmpty());
+        QVERIFY(clock.elapsed() < 3000);
+
+        // The next daemon clears what was left; asking again installs the voice whole.
+        http.setBytesPerSecond(0);
+        Testing::QuillondProcess next;
+        QVERIFY(next.start(repository));
+        QVERIFY2(leftovers().isEmpty(), qPrintable(leftovers().join(u' ')));
+        QVERIFY(manager._requestInstallation(FemkeTag, QStringLiteral("Femke"), 696,
+            QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"), 0));
+        QTRY_VERIFY_WITH_TIMEOUT(QFileInfo::exists(femkeBundle() + QStringLiteral("/Info.plist")), 10000);
+        QTRY_VERIFY_WITH_TIMEOUT(manager.activeInstallations().isEmpty(), 10000);
+        QVERIFY(leftovers().isEmpty());
+    }
+};
+
+QTEST_GUILESS_MAIN(DaemonKillTest)
+#include "tst_daemonkill.moc"
