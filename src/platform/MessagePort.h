@@ -73,8 +73,11 @@ public:
 struct CADENZACORE_EXPORT LocalPortLimits
 {
     qsizetype maximumFrameBytes = 16 * 1024 * 1024;
-    int maximumConnections = 64;
+    /// Room for many idle peers: connections that say nothing are closed after maximumIdleMilliseconds,
+    /// so they cannot keep the port from the clients that do talk.
+    int maximumConnections = 512;
     int maximumPendingRequests = 256; ///< per connection; beyond it the connection is closed
+    int maximumIdleMilliseconds = 20000;
 };
 
 /// Makes message ports. Names are of letters, digits, '.', '-' and '_' only.

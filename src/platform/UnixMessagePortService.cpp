@@ -11,6 +11,7 @@
 #include <QLocalServer>
 #include <QLocalSocket>
 #include <QPointer>
+#include <QTimer>
 
 #include <cerrno>
 #include <cstring>
@@ -227,7 +228,20 @@ private:
             m_connections.insert(socket,
                 {MessageFrameReader(m_limits.maximumFrameBytes),
                     {qint64(credentials.pid), qint64(credentials.uid)}});
-            connect(socket, &QLocalSocket::readyRead, this, [this, socket] { receive(socket); });
+            auto *idle = new QTimer(socket);
+            idle->setObjectName(QStringLiteral("idle"));
+            idle->setSingleShot(true);
+            idle->setInterval(m_limits.maximumIdleMilliseconds);
+            connect(idle, &QTimer::timeout, this, [this, socket] {
+                qCInfo(lcPorts, "Port %s closed a connection that stayed silent", qPrintable(m_name));
+                socket->abort();
+                drop(socket);
+            });
+            idle->start();
+            connect(socket, &QLocalSocket::readyRead, this, [this, socket, idle] {
+                idle->start(); // it talks: not idle
+                receive(socket);
+            });
             connect(socket, &QLocalSocket::disconnected, this, [this, socket] { drop(socket); });
             if (socket->bytesAvailable() > 0) {
                 receive(socket);
