@@ -107,6 +107,11 @@ std::optional<PackageCatalogue> PackageCatalogue::load(const QString &path, QStr
         *error = QStringLiteral("the catalogue is not a dictionary");
         return std::nullopt;
     }
+    // A catalogue without a dictionary of packages is broken, not empty: serving nothing would hide it.
+    if (parsed->toMap().value(QStringLiteral("Packages")).typeId() != QMetaType::QVariantMap) {
+        *error = QStringLiteral("the catalogue has no dictionary \"Packages\"");
+        return std::nullopt;
+    }
     return fromDictionary(parsed->toMap());
 }
 
