@@ -11,6 +11,7 @@
 #include "platform/LocalizationTable.h"
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
+#include "platform/SizeVariants.h"
 #include "platform/VisibleRowViews.h"
 #include "platform/VoiceDescription.h"
 #include "speech-items/CZSpeechItem.h"
@@ -211,12 +212,14 @@ std::shared_ptr<DownloadableVoice> CustomizeVoicesWindowController::downloadable
     if (voice->isDownloadable()) {
         return std::static_pointer_cast<DownloadableVoice>(voice);
     }
-    return manager().downloadableVoiceUpgradeForVoice(*voice, manager().downloadableVoices());
+    // The list of the last rebuild: asking the manager again would ask the daemon again, per row.
+    return manager().downloadableVoiceUpgradeForVoice(*voice, m_downloadableVoices);
 }
 
 void CustomizeVoicesWindowController::_rebuildVoiceList()
 {
-    const QList<DownloadableVoicePtr> downloadables = manager().downloadableVoices();
+    m_downloadableVoices = manager().downloadableVoices();
+    const QList<DownloadableVoicePtr> &downloadables = m_downloadableVoices;
     const QStringList installed = m_showIndividualVoiceQualities
         ? SpeechSynthesizer::allVoices()
         : SpeechSynthesizer::avaliableMainstreamVoices();
@@ -388,18 +391,8 @@ void CustomizeVoicesWindowController::_setRowStatusFieldView(
             ? static_cast<const DownloadableVoice *>(voiceObject.get())
             : nullptr;
         if (downloadable && !downloadable->fullSizeBundleIdentifier().isEmpty()) {
-            variantPopUpButton->setItemText(0,
-                texts().text(QStringLiteral("DownloadVariantCompactItem")) + QStringLiteral(" (")
-                    + CZSpeechItem::displayStringForByteSize(downloadable->byteSize()) + QLatin1Char(')'));
-            variantPopUpButton->setItemText(1,
-                texts().text(QStringLiteral("DownloadVariantFullSizeItem")) + QStringLiteral(" (")
-                    + CZSpeechItem::displayStringForByteSize(downloadable->fullSizeByteSize())
-                    + QLatin1Char(')'));
-            // Both items name the voice; the tag says which size.
-            variantPopUpButton->setItemData(0, voiceObject->identifier(), Qt::UserRole + 1);
-            variantPopUpButton->setItemData(1, voiceObject->identifier(), Qt::UserRole + 1);
-            variantPopUpButton->setCurrentIndex(downloadable->downloadFullSize() ? 1 : 0);
-            variantPopUpButton->show();
+            Platform::SizeVariants::show(variantPopUpButton, voiceObject->identifier(),
+                downloadable->byteSize(), downloadable->fullSizeByteSize(), downloadable->downloadFullSize());
         }
     }
     statusField->setText(text);
@@ -515,13 +508,13 @@ void CustomizeVoicesWindowController::_propagateDownloadCheckboxSelection(CZVoic
 void CustomizeVoicesWindowController::_propagateDownloadVariantSelection(QComboBox *sender, int index)
 {
     QMutexLocker locker(&m_lock);
-    const QString identifier = sender->itemData(index, Qt::UserRole + 1).toString();
+    const QString identifier = Platform::SizeVariants::identifier(sender, index);
     const int row = displayedRowOfVoice(identifier);
     if (row >= 0) {
         const CZVoiceObjectPtr voice = m_currentlyDisplayedVoiceRows.at(row)->voiceObject();
         if (voice->isDownloadable()) {
             std::static_pointer_cast<DownloadableVoice>(voice)->setDownloadFullSize(
-                sender->itemData(index).toInt() > 0);
+                Platform::SizeVariants::isFullSize(sender, index));
         }
         sender->setCurrentIndex(index);
         m_okButton->setEnabled(true);

@@ -128,6 +128,7 @@ private:
     QAudioOutput *m_audioOutput = nullptr;
     QBuffer *m_audioData = nullptr;
     QList<CZVoiceObjectPtr> m_allVoicesObjects;
+    QList<std::shared_ptr<class DownloadableVoice>> m_downloadableVoices; ///< as of the last rebuild
     QList<VoiceTableRowPtr> m_currentlyDisplayedVoiceRows;
     QSet<QString> m_markedForUpgradeSet;
     QSet<QString> m_markedForDeletionSet;

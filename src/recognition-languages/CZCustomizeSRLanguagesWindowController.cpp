@@ -6,6 +6,7 @@
 #include "platform/DistributedNotificationCenter.h"
 #include "platform/LocalizationTable.h"
 #include "platform/Services.h"
+#include "platform/SizeVariants.h"
 #include "platform/VisibleRowViews.h"
 #include "recognition-languages/CZSRLanguageRowCheckboxButton.h"
 #include "recognition-languages/CZSRLanguageRowTextView.h"
@@ -33,7 +34,6 @@ namespace Cadenza {
 namespace {
 const QString DoCancelListeningNotification = QStringLiteral("DictationIMObservationDoCancelListening");
 constexpr int StatusPollMilliseconds = 2000;
-constexpr int LocaleRole = Qt::UserRole + 1; // the variant items' locale; Qt::UserRole holds the tag
 
 const Platform::LocalizationTable &texts()
 {
@@ -310,17 +310,8 @@ void CZCustomizeSRLanguagesWindowController::_setRowStatusFieldView(QLabel *stat
         if (isSelected) {
             text = texts().text(QStringLiteral("DownloadStatusTextRequiredItemFormat"));
             if (!speechItem->fullSizeBundleIdentifier().isEmpty()) {
-                variantPopUpButton->setItemText(0,
-                    texts().text(QStringLiteral("DownloadVariantCompactItem")) + QStringLiteral(" (")
-                        + CZSpeechItem::displayStringForByteSize(speechItem->byteSize()) + QLatin1Char(')'));
-                variantPopUpButton->setItemText(1,
-                    texts().text(QStringLiteral("DownloadVariantFullSizeItem")) + QStringLiteral(" (")
-                        + CZSpeechItem::displayStringForByteSize(speechItem->fullSizeByteSize())
-                        + QLatin1Char(')'));
-                variantPopUpButton->setItemData(0, speechItem->localeIdentifier(), LocaleRole);
-                variantPopUpButton->setItemData(1, speechItem->localeIdentifier(), LocaleRole);
-                variantPopUpButton->setCurrentIndex(speechItem->downloadFullSize() ? 1 : 0);
-                variantPopUpButton->show();
+                Platform::SizeVariants::show(variantPopUpButton, speechItem->localeIdentifier(),
+                    speechItem->byteSize(), speechItem->fullSizeByteSize(), speechItem->downloadFullSize());
             }
         }
         break;
@@ -378,7 +369,7 @@ void CZCustomizeSRLanguagesWindowController::_propagateDownloadVariantSelection(
 {
     {
         QMutexLocker locker(&m_lock);
-        const int row = displayedRowOfLocale(sender->itemData(index, LocaleRole).toString());
+        const int row = displayedRowOfLocale(Platform::SizeVariants::identifier(sender, index));
         if (row >= 0) {
             m_currentlyDisplayedRows.at(row)->srLanguageItem()->setDownloadFullSize(
                 sender->itemData(index).toInt() > 0);

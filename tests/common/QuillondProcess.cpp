@@ -1,7 +1,10 @@
 #include "QuillondProcess.h"
 
 #include "installation/InstallerProtocol.h"
+#include "platform/Paths.h"
 #include "platform/UnixMessagePortService.h"
+
+#include <QDirIterator>
 
 #include <QTest>
 
@@ -40,6 +43,24 @@ bool QuillondProcess::start(const QStringList &arguments, const QStringList &env
 bool QuillondProcess::waitForLog(const QString &text, int milliseconds)
 {
     return QTest::qWaitFor([&] { return m_log.contains(text); }, milliseconds);
+}
+
+QStringList QuillondProcess::leftovers()
+{
+    QStringList found;
+    for (const QString &folder : {Platform::Paths::userVoicesFolder(),
+             Platform::Paths::userRecognizersFolder(), Platform::Paths::cacheFolder()}) {
+        QDirIterator it(
+            folder, QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot, QDirIterator::Subdirectories);
+        while (it.hasNext()) {
+            const QString path = it.next();
+            if (path.contains(QStringLiteral(".quillond-staging-"))
+                || path.endsWith(QStringLiteral(".part"))) {
+                found.append(path);
+            }
+        }
+    }
+    return found;
 }
 
 void QuillondProcess::kill()

@@ -22,6 +22,9 @@ public:
     void kill();
     /// Asks it to stop and waits for it.
     void terminate();
+    /// What a daemon leaves behind when it stops half way: partial downloads and staging folders in
+    /// the user's voice, recognizer and cache folders.
+    [[nodiscard]] static QStringList leftovers();
 
 private:
     QProcess m_process;

@@ -15,7 +15,6 @@
 #include <QCryptographicHash>
 #include <QDBusConnection>
 #include <QDir>
-#include <QDirIterator>
 #include <QLocalSocket>
 #include <QProcess>
 #include <QRandomGenerator>
@@ -42,23 +41,6 @@ QString voicesFolder()
 }
 
 /// Files that an installation may leave only while it runs.
-QStringList leftovers()
-{
-    QStringList found;
-    for (const QString &folder : {Platform::Paths::userVoicesFolder(),
-             Platform::Paths::userRecognizersFolder(), Platform::Paths::cacheFolder()}) {
-        QDirIterator it(
-            folder, QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot, QDirIterator::Subdirectories);
-        while (it.hasNext()) {
-            const QString path = it.next();
-            if (path.contains(QStringLiteral(".quillond-staging-"))
-                || path.endsWith(QStringLiteral(".part"))) {
-                found.append(path);
-            }
-        }
-    }
-    return found;
-}
 
 } // namespace
 
@@ -112,14 +94,14 @@ private Q_SLOTS:
             QCOMPARE(namesForThisVoice(),
                 QStringList({StartedInstallationNotification, FinishedInstallationNotification}));
         }
-        QVERIFY(leftovers().isEmpty());
+        QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
 
         // Installing again replaces the bundle in one step.
         QVERIFY(m_manager->_requestInstallation(
             QStringLiteral("VOICEID:") + voice, QStringLiteral("Jonas"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion));
         QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/JonasPremium.SpeechVoice/Info.plist")));
-        QVERIFY(leftovers().isEmpty());
+        QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
     }
 
     void progressIsReportedWhileDownloading()
@@ -178,7 +160,7 @@ private Q_SLOTS:
         QCOMPARE(m_finished->at(1).at(1).toInt(), int(CancelledCompletion));
         QVERIFY(!QFile::exists(voicesFolder() + QStringLiteral("/Big.SpeechVoice")));
         QVERIFY(!QFile::exists(voicesFolder() + QStringLiteral("/Small.SpeechVoice")));
-        QTRY_VERIFY(leftovers().isEmpty());
+        QTRY_VERIFY(Testing::QuillondProcess::leftovers().isEmpty());
     }
 
     void wrongChecksumsAndUnknownTagsFail()
@@ -193,7 +175,7 @@ private Q_SLOTS:
                     .toString()
                     .startsWith(QStringLiteral("checksum")));
         QVERIFY(!QFile::exists(voicesFolder() + QStringLiteral("/Big.SpeechVoice")));
-        QVERIFY(leftovers().isEmpty());
+        QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
 
         QVERIFY(request(QStringLiteral("VOICEID:no.such.voice")));
         QVERIFY(waitForCompletions(2));
@@ -247,7 +229,7 @@ private Q_SLOTS:
         // The next daemon clears what the killed one left, and the client finds it again.
         m_http->setBytesPerSecond(0);
         startTestDaemon();
-        QVERIFY(leftovers().isEmpty());
+        QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
         QVERIFY(request(SmallTag));
         QVERIFY(waitForCompletion(InstalledCompletion));
         QCOMPARE(m_finished->last().at(0).toString(), SmallTag);

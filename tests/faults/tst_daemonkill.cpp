@@ -8,7 +8,6 @@
 #include "platform/Paths.h"
 
 #include <QDir>
-#include <QDirIterator>
 #include <QElapsedTimer>
 #include <QTest>
 
@@ -16,23 +15,6 @@ using namespace Cadenza;
 
 namespace {
 const QString FemkeTag = QStringLiteral("VOICEID:com.vendra.speech.synthesis.voice.femke.compact");
-
-QStringList leftovers()
-{
-    QStringList found;
-    for (const QString &folder : {Platform::Paths::userVoicesFolder(), Platform::Paths::cacheFolder()}) {
-        QDirIterator it(
-            folder, QDir::AllEntries | QDir::Hidden | QDir::NoDotAndDotDot, QDirIterator::Subdirectories);
-        while (it.hasNext()) {
-            const QString path = it.next();
-            if (path.contains(QStringLiteral(".quillond-staging-"))
-                || path.endsWith(QStringLiteral(".part"))) {
-                found.append(path);
-            }
-        }
-    }
-    return found;
-}
 
 QString femkeBundle()
 {
@@ -71,13 +53,14 @@ private Q_SLOTS:
         QVERIFY(manager._requestInstallation(FemkeTag, QStringLiteral("Femke"), 696,
             QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"), 0));
         if (stage == u"downloading") {
-            QTRY_VERIFY_WITH_TIMEOUT(!leftovers().isEmpty(), 10000); // the partial download
+            QTRY_VERIFY_WITH_TIMEOUT(
+                !Testing::QuillondProcess::leftovers().isEmpty(), 10000); // the partial download
         } else {
             QVERIFY(daemon.waitForLog(QStringLiteral("Stalled before ") + stage));
         }
         if (stage == u"renaming") {
             // Fully unpacked in the staging folder, not yet in place.
-            const QStringList staged = leftovers();
+            const QStringList staged = Testing::QuillondProcess::leftovers();
             QVERIFY2(std::any_of(staged.cbegin(), staged.cend(),
                          [](const QString &path) {
                              return path.endsWith(QStringLiteral("/FemkeCompact.SpeechVoice"));
@@ -97,12 +80,13 @@ private Q_SLOTS:
         http.setBytesPerSecond(0);
         Testing::QuillondProcess next;
         QVERIFY(next.start(repository));
-        QVERIFY2(leftovers().isEmpty(), qPrintable(leftovers().join(u' ')));
+        QVERIFY2(Testing::QuillondProcess::leftovers().isEmpty(),
+            qPrintable(Testing::QuillondProcess::leftovers().join(u' ')));
         QVERIFY(manager._requestInstallation(FemkeTag, QStringLiteral("Femke"), 696,
             QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"), 0));
         QTRY_VERIFY_WITH_TIMEOUT(QFileInfo::exists(femkeBundle() + QStringLiteral("/Info.plist")), 10000);
         QTRY_VERIFY_WITH_TIMEOUT(manager.activeInstallations().isEmpty(), 10000);
-        QVERIFY(leftovers().isEmpty());
+        QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
     }
 };
 
