@@ -4,6 +4,7 @@
 #include "Download.h"
 
 #include "installation/InstallerProtocol.h"
+#include "platform/KeyedArchive.h"
 
 #include <QCryptographicHash>
 #include <QDateTime>
@@ -314,6 +315,24 @@ QVariantMap InstallationJob::statusRecord() const
     record.insert(ItemDownloadByteCountKey, QVariant::fromValue<quint64>(m_received));
     record.insert(ItemDownloadStartRefTimeKey, running ? m_startReferenceTime : 0.0);
     return record;
+}
+
+QByteArray InstallationJob::archivedStatusRecord() const
+{
+    if (m_phase == Phase::Waiting && !m_archivedWaitingRecord.isEmpty()) {
+        return m_archivedWaitingRecord;
+    }
+    QString error;
+    const auto archived = Cadenza::Platform::KeyedArchive::encodeItem(statusRecord(), &error);
+    if (!archived) {
+        // Only numbers and strings go into a record, so this is a programming error.
+        qCWarning(lcJob, "Cannot archive the status of %s: %s", qPrintable(m_package.tag), qPrintable(error));
+        return {};
+    }
+    if (m_phase == Phase::Waiting) {
+        m_archivedWaitingRecord = *archived;
+    }
+    return *archived;
 }
 
 } // namespace Quillond

@@ -53,6 +53,8 @@ public:
     [[nodiscard]] QVariantMap request() const { return m_request; }
     /// The status record the protocol answers for this installation.
     [[nodiscard]] QVariantMap statusRecord() const;
+    /// statusRecord() archived; a waiting job's record cannot change, so its bytes are made once.
+    [[nodiscard]] QByteArray archivedStatusRecord() const;
     [[nodiscard]] QString destinationFolder() const;
 
     /// Prefix of the staging folders made beside installed bundles; left-overs are removed at start.
@@ -83,6 +85,7 @@ private:
     quint64 m_received = 0;
     double m_startReferenceTime = 0;
     QElapsedTimer m_clock;
+    mutable QByteArray m_archivedWaitingRecord;
     std::shared_ptr<std::atomic<bool>> m_cancelled;
     QFutureWatcher<QString> m_installWatcher;
 };

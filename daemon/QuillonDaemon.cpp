@@ -3,6 +3,7 @@
 #include "installation/InstallerProtocol.h"
 #include "installation/SecureArchiving.h"
 #include "platform/DistributedNotificationCenter.h"
+#include "platform/KeyedArchive.h"
 #include "platform/MessagePort.h"
 #include "platform/Paths.h"
 #include "platform/Services.h"
@@ -261,13 +262,16 @@ void QuillonDaemon::reply(const QVariantMap &request, qint32 completion, const Q
 
 QByteArray QuillonDaemon::statusRecords() const
 {
-    QVariantList records;
+    QList<QByteArray> records;
+    records.reserve(m_queue.size());
     for (const InstallationJob *job : m_queue) {
         if (job->phase() != InstallationJob::Phase::Finished) {
-            records.append(job->statusRecord());
+            if (QByteArray record = job->archivedStatusRecord(); !record.isEmpty()) {
+                records.append(std::move(record));
+            }
         }
     }
-    return CZEncodeSecureObject(records);
+    return Cadenza::Platform::KeyedArchive::encodeArray(records);
 }
 
 } // namespace Quillond

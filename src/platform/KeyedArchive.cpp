@@ -1,9 +1,14 @@
 #include "KeyedArchive.h"
 
 #include <QCborStreamReader>
+
 #include <QCborStreamWriter>
 #include <QDateTime>
+#include <QStringDecoder>
 #include <QTimeZone>
+#include <QVarLengthArray>
+#include <algorithm>
+#include <cstring>
 
 namespace Cadenza::Platform {
 
@@ -153,6 +158,7 @@ public:
 private:
     std::optional<QVariant> fail(QString *error, const QString &message)
     {
+        m_failed = true;
         if (error && error->isEmpty()) {
             *error = message;
         }
@@ -203,13 +209,77 @@ private:
         return result;
     }
 
-    std::optional<QString> readText(QString *error)
+    enum class Intern : bool { No, Yes };
+
+    std::optional<QString> readText(QString *error, Intern intern = Intern::No)
     {
         if (m_cbor.type() != QCborStreamReader::String) {
             fail(error, QStringLiteral("a dictionary key is not a string"));
             return std::nullopt;
         }
+        if (auto small = readShortText(error, intern)) {
+            return small;
+        }
+        if (m_failed) {
+            return std::nullopt;
+        }
         return readChunks<QString>([this] { return m_cbor.readString(); }, error);
+    }
+
+    // Status records and property lists are mostly short ASCII strings, a few dozen distinct keys
+    // repeated in every record: reading those through a stack buffer and handing out one shared
+    // QString per key spares two allocations and a UTF-8 decoding per key. Nothing, with no error,
+    // when the string is not of that kind and must be read in chunks.
+    std::optional<QString> readShortText(QString *error, Intern intern)
+    {
+        // Longer strings, and any string over the limit, take the chunked path, which refuses them.
+        if (!m_cbor.isLengthKnown()
+            || m_cbor.length() > quint64(qMin(ShortText, m_limits.maximumStringBytes))) {
+            return std::nullopt;
+        }
+        char bytes[ShortText];
+        const auto chunk = m_cbor.readStringChunk(bytes, ShortText);
+        if (chunk.status == QCborStreamReader::Error) {
+            fail(error, m_cbor.lastError().toString());
+            return std::nullopt;
+        }
+        const qsizetype size = chunk.status == QCborStreamReader::Ok ? chunk.data : 0;
+        if (chunk.status == QCborStreamReader::Ok) {
+            // A definite-length string is one chunk; this moves past its end.
+            const auto end = m_cbor.readStringChunk(nullptr, 0);
+            if (end.status != QCborStreamReader::EndOfString) {
+                fail(error, m_cbor.lastError().toString());
+                return std::nullopt;
+            }
+        }
+        const QByteArrayView utf8(bytes, size);
+        const bool internable = intern == Intern::Yes && size <= InternedText::MaximumSize;
+        if (internable) {
+            for (const InternedText &known : m_interned) {
+                if (known.size == size && std::memcmp(known.bytes, bytes, size_t(size)) == 0) {
+                    return known.text;
+                }
+            }
+        }
+        QString text;
+        if (std::all_of(utf8.begin(), utf8.end(), [](char c) { return uchar(c) < 0x80; })) {
+            text = QString::fromLatin1(utf8);
+        } else {
+            QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless);
+            text = decoder.decode(utf8);
+            if (decoder.hasError()) {
+                fail(error, QStringLiteral("a string is not valid UTF-8"));
+                return std::nullopt;
+            }
+        }
+        if (internable && m_interned.size() < MaximumInterned) {
+            InternedText known;
+            std::memcpy(known.bytes, bytes, size_t(size));
+            known.size = size;
+            known.text = text;
+            m_interned.append(known);
+        }
+        return text;
     }
 
     bool skip(QString *error)
@@ -356,7 +426,7 @@ private:
                 if (!count(error)) {
                     return std::nullopt;
                 }
-                auto key = readText(error);
+                auto key = readText(error, Intern::Yes);
                 if (!key) {
                     return std::nullopt;
                 }
@@ -364,7 +434,8 @@ private:
                 if (!item) {
                     return std::nullopt;
                 }
-                map.insert(*key, *item);
+                // Archives written here list keys in order; the hint makes each insertion constant.
+                map.insert(map.cend(), *key, *item);
             }
             if (m_cbor.lastError() != QCborError::NoError || !m_cbor.leaveContainer()) {
                 return fail(error, m_cbor.lastError().toString());
@@ -379,10 +450,22 @@ private:
         return fail(error, QStringLiteral("unknown value in the archive"));
     }
 
+    static constexpr qsizetype ShortText = 256;
+    static constexpr qsizetype MaximumInterned = 64;
+    struct InternedText
+    {
+        static constexpr qsizetype MaximumSize = 48;
+        char bytes[MaximumSize];
+        qsizetype size;
+        QString text;
+    };
+
     QCborStreamReader m_cbor;
+    QVarLengthArray<InternedText, 32> m_interned;
     ArchiveClasses m_allowed;
     KeyedArchive::Limits m_limits;
     qsizetype m_items = 0;
+    bool m_failed = false;
 };
 
 } // namespace
@@ -401,6 +484,58 @@ std::optional<QByteArray> KeyedArchive::encode(const QVariant &root, QString *er
         }
     }
     return out;
+}
+
+std::optional<QByteArray> KeyedArchive::encodeItem(const QVariant &value, QString *error)
+{
+    QByteArray out;
+    QString message;
+    {
+        Writer writer(&out);
+        if (!writer.write(value, &message)) {
+            if (error) {
+                *error = message;
+            }
+            return std::nullopt;
+        }
+    }
+    return out;
+}
+
+QByteArray KeyedArchive::encodeArray(const QList<QByteArray> &archivedItems)
+{
+    QByteArray head;
+    {
+        QCborStreamWriter writer(&head);
+        writer.startMap(1);
+        writer.append(RootKey);
+    }
+    // The array's head by hand: the stream writer cannot take items that are already archived.
+    constexpr char ArrayMajorType = char(4 << 5);
+    const quint64 count = quint64(archivedItems.size());
+    if (count < 24) {
+        head.append(char(ArrayMajorType | char(count)));
+    } else if (count <= 0xFF) {
+        head.append(char(ArrayMajorType | 24));
+        head.append(char(count));
+    } else if (count <= 0xFFFF) {
+        head.append(char(ArrayMajorType | 25));
+        head.append(char(count >> 8)).append(char(count));
+    } else {
+        head.append(char(ArrayMajorType | 26));
+        for (int shift = 24; shift >= 0; shift -= 8) {
+            head.append(char(count >> shift));
+        }
+    }
+    qsizetype size = head.size();
+    for (const QByteArray &item : archivedItems) {
+        size += item.size();
+    }
+    head.reserve(size);
+    for (const QByteArray &item : archivedItems) {
+        head.append(item);
+    }
+    return head;
 }
 
 std::optional<QVariant> KeyedArchive::decode(

@@ -52,6 +52,14 @@ public:
 
     /// The archive of @p root; nothing, with @p error set, when a value cannot be archived.
     [[nodiscard]] static std::optional<QByteArray> encode(const QVariant &root, QString *error = nullptr);
+    /**
+     * @p value archived on its own, for encodeArray(): a server that answers the same records again
+     * and again keeps each record's bytes and archives only what changed.
+     */
+    [[nodiscard]] static std::optional<QByteArray> encodeItem(
+        const QVariant &value, QString *error = nullptr);
+    /// The archive of an array whose items were each archived by encodeItem(), joined as they are.
+    [[nodiscard]] static QByteArray encodeArray(const QList<QByteArray> &archivedItems);
     /// The value under "root"; nothing, with @p error set, on any damage, excess or class not allowed.
     [[nodiscard]] static std::optional<QVariant> decode(const QByteArray &bytes, ArchiveClasses allowed,
         QString *error = nullptr, const Limits &limits = Limits());

@@ -308,6 +308,9 @@ private:
                 socket->write(
                     MessageFrame {frame->messageId, MessageFrame::IsReply, reply.value_or(QByteArray())}
                         .encode());
+                // The client is blocked on this answer: hand it to the kernel now rather than on the
+                // next turn of the event loop.
+                socket->flush();
             }
         }
     }

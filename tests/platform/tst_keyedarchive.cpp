@@ -120,6 +120,67 @@ private Q_SLOTS:
         QVERIFY2(!error.isEmpty(), "a refusal must say why");
     }
 
+    void stringsKeepEveryCharacter()
+    {
+        // Short strings and keys take a faster path than long ones; both must give the same text.
+        const QString accented
+            = QStringLiteral("Am\u00e9lie \u0928\u092e\u0938\u094d\u0924\u0947 \U0001F600");
+        const QString longText = accented.repeated(40);
+        const QVariantMap record {{accented, longText}, {longText, accented}, {QString(), QString()}};
+        QString error;
+        const auto back
+            = KeyedArchive::decode(*KeyedArchive::encode(QVariantList {record, record}), Everything, &error);
+        QVERIFY2(back, qPrintable(error));
+        QCOMPARE(back->toList(), (QVariantList {record, record}));
+    }
+
+    void brokenUtf8IsRefused_data()
+    {
+        QTest::addColumn<QByteArray>("bytes");
+        QTest::newRow("short value") << QByteArray("\xa1\x64root\x62\xc3\x28", 9);
+        QTest::newRow("short key") << QByteArray("\xa1\x64root\xa1\x61\xff\x01", 10);
+        QTest::newRow("lone surrogate") << QByteArray("\xa1\x64root\x63\xed\xa0\x80", 10);
+        QByteArray longValue("\xa1\x64root\x79\x01\x2c", 9);
+        longValue += QByteArray(299, 'a') + "\xff";
+        QTest::newRow("long value") << longValue;
+    }
+    void brokenUtf8IsRefused()
+    {
+        QFETCH(QByteArray, bytes);
+        QString error;
+        QVERIFY(!KeyedArchive::decode(bytes, Everything, &error));
+        QVERIFY2(!error.isEmpty(), "a refusal must say why");
+    }
+
+    void archivedItemsJoinIntoTheSameArchive_data()
+    {
+        // Each count crosses a boundary of how an array states its length.
+        QTest::addColumn<int>("count");
+        for (const int count : {0, 1, 23, 24, 255, 256, 65535, 65536}) {
+            QTest::newRow(qPrintable(QString::number(count))) << count;
+        }
+    }
+    void archivedItemsJoinIntoTheSameArchive()
+    {
+        QFETCH(int, count);
+        QVariantList records;
+        QList<QByteArray> items;
+        for (int i = 0; i < count; ++i) {
+            const QVariant record = i % 2 ? QVariant(QVariantMap {{QStringLiteral("QLNDTagName"), i}})
+                                          : QVariant(QStringLiteral("item %1").arg(i));
+            records.append(record);
+            items.append(*KeyedArchive::encodeItem(record));
+        }
+        const QByteArray joined = KeyedArchive::encodeArray(items);
+        QCOMPARE(joined, *KeyedArchive::encode(records));
+        ArchiveLimits roomy;
+        roomy.maximumItems = 4 * 65536;
+        QString error;
+        const auto back = KeyedArchive::decode(joined, Everything, &error, roomy);
+        QVERIFY2(back, qPrintable(error));
+        QCOMPARE(back->toList(), records);
+    }
+
     void limitsAreKept()
     {
         ArchiveLimits limits;
