@@ -104,10 +104,7 @@ bool QuillonDaemon::start(QString *error)
         return false;
     }
     // Held only while the daemon runs: clients probe it to know whether anybody answers.
-    m_livenessPort = ports.createLocalPort(
-        LivenessPortName, [](qint32, const QByteArray &, const Platform::MessagePeer &) {
-            return std::optional<QByteArray>();
-        });
+    m_livenessPort = ports.createPresencePort(LivenessPortName);
     if (!m_livenessPort) {
         m_requestPort.reset();
         *error = QStringLiteral("cannot open the liveness port %1").arg(LivenessPortName);

@@ -111,6 +111,12 @@ std::unique_ptr<LocalMessagePort> FakeMessagePortService::createLocalPort(
     return std::make_unique<FakeLocalPort>(name, std::move(handler), m_state);
 }
 
+std::unique_ptr<LocalMessagePort> FakeMessagePortService::createPresencePort(const QString &name)
+{
+    return createLocalPort(
+        name, [](qint32, const QByteArray &, const MessagePeer &) { return std::optional<QByteArray>(); });
+}
+
 void FakeMessagePortService::setSendStatus(int status)
 {
     m_state->sendStatus = status;

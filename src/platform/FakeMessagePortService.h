@@ -29,6 +29,7 @@ public:
     std::unique_ptr<RemoteMessagePort> createRemotePort(const QString &name) override;
     std::unique_ptr<LocalMessagePort> createLocalPort(const QString &name, LocalMessagePort::Handler handler,
         const LocalPortLimits &limits = LocalPortLimits()) override;
+    std::unique_ptr<LocalMessagePort> createPresencePort(const QString &name) override;
 
     /// Every later send answers @p status instead of delivering (Success delivers again).
     void setSendStatus(int status);

@@ -92,6 +92,12 @@ public:
         LocalMessagePort::Handler handler, const LocalPortLimits &limits = LocalPortLimits())
         = 0;
 
+    /**
+     * A port that receives nothing and only shows that this process is there: remote ports made for
+     * its name are valid while it exists. Probing it costs its owner next to nothing, so a server can
+     * be probed before every request.
+     */
+    [[nodiscard]] virtual std::unique_ptr<LocalMessagePort> createPresencePort(const QString &name) = 0;
     [[nodiscard]] static bool isValidPortName(const QString &name);
 };
 

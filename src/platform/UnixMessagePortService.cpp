@@ -11,6 +11,7 @@
 #include <QLocalServer>
 #include <QLocalSocket>
 #include <QPointer>
+#include <QSocketNotifier>
 #include <QTimer>
 
 #include <cerrno>
@@ -20,6 +21,8 @@
 #include <sys/stat.h>
 #include <sys/un.h>
 #include <unistd.h>
+
+#include <vector>
 
 namespace Cadenza::Platform {
 
@@ -323,6 +326,118 @@ private:
     std::shared_ptr<bool> m_alive;
 };
 
+// The presence port holds no Qt socket per peer: a probe is accepted and kept as a bare descriptor
+// until its peer hangs up, which a sweep on every later acceptance (and once a second) notices. A probe
+// must not be closed before its peer is done, or the peer would take the hang-up for our absence.
+// Probes wait in the kernel's backlog (connecting needs no acceptance), so after one wake-up the
+// port does not listen again for a while: a client probing before each request then wakes this
+// process once, for the request, instead of twice.
+class UnixPresencePort final : public QObject, public LocalMessagePort
+{
+public:
+    UnixPresencePort(const QString &name, const QString &path, int listener)
+        : m_name(name)
+        , m_path(path)
+        , m_listener(listener)
+        , m_notifier(listener, QSocketNotifier::Read)
+    {
+        connect(&m_notifier, &QSocketNotifier::activated, this, [this] {
+            m_notifier.setEnabled(false);
+            acceptProbes();
+            m_rearm.start();
+        });
+        m_rearm.setSingleShot(true);
+        m_rearm.setInterval(QuietMilliseconds);
+        connect(&m_rearm, &QTimer::timeout, this, [this] {
+            acceptProbes();
+            m_notifier.setEnabled(true);
+        });
+        m_sweep.setInterval(1000);
+        connect(&m_sweep, &QTimer::timeout, this, &UnixPresencePort::sweep);
+    }
+    ~UnixPresencePort() override { invalidate(); }
+
+    QString name() const override { return m_name; }
+    bool isValid() const override { return m_listener >= 0; }
+
+    void invalidate() override
+    {
+        if (m_listener < 0) {
+            return;
+        }
+        m_notifier.setEnabled(false);
+        m_rearm.stop();
+        m_sweep.stop();
+        ::close(m_listener);
+        m_listener = -1;
+        QFile::remove(m_path);
+        for (const int probe : std::exchange(m_probes, {})) {
+            ::close(probe);
+        }
+    }
+
+private:
+    static constexpr int MaximumProbes = 1024;
+    static constexpr int QuietMilliseconds = 100;
+
+    void acceptProbes()
+    {
+        while (true) {
+            const int probe = ::accept4(m_listener, nullptr, nullptr, SOCK_NONBLOCK | SOCK_CLOEXEC);
+            if (probe < 0) {
+                break; // EAGAIN: none left; anything else: the next notification tries again
+            }
+            ucred credentials {};
+            socklen_t size = sizeof(credentials);
+            if (::getsockopt(probe, SOL_SOCKET, SO_PEERCRED, &credentials, &size) != 0
+                || credentials.uid != ::geteuid()) {
+                ::close(probe);
+                continue;
+            }
+            if (m_probes.size() >= MaximumProbes) {
+                // Peers that neither talk nor leave: the oldest has had its answer long ago.
+                ::close(m_probes.front());
+                m_probes.erase(m_probes.begin());
+            }
+            m_probes.push_back(probe);
+        }
+        sweep();
+    }
+
+    void sweep()
+    {
+        std::vector<pollfd> polled;
+        polled.reserve(m_probes.size());
+        for (const int probe : m_probes) {
+            polled.push_back({probe, POLLIN | POLLRDHUP, 0});
+        }
+        if (!polled.empty() && ::poll(polled.data(), nfds_t(polled.size()), 0) > 0) {
+            m_probes.clear();
+            for (const pollfd &p : polled) {
+                // Nobody has anything to say here: readable means gone (or misbehaving).
+                if (p.revents != 0) {
+                    ::close(p.fd);
+                } else {
+                    m_probes.push_back(p.fd);
+                }
+            }
+        }
+        if (m_probes.empty()) {
+            m_sweep.stop();
+        } else if (!m_sweep.isActive()) {
+            m_sweep.start();
+        }
+    }
+
+    QString m_name;
+    QString m_path;
+    int m_listener;
+    QSocketNotifier m_notifier;
+    QTimer m_rearm;
+    QTimer m_sweep;
+    std::vector<int> m_probes;
+};
+
 } // namespace
 
 QString UnixMessagePortService::socketPath(const QString &name)
@@ -388,24 +503,59 @@ std::unique_ptr<LocalMessagePort> UnixMessagePortService::createLocalPort(
         return nullptr;
     }
     const QString path = socketPath(name);
-    if (QFile::encodeName(path).size() >= qsizetype(sizeof(sockaddr_un::sun_path))) {
-        qCWarning(lcPorts, "The socket path %s is too long", qPrintable(path));
+    if (!claimSocketPath(path)) {
         return nullptr;
-    }
-    if (QFile::exists(path)) {
-        // A name is taken while its socket answers; a socket nobody answers is left over from a crash.
-        QLocalSocket probe;
-        probe.connectToServer(path);
-        if (probe.waitForConnected(1000)) {
-            return nullptr;
-        }
-        QLocalServer::removeServer(path);
     }
     auto port = std::make_unique<UnixLocalPort>(name, std::move(handler), limits);
     if (!port->listen(path)) {
         return nullptr;
     }
     return port;
+}
+
+bool UnixMessagePortService::claimSocketPath(const QString &path)
+{
+    if (QFile::encodeName(path).size() >= qsizetype(sizeof(sockaddr_un::sun_path))) {
+        qCWarning(lcPorts, "The socket path %s is too long", qPrintable(path));
+        return false;
+    }
+    if (QFile::exists(path)) {
+        // A name is taken while its socket answers; a socket nobody answers is left over from a crash.
+        QLocalSocket probe;
+        probe.connectToServer(path);
+        if (probe.waitForConnected(1000)) {
+            return false;
+        }
+        QLocalServer::removeServer(path);
+    }
+    return true;
+}
+
+std::unique_ptr<LocalMessagePort> UnixMessagePortService::createPresencePort(const QString &name)
+{
+    if (!isValidPortName(name) || !ensureRuntimeFolder()) {
+        return nullptr;
+    }
+    const QString path = socketPath(name);
+    if (!claimSocketPath(path)) {
+        return nullptr;
+    }
+    const QByteArray encoded = QFile::encodeName(path);
+    sockaddr_un address {};
+    address.sun_family = AF_UNIX;
+    std::memcpy(address.sun_path, encoded.constData(), size_t(encoded.size()));
+    const int listener = ::socket(AF_UNIX, SOCK_STREAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0);
+    if (listener < 0) {
+        return nullptr;
+    }
+    if (::bind(listener, reinterpret_cast<const sockaddr *>(&address), sizeof(address)) != 0
+        || ::chmod(encoded.constData(), 0600) != 0 || ::listen(listener, SOMAXCONN) != 0) {
+        qCWarning(lcPorts, "Cannot listen on %s: %s", qPrintable(path), std::strerror(errno));
+        ::close(listener);
+        QFile::remove(path);
+        return nullptr;
+    }
+    return std::make_unique<UnixPresencePort>(name, path, listener);
 }
 
 std::unique_ptr<LocalMessagePort> UnixMessagePortService::adoptLocalPort(const QString &name,

@@ -16,6 +16,7 @@ public:
     std::unique_ptr<RemoteMessagePort> createRemotePort(const QString &name) override;
     std::unique_ptr<LocalMessagePort> createLocalPort(const QString &name, LocalMessagePort::Handler handler,
         const LocalPortLimits &limits = LocalPortLimits()) override;
+    std::unique_ptr<LocalMessagePort> createPresencePort(const QString &name) override;
 
     /// A local port on a listening socket handed over by the service manager (socket activation).
     [[nodiscard]] std::unique_ptr<LocalMessagePort> adoptLocalPort(const QString &name,
@@ -26,6 +27,11 @@ public:
     [[nodiscard]] static QString socketPath(const QString &name);
     /// Makes the runtime folder with mode 0700; false when it cannot be made private.
     [[nodiscard]] static bool ensureRuntimeFolder();
+
+private:
+    /// Whether a new socket may be made at @p path: it fits, and no living port holds it (a socket
+    /// left by a crash is removed).
+    [[nodiscard]] static bool claimSocketPath(const QString &path);
 };
 
 } // namespace Cadenza::Platform

@@ -5,6 +5,7 @@
 #include "platform/Paths.h"
 #include "platform/UnixMessagePortService.h"
 
+#include <QDir>
 #include <QFileInfo>
 #include <QLocalSocket>
 #include <QMutex>
@@ -240,6 +241,36 @@ private Q_SLOTS:
         QVERIFY(!m_service->createRemotePort(QStringLiteral("self.release")));
     }
 
+    void presencePortsShowTheirOwnerWhileTheyStand()
+    {
+        const QString name = QStringLiteral("test.presence");
+        auto presence = m_service->createPresencePort(name);
+        QVERIFY(presence && presence->isValid());
+        QVERIFY(!m_service->createPresencePort(name)); // the name is taken
+        QVERIFY(!m_service->createLocalPort(name, {}));
+        QVERIFY(!m_service->createPresencePort(QStringLiteral("../presence")));
+        // A client probes before every request: many probes made, checked and dropped in a row.
+        for (int i = 0; i < 2000; ++i) {
+            auto probe = m_service->createRemotePort(name);
+            QVERIFY(probe && probe->isValid());
+            probe->invalidate();
+            if (i % 100 == 0) {
+                QCoreApplication::processEvents();
+            }
+        }
+        // The owner tidies up after the probes that left, never after one still looking.
+        auto held = m_service->createRemotePort(name);
+        QVERIFY(held);
+        for (int i = 0; i < 5; ++i) {
+            QTest::qWait(20);
+            QVERIFY(held->isValid());
+        }
+        presence->invalidate();
+        QTRY_VERIFY(!held->isValid());
+        QVERIFY(!m_service->createRemotePort(name));
+        QVERIFY(m_service->createPresencePort(name)); // free again
+    }
+
 private:
     std::function<std::shared_ptr<MessagePortService>()> m_make;
     bool m_threads;
@@ -316,6 +347,31 @@ private Q_SLOTS:
         QTRY_COMPARE(raw.state(), QLocalSocket::UnconnectedState);
         auto remote = service.createRemotePort(QStringLiteral("test.port"));
         QCOMPARE(remote->sendRequest(1, QByteArray("ok"), 5.0, 5.0, true).status, MessagePortStatus::Success);
+    }
+
+    void probesOfAPresencePortAreNotKept()
+    {
+        const auto openDescriptors = [] {
+            return QDir(QStringLiteral("/proc/self/fd")).entryList(QDir::Files | QDir::System).size();
+        };
+        UnixMessagePortService service;
+        auto presence = service.createPresencePort(QStringLiteral("test.presence"));
+        QVERIFY(presence);
+        const qsizetype before = openDescriptors();
+        for (int i = 0; i < 3000; ++i) {
+            service.createRemotePort(QStringLiteral("test.presence"))->invalidate();
+            if (i % 200 == 0) {
+                QCoreApplication::processEvents();
+            }
+        }
+        // Every probe was let go: the last ones at the latest by the owner's periodic sweep.
+        QTRY_VERIFY_WITH_TIMEOUT(openDescriptors() <= before + 1, 3000);
+        const QFileInfo socket(UnixMessagePortService::socketPath(QStringLiteral("test.presence")));
+        QCOMPARE(socket.permissions()
+                & (QFile::ReadOther | QFile::WriteOther | QFile::ReadGroup | QFile::WriteGroup),
+            QFile::Permissions());
+        presence.reset();
+        QVERIFY(!QFileInfo::exists(socket.filePath()));
     }
 
     void aSocketLeftByACrashIsReplaced()
