@@ -98,18 +98,20 @@ QString conversionDisplayName(const QString &key, const QString &code)
     }
     // Lists ask for the names of the same few codes thousands of times. Names ICU knew are kept;
     // a code that fell back to itself is asked again, so its log line is written every time.
+    // Kept by key, then by code, so that a lookup makes no new string.
     struct Cache
     {
         QString localeIdentifier;
-        QHash<QString, QString> names;
+        QHash<QString, QHash<QString, QString>> namesByKey;
+        qsizetype size = 0;
     };
     thread_local Cache cache;
     const Platform::Locale locale = CZSpeechItem::_conversionLocale();
-    if (cache.localeIdentifier != locale.identifier() || cache.names.size() > 4096) {
-        cache = {locale.identifier(), {}};
+    if (cache.localeIdentifier != locale.identifier() || cache.size > 4096) {
+        cache = {locale.identifier(), {}, 0};
     }
-    const QString cacheKey = key + QLatin1Char('|') + code;
-    if (const auto it = cache.names.constFind(cacheKey); it != cache.names.cend()) {
+    QHash<QString, QString> &names = cache.namesByKey[key];
+    if (const auto it = names.constFind(code); it != names.cend()) {
         return *it;
     }
     QString name;
@@ -119,7 +121,8 @@ QString conversionDisplayName(const QString &key, const QString &code)
         return {}; // a code without a language name: the caller decides what that means
     }
     if (!name.isNull() && name != code) {
-        cache.names.insert(cacheKey, name);
+        names.insert(code, name);
+        ++cache.size;
     }
     return name;
 }

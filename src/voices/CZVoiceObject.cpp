@@ -15,6 +15,8 @@
 #include "voices/SpeechSynthesizer.h"
 #include "voices/WordStem.h"
 
+#include <QStringTokenizer>
+
 namespace Cadenza {
 
 using Platform::Locale;
@@ -202,10 +204,11 @@ int CZVoiceObject::compare(const CZVoiceObject &other) const
 
 bool CZVoiceObject::matchesSearchString(const QString &searchString) const
 {
-    const QStringList words = searchString.split(QLatin1Char(' '));
+    // Called for every voice on every keystroke: the words are views into the search string, so
+    // nothing is allocated for them.
     QString language, country, genderText;
     bool namesKnown = false;
-    for (const QString &word : words) {
+    for (const QStringView word : qTokenize(searchString, QLatin1Char(' '))) {
         if (word.isEmpty()) {
             continue;
         }

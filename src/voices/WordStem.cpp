@@ -4,7 +4,7 @@
 
 namespace Cadenza {
 
-bool containsWordStem(const QString &text, const QString &stem)
+bool containsWordStem(QStringView text, QStringView stem)
 {
     // The empty string is never found, as an empty search word must not match everything here.
     if (stem.isEmpty()) {

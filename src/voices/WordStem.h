@@ -12,7 +12,7 @@ namespace Cadenza {
  * start or right after a blank. Only the first occurrence counts: "tom" is not a word stem of
  * "Atom Tom".
  */
-[[nodiscard]] CADENZACORE_EXPORT bool containsWordStem(const QString &text, const QString &stem);
+[[nodiscard]] CADENZACORE_EXPORT bool containsWordStem(QStringView text, QStringView stem);
 
 /// Whether any blank-separated word of @p words is a word stem of @p text (an empty word never is).
 [[nodiscard]] CADENZACORE_EXPORT bool containsWords(const QString &text, const QString &words);
