@@ -23,6 +23,11 @@ fi
 desktop-file-validate "$prefix/share/applications/org.cadenza.Settings.desktop"
 appstreamcli validate --no-net --pedantic "$prefix/share/metainfo/org.cadenza.Settings.metainfo.xml"
 
-cmake -S "$source/examples/minimal-host" -B "$work/example" -DCMAKE_PREFIX_PATH="$prefix" >/dev/null
+example_args=(-DCMAKE_PREFIX_PATH="$prefix")
+if grep -q '^CADENZA_SANITIZE:BOOL=ON' "$build/CMakeCache.txt"; then
+  # Libraries built with the sanitizers need a host built with them, so that their runtime loads first.
+  example_args+=(-DCMAKE_CXX_FLAGS="-fsanitize=address,undefined" -DCMAKE_EXE_LINKER_FLAGS="-fsanitize=address,undefined")
+fi
+cmake -S "$source/examples/minimal-host" -B "$work/example" "${example_args[@]}" >/dev/null
 cmake --build "$work/example" --parallel "$(nproc)" >/dev/null
 LD_LIBRARY_PATH="$prefix/lib" QT_QPA_PLATFORM=offscreen "$work/example/minimal-host" --check
