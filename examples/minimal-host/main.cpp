@@ -26,9 +26,8 @@ public:
         voices->setAllowSystemVoiceChoice(true);
         voices->buildPopUpButtonWithSelectVoiceIdentifier(QString());
         auto *settings = new QPushButton(QStringLiteral("Voice Settings…"), this);
-        connect(settings, &QPushButton::clicked, this, [this] {
-            Cadenza::SpeechSynthesizerVoiceSettings::beginSheetForVoiceSettings({}, this, this);
-        });
+        connect(settings, &QPushButton::clicked, this,
+            [this] { Cadenza::SpeechSynthesizerVoiceSettings::beginSheetForVoiceSettings({}, this, this); });
         auto *layout = new QVBoxLayout(this);
         layout->addWidget(voices);
         layout->addWidget(status);
