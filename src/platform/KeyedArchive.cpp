@@ -504,13 +504,16 @@ std::optional<QByteArray> KeyedArchive::encodeItem(const QVariant &value, QStrin
 
 QByteArray KeyedArchive::encodeArray(const QList<QByteArray> &archivedItems)
 {
-    QByteArray head;
+    // The heads of the map and the array by hand: the stream writer cannot take items that are
+    // already archived, and must not be left with containers open.
+    constexpr char MapOfOneEntry = char(0xA1);
+    QByteArray key;
     {
-        QCborStreamWriter writer(&head);
-        writer.startMap(1);
+        QCborStreamWriter writer(&key); // writes from the start of its array, so a fresh one
         writer.append(RootKey);
     }
-    // The array's head by hand: the stream writer cannot take items that are already archived.
+    QByteArray head(1, MapOfOneEntry);
+    head.append(key);
     constexpr char ArrayMajorType = char(4 << 5);
     const quint64 count = quint64(archivedItems.size());
     if (count < 24) {
