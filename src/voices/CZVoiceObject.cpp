@@ -173,16 +173,27 @@ QString CZVoiceObject::genderDisplayString() const
 
 QString CZVoiceObject::genderDisplayStringUncached() const
 {
-    const QString value = gender();
+    // Every voice of a list asks once; the three texts depend only on the table's language.
+    struct GenderTexts
+    {
+        QString language;
+        QString male, female, novelty;
+    };
+    thread_local GenderTexts texts;
     const Platform::LocalizationTable &table = Platform::LocalizationTable::shared();
+    if (texts.language.isNull() || texts.language != table.language()) {
+        texts = {table.language(), table.text(QStringLiteral("Male")), table.text(QStringLiteral("Female")),
+            table.text(QStringLiteral("Novelty"))};
+    }
+    const QString value = gender();
     if (value == Platform::VoiceGender::Male) {
-        return table.text(QStringLiteral("Male"));
+        return texts.male;
     }
     if (value == Platform::VoiceGender::Female) {
-        return table.text(QStringLiteral("Female"));
+        return texts.female;
     }
     if (value == Platform::VoiceGender::Neuter) {
-        return table.text(QStringLiteral("Novelty"));
+        return texts.novelty;
     }
     return {};
 }

@@ -14,6 +14,9 @@ namespace Cadenza {
  */
 [[nodiscard]] CADENZACORE_EXPORT bool containsWordStem(QStringView text, QStringView stem);
 
+/// Where @p stem first occurs in @p text, ignoring case as QString::indexOf() does; -1 when nowhere.
+[[nodiscard]] CADENZACORE_EXPORT qsizetype firstIndexIgnoringCase(QStringView text, QStringView stem);
+
 /// Whether any blank-separated word of @p words is a word stem of @p text (an empty word never is).
 [[nodiscard]] CADENZACORE_EXPORT bool containsWords(const QString &text, const QString &words);
 

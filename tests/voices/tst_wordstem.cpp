@@ -1,5 +1,6 @@
 #include "voices/WordStem.h"
 
+#include <QRandomGenerator>
 #include <QTest>
 
 using namespace Cadenza;
@@ -64,6 +65,37 @@ private Q_SLOTS:
         QFETCH(QString, words);
         QFETCH(bool, expected);
         QCOMPARE(containsWords(text, words), expected);
+    }
+
+    void searchAgreesWithQtIgnoringCase()
+    {
+        // The fast search must find exactly what QString::indexOf finds, for any mix of cases,
+        // accents, final sigma, dotted and dotless i, and letters outside the first plane.
+        const QString alphabet = QStringLiteral(
+            "aAbBeE \u00e9\u00c9\u00df\u03c3\u03c2\u03a3\u0130\u0131iI\u00e5\u00c5\U00010400\U00010428");
+        QList<QString> letters;
+        for (qsizetype i = 0; i < alphabet.size(); ++i) {
+            if (alphabet.at(i).isHighSurrogate()) {
+                letters.append(alphabet.mid(i, 2));
+                ++i;
+            } else {
+                letters.append(alphabet.mid(i, 1));
+            }
+        }
+        QRandomGenerator random(20261122);
+        const auto randomText = [&](int maximum) {
+            QString text;
+            const int length = int(random.bounded(maximum + 1));
+            for (int i = 0; i < length; ++i) {
+                text += letters.at(random.bounded(int(letters.size())));
+            }
+            return text;
+        };
+        for (int round = 0; round < 20000; ++round) {
+            const QString text = randomText(12);
+            const QString stem = randomText(3);
+            QCOMPARE(firstIndexIgnoringCase(text, stem), text.indexOf(stem, 0, Qt::CaseInsensitive));
+        }
     }
 };
 
