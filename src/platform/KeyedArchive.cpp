@@ -25,17 +25,6 @@ public:
         : m_cbor(out)
     { }
 
-    bool archive(const QVariant &root, QString *error)
-    {
-        m_cbor.startMap(1);
-        m_cbor.append(KeyedArchive::RootKey);
-        if (!write(root, error)) {
-            return false;
-        }
-        m_cbor.endMap();
-        return true;
-    }
-
     bool write(const QVariant &value, QString *error, int depth = 0)
     {
         if (depth > 64) {
@@ -468,22 +457,37 @@ private:
     bool m_failed = false;
 };
 
+// What precedes the root value in every archive: a map of one entry, and its key. Written by hand
+// so that a root archived on its own can follow it as it is.
+const QByteArray &archiveHead()
+{
+    static const QByteArray head = [] {
+        QByteArray key;
+        {
+            QCborStreamWriter writer(&key); // writes from the start of its array, so a fresh one
+            writer.append(KeyedArchive::RootKey);
+        }
+        constexpr char MapOfOneEntry = char(0xA1);
+        QByteArray bytes(1, MapOfOneEntry);
+        bytes += key;
+        return bytes;
+    }();
+    return head;
+}
+
 } // namespace
 
 std::optional<QByteArray> KeyedArchive::encode(const QVariant &root, QString *error)
 {
-    QByteArray out;
-    QString message;
-    {
-        Writer writer(&out);
-        if (!writer.archive(root, &message)) {
-            if (error) {
-                *error = message;
-            }
-            return std::nullopt;
-        }
+    const auto item = encodeItem(root, error);
+    if (!item) {
+        return std::nullopt;
     }
-    return out;
+    QByteArray archive;
+    archive.reserve(archiveHead().size() + item->size());
+    archive += archiveHead();
+    archive += *item;
+    return archive;
 }
 
 std::optional<QByteArray> KeyedArchive::encodeItem(const QVariant &value, QString *error)
@@ -504,16 +508,8 @@ std::optional<QByteArray> KeyedArchive::encodeItem(const QVariant &value, QStrin
 
 QByteArray KeyedArchive::encodeArray(const QList<QByteArray> &archivedItems)
 {
-    // The heads of the map and the array by hand: the stream writer cannot take items that are
-    // already archived, and must not be left with containers open.
-    constexpr char MapOfOneEntry = char(0xA1);
-    QByteArray key;
-    {
-        QCborStreamWriter writer(&key); // writes from the start of its array, so a fresh one
-        writer.append(RootKey);
-    }
-    QByteArray head(1, MapOfOneEntry);
-    head.append(key);
+    // The array's head by hand: the stream writer cannot take items that are already archived.
+    QByteArray head = archiveHead();
     constexpr char ArrayMajorType = char(4 << 5);
     const quint64 count = quint64(archivedItems.size());
     if (count < 24) {

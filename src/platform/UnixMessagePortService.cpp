@@ -22,6 +22,7 @@
 #include <sys/un.h>
 #include <unistd.h>
 
+#include <optional>
 #include <vector>
 
 namespace Cadenza::Platform {
@@ -326,6 +327,19 @@ private:
     std::shared_ptr<bool> m_alive;
 };
 
+// The address of the socket file at @p path; nothing when the path is too long for one.
+std::optional<sockaddr_un> socketAddress(const QString &path)
+{
+    const QByteArray encoded = QFile::encodeName(path);
+    sockaddr_un address {};
+    if (encoded.size() >= qsizetype(sizeof(address.sun_path))) {
+        return std::nullopt;
+    }
+    address.sun_family = AF_UNIX;
+    std::memcpy(address.sun_path, encoded.constData(), size_t(encoded.size()));
+    return address;
+}
+
 // The presence port holds no Qt socket per peer: a probe is accepted and kept as a bare descriptor
 // until its peer hangs up, which a sweep on every later acceptance (and once a second) notices. A probe
 // must not be closed before its peer is done, or the peer would take the hang-up for our absence.
@@ -472,13 +486,10 @@ std::unique_ptr<RemoteMessagePort> UnixMessagePortService::createRemotePort(cons
     if (!isValidPortName(name)) {
         return nullptr;
     }
-    const QByteArray path = QFile::encodeName(socketPath(name));
-    sockaddr_un address {};
-    if (path.size() >= qsizetype(sizeof(address.sun_path))) {
+    const auto address = socketAddress(socketPath(name));
+    if (!address) {
         return nullptr;
     }
-    address.sun_family = AF_UNIX;
-    std::memcpy(address.sun_path, path.constData(), size_t(path.size()));
     const int fd = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
     if (fd < 0) {
         return nullptr;
@@ -486,7 +497,7 @@ std::unique_ptr<RemoteMessagePort> UnixMessagePortService::createRemotePort(cons
     // Local connections complete at once or are refused; a full backlog is the only wait, and it is
     // not waited out for more than a second.
     QDeadlineTimer deadline(1000);
-    while (::connect(fd, reinterpret_cast<const sockaddr *>(&address), sizeof(address)) != 0) {
+    while (::connect(fd, reinterpret_cast<const sockaddr *>(&*address), sizeof(*address)) != 0) {
         if ((errno != EAGAIN && errno != EINTR) || deadline.hasExpired()) {
             ::close(fd);
             return nullptr;
@@ -515,7 +526,7 @@ std::unique_ptr<LocalMessagePort> UnixMessagePortService::createLocalPort(
 
 bool UnixMessagePortService::claimSocketPath(const QString &path)
 {
-    if (QFile::encodeName(path).size() >= qsizetype(sizeof(sockaddr_un::sun_path))) {
+    if (!socketAddress(path)) {
         qCWarning(lcPorts, "The socket path %s is too long", qPrintable(path));
         return false;
     }
@@ -540,16 +551,16 @@ std::unique_ptr<LocalMessagePort> UnixMessagePortService::createPresencePort(con
     if (!claimSocketPath(path)) {
         return nullptr;
     }
-    const QByteArray encoded = QFile::encodeName(path);
-    sockaddr_un address {};
-    address.sun_family = AF_UNIX;
-    std::memcpy(address.sun_path, encoded.constData(), size_t(encoded.size()));
+    const auto address = socketAddress(path); // claimSocketPath() checked that it fits
     const int listener = ::socket(AF_UNIX, SOCK_STREAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0);
-    if (listener < 0) {
+    if (!address || listener < 0) {
+        if (listener >= 0) {
+            ::close(listener);
+        }
         return nullptr;
     }
-    if (::bind(listener, reinterpret_cast<const sockaddr *>(&address), sizeof(address)) != 0
-        || ::chmod(encoded.constData(), 0600) != 0 || ::listen(listener, SOMAXCONN) != 0) {
+    if (::bind(listener, reinterpret_cast<const sockaddr *>(&*address), sizeof(*address)) != 0
+        || ::chmod(address->sun_path, 0600) != 0 || ::listen(listener, SOMAXCONN) != 0) {
         qCWarning(lcPorts, "Cannot listen on %s: %s", qPrintable(path), std::strerror(errno));
         ::close(listener);
         QFile::remove(path);
