@@ -4,6 +4,7 @@
 #include "platform/LocalizationTable.h"
 #include "platform/Services.h"
 #include "platform/SpeechSynthesisService.h"
+#include "platform/VoiceDescription.h"
 #include "speech-items/CZSpeechItem_p.h"
 
 #include <QHash>
@@ -89,12 +90,11 @@ void VoiceTableRow::setSelectedUsingLanguageCodeOnlyToSelectVoices(bool language
     if (!suits) {
         return;
     }
-    QString base = voice.identifier();
-    if (base.endsWith(QLatin1String("premium"))) {
-        base.chop(qMin<qsizetype>(8, base.size()));
-    }
+    // Ticked when its base voice is installed: for "X.premium" that is "X" or "X.compact".
     m_selected = !voice.showsInFullListOnly()
-        && !Platform::Services::speechSynthesis().attributesForVoice(base).isEmpty();
+        && Platform::VoiceDescription::isBaseVoicePresent(voice.identifier(), [](const QString &form) {
+               return !Platform::Services::speechSynthesis().attributesForVoice(form).isEmpty();
+           });
 }
 
 QString VoiceTableRow::description() const

@@ -88,6 +88,18 @@ public:
     [[nodiscard]] QList<CZSRLanguageItemPtr> downloadableSRLanguageItems();
     [[nodiscard]] DownloadableVoicePtr downloadableVoiceUpgradeForVoice(
         const CZVoiceObject &voice, const QList<DownloadableVoicePtr> &fromDownloadableVoices);
+    /// How an installer status record names a voice.
+    enum class RecordMatch { None, AsAsked, FullSize };
+    /**
+     * Whether status record @p record is about @p voice. The daemon may name the voice it installs
+     * (a voice's full-size bundle) rather than the one asked for, so a downloadable voice is also
+     * named by its full-size identifier or either of its tags; FullSize says the record fetches that.
+     */
+    [[nodiscard]] static RecordMatch installationRecordMatch(
+        const QVariantMap &record, const CZVoiceObject &voice);
+    /// The first of @p records about @p voice, and how it names it.
+    [[nodiscard]] static std::pair<QVariantMap, RecordMatch> installationRecordForVoice(
+        const QVariantList &records, const CZVoiceObject &voice);
     /// There are no upgrades of recognition languages: always null.
     [[nodiscard]] CZSpeechItemPtr downloadableSpeechItemUpgradeForExistingSpeechItem(
         const CZSpeechItemPtr &item, const QList<CZSRLanguageItemPtr> &fromDownloadableItems);

@@ -12,6 +12,7 @@
 #include "platform/RecognitionService.h"
 #include "platform/Services.h"
 #include "platform/SpeechSynthesisService.h"
+#include "platform/VoiceDescription.h"
 #include "recognition-languages/CZSRLanguageItem.h"
 #include "speech-items/CZSpeechItem_p.h"
 #include "voices/DownloadableVoice.h"
@@ -96,13 +97,54 @@ QString domainForTag(const QString &tag)
 
 } // namespace
 
+CZSpeechInstallationManager::RecordMatch CZSpeechInstallationManager::installationRecordMatch(
+    const QVariantMap &record, const CZVoiceObject &voice)
+{
+    const QString objectIdentifier = record.value(ObjectIDKey).toString();
+    const QString tag = record.value(TagNameKey).toString();
+    if (!voice.isDownloadable()) {
+        return !objectIdentifier.isEmpty() && objectIdentifier == voice.identifier() ? RecordMatch::AsAsked
+                                                                                     : RecordMatch::None;
+    }
+    const auto &downloadable = static_cast<const DownloadableVoice &>(voice);
+    const QString fullSize = downloadable.fullSizeBundleIdentifier();
+    const bool distinctFullSize = !fullSize.isEmpty() && fullSize != voice.identifier();
+    const bool distinctFullSizeTag = !downloadable.fullSizeTagName().isEmpty()
+        && downloadable.fullSizeTagName() != downloadable.tagName();
+    // The tag says what is fetched; the identifier is the client's or, rewritten, the daemon's.
+    if (!tag.isEmpty()) {
+        if (distinctFullSizeTag && tag == downloadable.fullSizeTagName()) {
+            return RecordMatch::FullSize;
+        }
+        if (tag == downloadable.tagName()) {
+            return RecordMatch::AsAsked;
+        }
+    }
+    if (objectIdentifier.isEmpty()) {
+        return RecordMatch::None;
+    }
+    if (distinctFullSize && objectIdentifier == fullSize) {
+        return RecordMatch::FullSize;
+    }
+    return objectIdentifier == voice.identifier() ? RecordMatch::AsAsked : RecordMatch::None;
+}
+
+std::pair<QVariantMap, CZSpeechInstallationManager::RecordMatch>
+CZSpeechInstallationManager::installationRecordForVoice(
+    const QVariantList &records, const CZVoiceObject &voice)
+{
+    for (const QVariant &entry : records) {
+        const QVariantMap record = entry.toMap();
+        if (const RecordMatch match = installationRecordMatch(record, voice); match != RecordMatch::None) {
+            return {record, match};
+        }
+    }
+    return {{}, RecordMatch::None};
+}
+
 QList<DownloadableVoicePtr> CZSpeechInstallationManager::downloadableVoices()
 {
-    QHash<QString, QVariantMap> active;
-    for (const QVariant &record : activeInstallations()) {
-        const QVariantMap map = record.toMap();
-        active.insert(map.value(ObjectIDKey).toString(), map);
-    }
+    const QVariantList records = activeInstallations();
     const QSet<QString> installed = [] {
         const QStringList all = SpeechSynthesizer::allVoices();
         return QSet<QString>(all.cbegin(), all.cend());
@@ -115,21 +157,27 @@ QList<DownloadableVoicePtr> CZSpeechInstallationManager::downloadableVoices()
             continue;
         }
         const QString identifier = it.key();
-        const auto record = active.constFind(identifier);
-        const bool hasRecord = record != active.cend();
+        const auto [found, match] = installationRecordForVoice(records, *voice);
+        const bool hasRecord = match != RecordMatch::None;
+        const QVariantMap *record = &found;
         if (identifier != DefaultVoiceIdentifier) {
-            if (installed.contains(identifier)) {
+            // Installed, or installed at full size: nothing left to offer.
+            if (installed.contains(identifier)
+                || (!voice->fullSizeBundleIdentifier().isEmpty()
+                    && installed.contains(voice->fullSizeBundleIdentifier()))) {
                 continue;
+            }
+            if (match == RecordMatch::FullSize) {
+                voice->setDownloadFullSize(true); // the row shows the size being fetched
             }
             if (hasRecord) {
                 voice->setDownloadStatus(record->value(ItemDownloadStatusKey).toLongLong());
                 voice->setDownloadPercentComplete(record->value(ItemPercentCompleteKey).toDouble());
             } else {
-                // Any identifier is cut the same way, whatever its ending.
-                const QString twin
-                    = identifier.chopped(qMin<qsizetype>(8, identifier.size())) + QStringLiteral(".compact");
-                voice->setDownloadStatus(
-                    installed.contains(twin) ? UpgradeAvailableStatus : NotInstalledStatus);
+                // An upgrade when its base voice is installed: for "X.premium" that is "X" or "X.compact".
+                const bool baseInstalled = Platform::VoiceDescription::isBaseVoicePresent(
+                    identifier, [&installed](const QString &form) { return installed.contains(form); });
+                voice->setDownloadStatus(baseInstalled ? UpgradeAvailableStatus : NotInstalledStatus);
                 voice->setDownloadPercentComplete(0);
             }
         } else {
@@ -206,12 +254,11 @@ DownloadableVoicePtr CZSpeechInstallationManager::downloadableVoiceUpgradeForVoi
             }
             continue;
         }
-        if (candidateIdentifier.endsWith(QLatin1String("premium"))) {
-            const QString stem = candidateIdentifier.chopped(qMin<qsizetype>(8, candidateIdentifier.size()));
-            if (identifier.startsWith(stem)
-                && candidate->relativeDesirability() > voice.relativeDesirability()) {
-                return candidate;
-            }
+        // The premium form of a voice upgrades its base voice, "X" or "X.compact".
+        if (Platform::VoiceDescription::qualityOf(candidateIdentifier) == Platform::VoiceQuality::Premium
+            && Platform::VoiceDescription::baseVoiceIdentifiersOf(candidateIdentifier).contains(identifier)
+            && candidate->relativeDesirability() > voice.relativeDesirability()) {
+            return candidate;
         }
     }
     return nullptr;

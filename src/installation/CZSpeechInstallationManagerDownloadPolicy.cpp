@@ -141,10 +141,8 @@ bool CZSpeechInstallationManager::startDownloadingHighestQualityIfNecessaryForVo
         && upgrade->downloadStatus() != NotInstalledStatus) {
         return true; // on its way already
     }
-    for (const QVariant &record : activeInstallations()) {
-        if (record.toMap().value(ObjectIDKey).toString() == upgrade->identifier()) {
-            return false;
-        }
+    if (installationRecordForVoice(activeInstallations(), *upgrade).second != RecordMatch::None) {
+        return false;
     }
     const QString tag = upgrade->fullSizeBundleIdentifier() == voiceIdentifier ? upgrade->fullSizeTagName()
                                                                                : upgrade->tagName();

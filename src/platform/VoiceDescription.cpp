@@ -48,6 +48,23 @@ QString VoiceDescription::baseIdentifierOf(const QString &identifier)
     return qualityOf(identifier) == VoiceQuality::Default ? identifier : identifier.chopped(8);
 }
 
+QStringList VoiceDescription::baseVoiceIdentifiersOf(const QString &identifier)
+{
+    if (qualityOf(identifier) != VoiceQuality::Premium) {
+        return {identifier};
+    }
+    // Our own compact voices end in ".compact"; voices of other makers may have no ending at all.
+    const QString base = identifier.chopped(8);
+    return {base, base + QStringLiteral(".compact")};
+}
+
+bool VoiceDescription::isBaseVoicePresent(
+    const QString &identifier, const std::function<bool(const QString &)> &isPresent)
+{
+    const QStringList forms = baseVoiceIdentifiersOf(identifier);
+    return std::any_of(forms.cbegin(), forms.cend(), isPresent);
+}
+
 QStringList VoiceDescription::defaultGroupsOf(const QString &identifier)
 {
     if (qualityOf(identifier) == VoiceQuality::Compact) {

@@ -7,6 +7,7 @@
 #include <QStringList>
 #include <QVariantMap>
 
+#include <functional>
 #include <optional>
 
 namespace Cadenza::Platform {
@@ -55,6 +56,15 @@ struct CADENZACORE_EXPORT VoiceDescription
     [[nodiscard]] static VoiceQuality qualityOf(const QString &identifier);
     /// The identifier without ".premium" or ".compact".
     [[nodiscard]] static QString baseIdentifierOf(const QString &identifier);
+    /**
+     * The voices that stand for the base voice of @p identifier: for "X.premium" both "X" and
+     * "X.compact" (either one installed means its base voice is installed); any other identifier is
+     * its own base voice.
+     */
+    [[nodiscard]] static QStringList baseVoiceIdentifiersOf(const QString &identifier);
+    /// Whether the base voice of @p identifier is there, as @p isPresent tells of each of its forms.
+    [[nodiscard]] static bool isBaseVoicePresent(
+        const QString &identifier, const std::function<bool(const QString &)> &isPresent);
     /// The groups a voice belongs to when its bundle does not say: compact voices to the compact group.
     [[nodiscard]] static QStringList defaultGroupsOf(const QString &identifier);
 

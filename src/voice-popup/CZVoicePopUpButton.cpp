@@ -203,11 +203,11 @@ void CZVoicePopUpButton::buildSharedVoicesMenuShowingLTVoices(bool showingLTVoic
             continue;
         }
         if (!showingLTVoices) {
-            // A premium download whose compact variant is listed is represented by that entry.
+            // A premium download whose base voice ("X" or "X.compact") is listed is represented by it.
             const QString identifier = voice->identifier();
-            const QString compact
-                = identifier.left(std::max<qsizetype>(0, identifier.size() - 8)) + QStringLiteral(".compact");
-            if (listed.contains(compact)) {
+            if (Platform::VoiceDescription::qualityOf(identifier) == Platform::VoiceQuality::Premium
+                && Platform::VoiceDescription::isBaseVoicePresent(
+                    identifier, [&listed](const QString &form) { return listed.contains(form); })) {
                 continue;
             }
         }

@@ -6,14 +6,19 @@
 #include "customize-voices/CZVoiceRowCheckboxButton.h"
 #include "customize-voices/CustomizeVoicesWindowController.h"
 #include "customize-voices/VoiceTableCellView.h"
+#include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
 #include "installation/InstallerProtocol.h"
 #include "platform/Paths.h"
 #include "platform/Services.h"
+#include "platform/SizeVariants.h"
 #include "voice-popup/CZVoicePopUpButton.h"
+#include "voice-popup/CZVoicePopUpButton_p.h"
+#include "voices/DownloadableVoice.h"
 
 #include <QAbstractItemView>
 #include <QBoxLayout>
+#include <QComboBox>
 #include <QDialog>
 #include <QDir>
 #include <QLabel>
@@ -30,6 +35,8 @@ using Cadenza::Testing::TestEnvironment;
 
 namespace {
 const QString Femke = QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact");
+const QString IngridCompact = QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.compact");
+const QString IngridPremium = QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.premium");
 } // namespace
 
 class VoiceInstallationTest : public QObject
@@ -120,7 +127,103 @@ private Q_SLOTS:
         popUp->hidePopup();
     }
 
+    void fullSizeDownloadEndsWithTheVoiceInTheMenus()
+    {
+        QWidget window;
+        auto *popUp = new CZVoicePopUpButton(&window);
+        auto *layout = new QVBoxLayout(&window);
+        layout->addWidget(popUp);
+        window.show();
+        popUp->buildPopUpButtonWithSelectVoiceIdentifier(QString());
+        QCOMPARE(popUp->findText(QStringLiteral("Ingrid")), -1);
+
+        // Tick Ingrid, choose her full size, OK.
+        CustomizeVoicesWindowController *sheet = openSheet(popUp);
+        const int ingridRow = rowOf(sheet, IngridCompact);
+        QVERIFY(ingridRow >= 0);
+        sheet->voiceSelectionTableView()->scrollTo(
+            sheet->voiceSelectionTableView()->model()->index(ingridRow, 0));
+        QTRY_VERIFY(sheet->existingViewForRow(ingridRow));
+        VoiceTableCellView *view = sheet->existingViewForRow(ingridRow);
+        view->activeCheckbox()->click();
+        QComboBox *sizes = view->downloadVariantPopUpButton();
+        QVERIFY(sizes->isVisibleTo(view));
+        const int fullSize = Platform::SizeVariants::isFullSize(sizes, 1) ? 1 : 0;
+        QVERIFY(Platform::SizeVariants::isFullSize(sizes, fullSize));
+        sizes->setCurrentIndex(fullSize);
+        Q_EMIT sizes->activated(fullSize);
+        sheet->window()->findChild<QPushButton *>(QStringLiteral("okButton"))->click();
+        QVERIFY(!sheet->window()->isVisible());
+
+        // While she downloads, the pop-up lists her as downloading, and the sheet keeps her row at
+        // full size, ticked and greyed.
+        QTRY_VERIFY_WITH_TIMEOUT(popUp->findText(QStringLiteral("Ingrid (Downloading)")) >= 0, 30000);
+        sheet = openSheet(popUp);
+        const VoiceTableRowPtr downloading
+            = sheet->currentlyDisplayedVoiceRows().value(rowOf(sheet, IngridCompact));
+        QVERIFY(downloading);
+        const qint64 status = downloading->voiceObject()->downloadStatus();
+        QVERIFY2(status == 3 || status == 4, qPrintable(QString::number(status)));
+        QVERIFY(std::static_pointer_cast<DownloadableVoice>(downloading->voiceObject())->downloadFullSize());
+        QVERIFY(downloading->isSelected());
+        sheet->cancelVoiceSelection();
+
+        // Installed at full size: Ingrid Premium is in the menus, once, and nothing is offered again.
+        QTRY_VERIFY_WITH_TIMEOUT(popUp->findText(QStringLiteral("Ingrid")) >= 0, 60000);
+        QVERIFY(QDir(Platform::Paths::userVoicesFolder() + QStringLiteral("/IngridPremium.SpeechVoice"))
+                    .exists());
+        const QList<VoiceTableRowPtr> menuRows = VoicePopUpPrivate::currentVoiceRows();
+        QVERIFY(std::any_of(menuRows.cbegin(), menuRows.cend(), [](const VoiceTableRowPtr &row) {
+            return row->voiceObject() && row->voiceObject()->identifier() == IngridPremium;
+        }));
+        const auto downloadables = CZSpeechInstallationManager::sharedManager()->downloadableVoices();
+        QVERIFY(
+            std::none_of(downloadables.cbegin(), downloadables.cend(), [](const DownloadableVoicePtr &voice) {
+                return voice->identifier().contains(QLatin1String(".ingrid."));
+            }));
+
+        sheet = openSheet(popUp);
+        int ingridRows = 0;
+        for (const VoiceTableRowPtr &row : sheet->currentlyDisplayedVoiceRows()) {
+            if (row->voiceObject() && row->voiceObject()->identifier().contains(QLatin1String(".ingrid."))) {
+                ++ingridRows;
+                QCOMPARE(row->voiceObject()->identifier(), IngridPremium);
+                QVERIFY(row->isSelected());
+                QCOMPARE(row->voiceObject()->downloadStatus(), 0);
+            }
+        }
+        QCOMPARE(ingridRows, 1);
+        sheet->_updateButtonStates();
+        QVERIFY(sheet->window()
+                    ->findChild<QLabel *>(QStringLiteral("selectedDownloadSizeTextField"))
+                    ->text()
+                    .isEmpty());
+        sheet->cancelVoiceSelection();
+    }
+
 private:
+    static CustomizeVoicesWindowController *openSheet(CZVoicePopUpButton *popUp)
+    {
+        popUp->setCurrentIndex(popUp->count() - 1);
+        (void)popUp->sendAction();
+        CustomizeVoicesWindowController *sheet
+            = CZSpeechInstallationManagerSheets::voiceSelectionWindowController();
+        if (!sheet->window()->isVisible()) {
+            qFatal("the customise item did not open the sheet");
+        }
+        return sheet;
+    }
+    static int rowOf(CustomizeVoicesWindowController *sheet, const QString &identifier)
+    {
+        const QList<VoiceTableRowPtr> rows = sheet->currentlyDisplayedVoiceRows();
+        for (int row = 0; row < rows.size(); ++row) {
+            if (rows.at(row)->voiceObject() && rows.at(row)->voiceObject()->identifier() == identifier) {
+                return row;
+            }
+        }
+        return -1;
+    }
+
     // With CADENZA_SCREENSHOTS set to a folder, the windows are saved there as the test sees them.
     static void saveScreenshot(QWidget *widget, const char *name)
     {

@@ -142,8 +142,13 @@ private Q_SLOTS:
         auto chosen
             = downloadable(QStringLiteral("chosen"), QStringLiteral("Chosen"), QStringLiteral("de_DE"));
         chosen->setVisibility(1);
+        // Our own compact voices end in ".compact": they are the base voice of their premium form too.
+        m_speech->addVoice(TestEnvironment::voiceAttributes(
+            P + QStringLiteral("maren.compact"), QStringLiteral("Maren Compact"), QStringLiteral("en_US")));
+        auto maren = downloadable(
+            QStringLiteral("maren.premium"), QStringLiteral("Maren Premium"), QStringLiteral("en_US"));
         const auto rows = VoiceTableRow::arrangedRowsFromVoiceObjects(
-            {amy, premium, lonely, german, hidden, chosen}, false, false, true, false);
+            {amy, premium, lonely, german, hidden, chosen, maren}, false, false, true, false);
         QHash<QString, bool> ticked;
         for (const auto &row : rows) {
             if (!row->isGroupRow()) {
@@ -153,6 +158,7 @@ private Q_SLOTS:
         QVERIFY(ticked.value(P + QStringLiteral("amy")));
         QVERIFY(ticked.value(P + QStringLiteral("amy.premium"))); // its base voice is installed
         QVERIFY(!ticked.value(P + QStringLiteral("new.premium"))); // no base voice
+        QVERIFY(ticked.value(P + QStringLiteral("maren.premium"))); // its compact base voice is installed
         QVERIFY(!ticked.value(P + QStringLiteral("de.premium"))); // another locale
         QVERIFY(ticked.value(P + QStringLiteral("hidden"))); // being fetched: shown
         QCOMPARE(hidden->visibility(), 1);

@@ -122,6 +122,25 @@ private Q_SLOTS:
             2);
     }
 
+    void aPlainBaseVoiceMakesThePremiumAnUpgrade()
+    {
+        // The base voice of "X.premium" is installed when "X" or "X.compact" is: both make an upgrade.
+        QCOMPARE(byIdentifier(m_manager->downloadableVoices())
+                     .value(P + QStringLiteral("new.premium"))
+                     ->downloadStatus(),
+            2);
+        installVoice(QStringLiteral("new"), QStringLiteral("New"), 5);
+        const auto voices = m_manager->downloadableVoices();
+        QCOMPARE(byIdentifier(voices).value(P + QStringLiteral("new.premium"))->downloadStatus(), 1);
+        const auto plain = CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("new"));
+        QCOMPARE(m_manager->downloadableVoiceUpgradeForVoice(*plain, voices)->identifier(),
+            P + QStringLiteral("new.premium"));
+        // A voice whose identifier merely begins with the base is another voice, not its twin.
+        installVoice(QStringLiteral("newer.compact"), QStringLiteral("Newer Compact"), 5);
+        const auto other = CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("newer.compact"));
+        QVERIFY(!m_manager->downloadableVoiceUpgradeForVoice(*other, voices));
+    }
+
     void theDefaultVoiceIsListedOnlyWhileOlder()
     {
         installVoice(QStringLiteral("Orin"), QStringLiteral("Orin"), 10, QStringLiteral("1.3"));
