@@ -12,6 +12,7 @@
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
 #include "platform/SizeVariants.h"
+#include "platform/SoundService.h"
 #include "platform/VisibleRowViews.h"
 #include "platform/VoiceDescription.h"
 #include "speech-items/CZSpeechItem.h"
@@ -20,8 +21,6 @@
 
 #include "ui_VoiceCustomization.h"
 
-#include <QAudioOutput>
-#include <QBuffer>
 #include <QComboBox>
 #include <QDialog>
 #include <QFile>
@@ -29,7 +28,6 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QLocale>
-#include <QMediaPlayer>
 #include <QPushButton>
 #include <QScrollBar>
 #include <QStyle>
@@ -380,7 +378,7 @@ void CustomizeVoicesWindowController::_setRowStatusFieldView(
         text = texts().text(QStringLiteral("DownloadStatusTextPendingItemFormat"));
     } else if (status == 3) {
         const qint64 percent = qint64(std::trunc(voiceObject->downloadPercentComplete()));
-        const QString number = QLocale().toString(percent);
+        const QString number = CZSpeechItem::displayStringForPercent(percent);
         text = texts().format(percent >= 1
                 ? QStringLiteral("DownloadStatusTextInProgressWithPercentCompleteFormat")
                 : QStringLiteral("DownloadStatusTextInProgressFormat"),
@@ -578,21 +576,16 @@ CZVoiceObjectPtr CustomizeVoicesWindowController::_voiceObjectForCurrentlySelect
 
 bool CustomizeVoicesWindowController::_anyVoicePlaying() const
 {
-    const bool soundPlaying = m_audioChannel && m_audioChannel->playbackState() == QMediaPlayer::PlayingState;
+    const bool soundPlaying = m_sound && m_sound->isActive();
     return soundPlaying || (m_synthesizer && m_synthesizer->isSpeaking());
 }
 
 void CustomizeVoicesWindowController::_stopAndResetAllVoicePlaying()
 {
-    if (m_audioChannel) {
-        m_audioChannel->disconnect(this);
-        m_audioChannel->stop();
-        m_audioChannel->deleteLater();
-        m_audioChannel = nullptr;
-        m_audioOutput->deleteLater();
-        m_audioOutput = nullptr;
-        m_audioData->deleteLater();
-        m_audioData = nullptr;
+    if (m_sound) {
+        m_sound->disconnect(this);
+        m_sound->stop();
+        m_sound = nullptr;
     }
     if (m_synthesizer) {
         m_synthesizer->disconnect(this);
@@ -627,22 +620,18 @@ void CustomizeVoicesWindowController::startStopPlayingSelection()
             Platform::Alert::beep();
             return;
         }
-        // Loaded into memory, not played by reference.
-        m_audioData = new QBuffer(this);
-        m_audioData->setData(sample.readAll());
-        m_audioData->open(QIODevice::ReadOnly);
-        m_audioOutput = new QAudioOutput(this);
-        m_audioChannel = new QMediaPlayer(this);
-        m_audioChannel->setAudioOutput(m_audioOutput);
-        connect(m_audioChannel, &QMediaPlayer::mediaStatusChanged, this,
-            [this](QMediaPlayer::MediaStatus status) {
-                if (status == QMediaPlayer::EndOfMedia || status == QMediaPlayer::InvalidMedia) {
-                    soundDidFinishPlaying();
-                }
-            });
-        m_audioChannel->setSourceDevice(m_audioData, QUrl(QStringLiteral("sample.m4a")));
-        m_audioChannel->play();
-        started = m_audioChannel->error() == QMediaPlayer::NoError;
+        // Loaded into memory, not played by reference. The sound service answers later: the button
+        // shows Stop once the sample is audible; one that cannot play beeps and leaves it on Play.
+        m_sound = &Platform::Services::sound();
+        connect(
+            m_sound, &Platform::SoundService::started, this, [this] { _showPlayStopButtonAsPlaying(true); });
+        connect(m_sound, &Platform::SoundService::finished, this,
+            &CustomizeVoicesWindowController::soundDidFinishPlaying);
+        connect(m_sound, &Platform::SoundService::failed, this, [this] {
+            Platform::Alert::beep();
+            soundDidFinishPlaying();
+        });
+        m_sound->play(sample.readAll(), QStringLiteral("sample.m4a"));
     } else {
         m_synthesizer = SpeechSynthesizer::initWithVoice(voice->identifier());
         if (m_synthesizer) {
@@ -686,12 +675,24 @@ void CustomizeVoicesWindowController::_updateRowDownloadStatus()
     QMutexLocker locker(&m_lock);
     for (const QVariant &entry : records) {
         const QVariantMap record = entry.toMap();
-        const int row = displayedRowOfVoice(record.value(InstallerProtocol::ObjectIDKey).toString());
+        // The record may name the full-size voice being fetched rather than the row's own.
+        int row = -1;
+        auto match = CZSpeechInstallationManager::RecordMatch::None;
+        for (int candidate = 0; candidate < m_currentlyDisplayedVoiceRows.size() && row < 0; ++candidate) {
+            const CZVoiceObjectPtr &voice = m_currentlyDisplayedVoiceRows.at(candidate)->voiceObject();
+            if (voice) {
+                match = CZSpeechInstallationManager::installationRecordMatch(record, *voice);
+                row = match == CZSpeechInstallationManager::RecordMatch::None ? -1 : candidate;
+            }
+        }
         if (row < 0) {
             continue;
         }
         const VoiceTableRowPtr &displayed = m_currentlyDisplayedVoiceRows.at(row);
         const CZVoiceObjectPtr &voice = displayed->voiceObject();
+        if (match == CZSpeechInstallationManager::RecordMatch::FullSize) {
+            std::static_pointer_cast<DownloadableVoice>(voice)->setDownloadFullSize(true);
+        }
         voice->setDownloadStatus(record.value(InstallerProtocol::ItemDownloadStatusKey).toLongLong());
         voice->setDownloadPercentComplete(record.value(InstallerProtocol::ItemPercentCompleteKey).toDouble());
         if (VoiceTableCellView *view = existingViewForRow(row)) {
@@ -739,11 +740,22 @@ void CustomizeVoicesWindowController::acceptVoiceSelection()
                 continue;
             }
             const CZVoiceObjectPtr &voice = row->voiceObject();
-            const auto entry = table.constFind(voice->identifier());
-            // A missing entry counts as 0, so every shown voice ends up with one.
-            if (entry == table.constEnd() || entry->toLongLong() != voice->visibility()) {
-                table.insert(voice->identifier(), voice->visibility());
-                written = true;
+            QStringList identifiers {voice->identifier()};
+            // A voice fetched at full size installs its full-size voice: the tick follows it there.
+            if (const auto *downloadable
+                = voice->isDownloadable() ? static_cast<const DownloadableVoice *>(voice.get()) : nullptr;
+                downloadable && row->isSelected() && downloadable->downloadFullSize()
+                && !downloadable->fullSizeBundleIdentifier().isEmpty()
+                && downloadable->fullSizeBundleIdentifier() != voice->identifier()) {
+                identifiers.append(downloadable->fullSizeBundleIdentifier());
+            }
+            for (const QString &identifier : std::as_const(identifiers)) {
+                const auto entry = table.constFind(identifier);
+                // A missing entry counts as 0, so every shown voice ends up with one.
+                if (entry == table.constEnd() || entry->toLongLong() != voice->visibility()) {
+                    table.insert(identifier, voice->visibility());
+                    written = true;
+                }
             }
         }
         if (written) {

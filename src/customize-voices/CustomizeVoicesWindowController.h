@@ -12,13 +12,10 @@
 
 #include <memory>
 
-class QBuffer;
 class QComboBox;
 class QDialog;
 class QLabel;
 class QLineEdit;
-class QMediaPlayer;
-class QAudioOutput;
 class QPushButton;
 class QTableView;
 class QTimer;
@@ -28,8 +25,9 @@ namespace Cadenza {
 class CZVoiceRowCheckboxButton;
 class SpeechSynthesizer;
 namespace Platform {
+class SoundService;
 class VisibleRowViews;
-}
+} // namespace Platform
 class VoiceSelectionModel;
 class VoiceTableCellView;
 
@@ -124,9 +122,7 @@ private:
     VoiceSelectionModel *m_model;
 
     std::unique_ptr<SpeechSynthesizer> m_synthesizer;
-    QMediaPlayer *m_audioChannel = nullptr;
-    QAudioOutput *m_audioOutput = nullptr;
-    QBuffer *m_audioData = nullptr;
+    QPointer<Platform::SoundService> m_sound; ///< while a sample plays
     QList<CZVoiceObjectPtr> m_allVoicesObjects;
     QList<std::shared_ptr<class DownloadableVoice>> m_downloadableVoices; ///< as of the last rebuild
     QList<VoiceTableRowPtr> m_currentlyDisplayedVoiceRows;

@@ -5,6 +5,7 @@
 #include "DBusNotificationCenter.h"
 #include "EnvironmentUserLocaleService.h"
 #include "FilePreferencesStore.h"
+#include "MediaSoundService.h"
 #include "PowerSourcesInfo.h"
 #include "RecognitionService.h"
 #include "UnixMessagePortService.h"
@@ -26,6 +27,7 @@ struct Registry
     std::shared_ptr<RecognitionService> recognition;
     std::shared_ptr<PowerSourcesInfo> powerSources;
     std::shared_ptr<AdministratorService> administrator;
+    std::shared_ptr<SoundService> sound;
 };
 
 Registry &registry()
@@ -150,6 +152,20 @@ AdministratorService &Services::administrator()
 void Services::setAdministrator(std::shared_ptr<AdministratorService> service)
 {
     replace(&Registry::administrator, std::move(service));
+}
+
+} // namespace Cadenza::Platform
+
+namespace Cadenza::Platform {
+
+SoundService &Services::sound()
+{
+    return serviceOf<SoundService, MediaSoundService>(&Registry::sound);
+}
+
+void Services::setSound(std::shared_ptr<SoundService> service)
+{
+    replace(&Registry::sound, std::move(service));
 }
 
 } // namespace Cadenza::Platform

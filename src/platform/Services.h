@@ -13,6 +13,7 @@ class MessagePortService;
 class PowerSourcesInfo;
 class PreferencesStore;
 class RecognitionService;
+class SoundService;
 class SpeechSynthesisService;
 class UserLocaleService;
 
@@ -31,6 +32,8 @@ public:
     static RecognitionService &recognition();
     static PowerSourcesInfo &powerSources();
     static AdministratorService &administrator();
+    /// Sound playback (voice samples); never blocks its caller.
+    static SoundService &sound();
 
     /// Replaces a service; passing nullptr returns to the Linux implementation.
     static void setPreferences(std::shared_ptr<PreferencesStore> store);
@@ -41,6 +44,7 @@ public:
     static void setRecognition(std::shared_ptr<RecognitionService> service);
     static void setPowerSources(std::shared_ptr<PowerSourcesInfo> info);
     static void setAdministrator(std::shared_ptr<AdministratorService> service);
+    static void setSound(std::shared_ptr<SoundService> service);
 };
 
 } // namespace Cadenza::Platform

@@ -303,7 +303,7 @@ void CZCustomizeSRLanguagesWindowController::_setRowStatusFieldView(QLabel *stat
         text = texts().format(percent > 0
                 ? QStringLiteral("DownloadStatusTextInProgressWithPercentCompleteFormat")
                 : QStringLiteral("DownloadStatusTextInProgressFormat"),
-            {QLocale().toString(percent)});
+            {CZSpeechItem::displayStringForPercent(percent)});
         break;
     }
     case 2:

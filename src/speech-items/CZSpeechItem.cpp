@@ -17,6 +17,8 @@
 
 #include <cstdlib>
 
+#include <unicode/unum.h>
+
 namespace Cadenza {
 
 using Platform::Locale;
@@ -262,6 +264,25 @@ QString CZSpeechItem::displayStringForByteSize(quint64 byteSize)
         gigabytes.chop(zero.size());
     }
     return table.format(QStringLiteral("GBSize"), {gigabytes});
+}
+
+QString CZSpeechItem::displayStringForPercent(qint64 percent)
+{
+    const QString locale = Platform::Services::userLocale().currentLocaleIdentifier();
+    // ICU knows where each language puts the sign and whether a space comes before it.
+    UErrorCode status = U_ZERO_ERROR;
+    UNumberFormat *format
+        = unum_open(UNUM_PERCENT, nullptr, 0, locale.toUtf8().constData(), nullptr, &status);
+    if (U_SUCCESS(status)) {
+        UChar buffer[64];
+        const int32_t length
+            = unum_formatDouble(format, double(percent) / 100.0, buffer, 64, nullptr, &status);
+        unum_close(format);
+        if (U_SUCCESS(status) && length > 0 && length <= 64) {
+            return QString(reinterpret_cast<const QChar *>(buffer), length);
+        }
+    }
+    return QLocale(locale).toString(percent) + QLocale(locale).percent();
 }
 
 QString CZSpeechItem::displayStringForTimeRemaining(double seconds)

@@ -58,6 +58,8 @@ public:
     [[nodiscard]] static QString displayStringForByteSize(quint64 byteSize);
     /// "Less than a minute remaining", "About 3 minutes remaining", …
     [[nodiscard]] static QString displayStringForTimeRemaining(double seconds);
+    /// @p percent (0 to 100) in the user's percent format: "44%" in English, "44 %" in German.
+    [[nodiscard]] static QString displayStringForPercent(qint64 percent);
     /// The catalogue "SpeechDataDefaults", loaded once; empty when it cannot be read.
     [[nodiscard]] static QVariantMap installationDictionaryCache();
     /// The locale that display names are given in: the language of the host's localisation.

@@ -5,13 +5,16 @@
 #include "customize-voices/CZVoiceRowTextView.h"
 #include "customize-voices/CustomizeVoicesWindowController.h"
 #include "customize-voices/VoiceTableCellView.h"
+#include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
 #include "installation/InstallerProtocol.h"
 #include "platform/Alert.h"
 #include "platform/BundleSpeechSynthesisService.h"
 #include "platform/FakeMessagePortService.h"
+#include "platform/FakeSoundService.h"
 #include "platform/FakeUserLocaleService.h"
 #include "platform/InProcessNotificationCenter.h"
+#include "platform/MediaSoundService.h"
 #include "platform/MemoryPreferencesStore.h"
 #include "platform/Paths.h"
 #include "platform/Services.h"
@@ -32,6 +35,7 @@
 #include <QSignalSpy>
 #include <QTableView>
 #include <QTest>
+#include <QTimer>
 
 using namespace Cadenza;
 using namespace Cadenza::Platform;
@@ -290,7 +294,7 @@ private Q_SLOTS:
                 {InstallerProtocol::ItemPercentCompleteKey, 45.9}}});
         // The 2-second poll brings the percentage.
         QTRY_COMPARE_WITH_TIMEOUT(
-            femke->downloadMessageTextField()->text(), QStringLiteral("Downloading 45 %"), 5000);
+            femke->downloadMessageTextField()->text(), QStringLiteral("Downloading 45%"), 5000);
     }
 
     void cancelWritesNothing()
@@ -335,6 +339,140 @@ private Q_SLOTS:
         play->click();
         QCOMPARE(play->text(), QStringLiteral("Play"));
         QVERIFY(!m_controller->_anyVoicePlaying());
+    }
+
+    void sheetTicksAgreeWithTheMenusForEverySampleLocale_data()
+    {
+        QTest::addColumn<QString>("locale");
+        // The locales of the sample voices that come installed.
+        for (const char *locale : {"en_US", "en_GB", "en_AU", "de_DE", "fr_FR", "fr_BE", "it_IT", "es_ES",
+                 "es_MX", "pt_BR", "ja_JP", "hi_IN"}) {
+            QTest::newRow(locale) << QString::fromLatin1(locale);
+        }
+    }
+    void sheetTicksAgreeWithTheMenusForEverySampleLocale()
+    {
+        QFETCH(QString, locale);
+        // The sample voices and the sample catalogue, nothing chosen by the user yet.
+        m_controller.reset();
+        m_environment = std::make_unique<TestEnvironment>();
+        m_environment->installSampleVoices();
+        Services::setSpeechSynthesis(std::make_shared<BundleSpeechSynthesisService>());
+        Services::setPreferences(std::make_shared<MemoryPreferencesStore>());
+        Services::setUserLocale(std::make_shared<FakeUserLocaleService>(QStringList {locale}, locale));
+        SpeechItemPrivate::setInstallationDictionary(std::nullopt);
+        m_controller = std::make_unique<CustomizeVoicesWindowController>();
+
+        QSet<QString> inMenu;
+        QString shown;
+        QString shownUpgrade;
+        {
+            CZVoicePopUpButton popUp(m_client.get());
+            popUp.buildPopUpButtonWithSelectVoiceIdentifier(QString());
+            // The voice a pop-up shows stays listed whatever the ticks say.
+            shown = popUp.selectedVoiceAttributes()
+                        .value_or(QVariantMap())
+                        .value(QStringLiteral("VoiceIdentifier"))
+                        .toString();
+            // A sheet row may stand for an installed voice through its upgrade: both count as listed.
+            CZSpeechInstallationManager *manager = CZSpeechInstallationManager::sharedManager();
+            const QList<DownloadableVoicePtr> downloadables = manager->downloadableVoices();
+            for (const VoiceTableRowPtr &entry : VoicePopUpPrivate::currentVoiceRows()) {
+                if (!entry->isGroupRow()) {
+                    inMenu.insert(entry->voiceObject()->identifier());
+                    if (const auto upgrade
+                        = manager->downloadableVoiceUpgradeForVoice(*entry->voiceObject(), downloadables)) {
+                        inMenu.insert(upgrade->identifier());
+                        if (entry->voiceObject()->identifier() == shown) {
+                            shownUpgrade = upgrade->identifier();
+                        }
+                    }
+                }
+            }
+        }
+        VoicePopUpPrivate::resetProcessState();
+        QVERIFY(!inMenu.isEmpty());
+
+        show();
+        int installedRows = 0;
+        for (const VoiceTableRowPtr &entry : m_controller->currentlyDisplayedVoiceRows()) {
+            // Rows of installed voices, and of upgrades that stand for one; other downloads are not in menus.
+            if (entry->isGroupRow()
+                || (entry->voiceObject()->isDownloadable() && entry->voiceObject()->downloadStatus() != 1)) {
+                continue;
+            }
+            ++installedRows;
+            const QString identifier = entry->voiceObject()->identifier();
+            if (identifier == shown || identifier == shownUpgrade) {
+                QVERIFY(inMenu.contains(identifier));
+                continue;
+            }
+            QVERIFY2(entry->isSelected() == inMenu.contains(identifier),
+                qPrintable(QStringLiteral("%1: ticked %2, in the menu %3")
+                               .arg(identifier)
+                               .arg(entry->isSelected())
+                               .arg(inMenu.contains(identifier))));
+        }
+        QVERIFY(installedRows > 0);
+        m_controller->cancelVoiceSelection();
+    }
+
+    void playingADownloadableSampleReturnsToTheEventLoop()
+    {
+        // The real sound service, on whatever audio this machine has (none, in the test world).
+        Services::setSound(std::make_shared<MediaSoundService>());
+        show();
+        QTableView *table = m_controller->voiceSelectionTableView();
+        QPushButton *play = button("playStopButton");
+        table->selectRow(rowIndex(QStringLiteral("Femke")));
+        QTRY_VERIFY(play->isEnabled()); // Femke's sample is recorded
+        bool timerFired = false;
+        QTimer::singleShot(0, this, [&timerFired] { timerFired = true; });
+        play->click();
+        QTRY_VERIFY_WITH_TIMEOUT(timerFired, 2000);
+        // It either plays (Stop) or beeps and stays on Play; it never hangs.
+        QTRY_VERIFY_WITH_TIMEOUT(play->text() == QStringLiteral("Stop") || Alert::beepCount() == 1, 10000);
+        if (Alert::beepCount() == 1) {
+            QCOMPARE(play->text(), QStringLiteral("Play"));
+            QVERIFY(!m_controller->_anyVoicePlaying());
+        } else {
+            play->click();
+            QCOMPARE(play->text(), QStringLiteral("Play"));
+        }
+        Services::setSound(nullptr);
+    }
+
+    void aSampleThatCannotPlayBeepsAndStaysOnPlay()
+    {
+        auto sound = std::make_shared<FakeSoundService>();
+        sound->setOutcome(FakeSoundService::Outcome::Fails);
+        Services::setSound(sound);
+        show();
+        QPushButton *play = button("playStopButton");
+        m_controller->voiceSelectionTableView()->selectRow(rowIndex(QStringLiteral("Femke")));
+        QTRY_VERIFY(play->isEnabled());
+        QStringList titles;
+        connect(sound.get(), &SoundService::failed, this, [&] { titles.append(play->text()); });
+        play->click();
+        QCOMPARE(sound->played().size(), 1);
+        QTRY_COMPARE(Alert::beepCount(), 1);
+        QCOMPARE(titles, QStringList {QStringLiteral("Play")}); // never showed Stop
+        QTest::qWait(10);
+        QCOMPARE(play->text(), QStringLiteral("Play"));
+        QVERIFY(!m_controller->_anyVoicePlaying());
+
+        // One that plays shows Stop until it ends, or until Stop is pressed.
+        sound->setOutcome(FakeSoundService::Outcome::Plays);
+        play->click();
+        QTRY_COMPARE(play->text(), QStringLiteral("Stop"));
+        sound->finishPlaying();
+        QTRY_COMPARE(play->text(), QStringLiteral("Play"));
+        play->click();
+        QTRY_COMPARE(play->text(), QStringLiteral("Stop"));
+        play->click();
+        QCOMPARE(play->text(), QStringLiteral("Play"));
+        QVERIFY(!sound->isActive());
+        Services::setSound(nullptr);
     }
 
     void keyboardTicksTheCurrentVoice()
