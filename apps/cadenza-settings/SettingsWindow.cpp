@@ -5,8 +5,10 @@
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
+#include "speech-items/CZSpeechItem.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-settings/SpeechSynthesizerVoiceSettings.h"
+#include "voices/CZVoiceObject.h"
 #include "voices/SpeechSynthesizer.h"
 
 #include <QComboBox>
@@ -178,17 +180,23 @@ void SettingsWindow::didEndWithVoiceSettings(const QVariant &settings)
 void SettingsWindow::showVoiceSettings()
 {
     QStringList parts;
+    // The user reads names, never identifiers; a voice that is gone keeps its identifier as its name.
     const QString voice = m_voiceSettings.value(kVoiceSettingsVoiceIdentifierKey).toString();
-    parts.append(
-        text("SettingsReadingVoiceFormat").arg(voice.isEmpty() ? text("SettingsSystemVoiceText") : voice));
+    QString voiceName = text("SettingsSystemVoiceText");
+    if (!voice.isEmpty()) {
+        const CZVoiceObjectPtr object = CZVoiceObject::initWithVoiceIdentifier(voice);
+        voiceName = object && !object->displayName().isEmpty() ? object->displayName() : voice;
+    }
+    parts.append(text("SettingsReadingVoiceFormat").arg(voiceName));
     if (m_voiceSettings.contains(kVoiceSettingsCustomRelativeRateKey)) {
-        parts.append(
-            text("SettingsRateFormat")
-                .arg(qRound(m_voiceSettings.value(kVoiceSettingsCustomRelativeRateKey).toDouble() * 100)));
+        parts.append(text("SettingsRateFormat")
+                         .arg(CZSpeechItem::displayStringForPercent(qRound64(
+                             m_voiceSettings.value(kVoiceSettingsCustomRelativeRateKey).toDouble() * 100))));
     }
     if (m_voiceSettings.contains(kVoiceSettingsCustomVolumeKey)) {
         parts.append(text("SettingsVolumeFormat")
-                         .arg(qRound(m_voiceSettings.value(kVoiceSettingsCustomVolumeKey).toDouble() * 100)));
+                         .arg(CZSpeechItem::displayStringForPercent(qRound64(
+                             m_voiceSettings.value(kVoiceSettingsCustomVolumeKey).toDouble() * 100))));
     }
     m_voiceSettingsSummary->setText(parts.join(QStringLiteral(", ")));
 }

@@ -100,8 +100,8 @@
         <translation>Wird geladen</translation>
     </message>
     <message id="DownloadStatusTextInProgressWithPercentCompleteFormat">
-        <source>Downloading %1 %</source>
-        <translation>Wird geladen: %1 %</translation>
+        <source>Downloading %1</source>
+        <translation>Wird geladen: %1</translation>
     </message>
     <message id="DownloadStatusTextRequiredItemFormat">
         <source>Required</source>
@@ -261,7 +261,7 @@
     </message>
     <message id="SettingsSpeech">
         <source>Speech</source>
-        <translation>Sprache</translation>
+        <translation>Sprachausgabe</translation>
     </message>
     <message id="SettingsSystemVoiceName">
         <source>System voice</source>
@@ -324,12 +324,12 @@
         <translation>Systemstimme</translation>
     </message>
     <message id="SettingsRateFormat">
-        <source>rate %1 %</source>
-        <translation>Tempo %1 %</translation>
+        <source>rate %1</source>
+        <translation>Tempo %1</translation>
     </message>
     <message id="SettingsVolumeFormat">
-        <source>volume %1 %</source>
-        <translation>Lautstärke %1 %</translation>
+        <source>volume %1</source>
+        <translation>Lautstärke %1</translation>
     </message>
 </context>
 </TS>

@@ -100,8 +100,8 @@
         <translation>Downloading</translation>
     </message>
     <message id="DownloadStatusTextInProgressWithPercentCompleteFormat">
-        <source>Downloading %1 %</source>
-        <translation>Downloading %1 %</translation>
+        <source>Downloading %1</source>
+        <translation>Downloading %1</translation>
     </message>
     <message id="DownloadStatusTextRequiredItemFormat">
         <source>Required</source>
@@ -324,12 +324,12 @@
         <translation>system voice</translation>
     </message>
     <message id="SettingsRateFormat">
-        <source>rate %1 %</source>
-        <translation>rate %1 %</translation>
+        <source>rate %1</source>
+        <translation>rate %1</translation>
     </message>
     <message id="SettingsVolumeFormat">
-        <source>volume %1 %</source>
-        <translation>volume %1 %</translation>
+        <source>volume %1</source>
+        <translation>volume %1</translation>
     </message>
 </context>
 </TS>
