@@ -23,6 +23,14 @@ QString SRLanguageSelectionModel::textAt(int row) const
     return entry->isGroupRow() || !item ? entry->title() : item->countryDisplayString();
 }
 
+QString SRLanguageSelectionModel::accessibleTextAt(int row) const
+{
+    // Read out of its heading's sight, a country alone would not say which language it is.
+    const CZSRLanguageRowPtr &entry = m_rows.at(row);
+    const CZSRLanguageItemPtr item = entry->srLanguageItem();
+    return entry->isGroupRow() || !item ? entry->title() : item->displayTitle();
+}
+
 QString SRLanguageSelectionModel::identifierAt(int row) const
 {
     const CZSRLanguageItemPtr item = m_rows.at(row)->srLanguageItem();

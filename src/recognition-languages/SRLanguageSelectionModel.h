@@ -22,6 +22,8 @@ protected:
     bool isGroupRowAt(int row) const override { return m_rows.at(row)->isGroupRow(); }
     QString textAt(int row) const override;
     QString identifierAt(int row) const override;
+    QString accessibleTextAt(int row) const override;
+    bool isTickedAt(int row) const override { return m_rows.at(row)->isSelected(); }
 
 private:
     QList<CZSRLanguageRowPtr> m_rows;
