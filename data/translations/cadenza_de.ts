@@ -351,5 +351,9 @@
         <source>Language download progress</source>
         <translation>Fortschritt des Sprachpaket-Downloads</translation>
     </message>
+    <message id="SearchClearButtonName">
+        <source>Clear search</source>
+        <translation>Suche leeren</translation>
+    </message>
 </context>
 </TS>

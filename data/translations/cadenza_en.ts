@@ -351,5 +351,9 @@
         <source>Language download progress</source>
         <translation>Language download progress</translation>
     </message>
+    <message id="SearchClearButtonName">
+        <source>Clear search</source>
+        <translation>Clear search</translation>
+    </message>
 </context>
 </TS>

@@ -36,6 +36,7 @@
 #include <QStyle>
 #include <QTableView>
 #include <QTimer>
+#include <QToolButton>
 
 #include <cmath>
 
@@ -78,6 +79,10 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
     ui.explanationLabel->setText(texts().text(QStringLiteral("VoiceCustomizationExplanation")));
     m_searchField->setPlaceholderText(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
     m_searchField->setAccessibleName(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
+    // The field's clear button is a control of its own.
+    for (QToolButton *clear : m_searchField->findChildren<QToolButton *>()) {
+        clear->setAccessibleName(texts().text(QStringLiteral("SearchClearButtonName")));
+    }
     m_noResultsFoundTextField->setText(texts().text(QStringLiteral("VoiceCustomizationNoResults")));
     m_okButton->setText(texts().text(QStringLiteral("OK")));
     m_cancelButton->setText(texts().text(QStringLiteral("Cancel")));

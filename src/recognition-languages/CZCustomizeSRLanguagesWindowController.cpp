@@ -27,6 +27,7 @@
 #include <QStyle>
 #include <QTableView>
 #include <QTimer>
+#include <QToolButton>
 
 #include <cmath>
 
@@ -65,6 +66,10 @@ CZCustomizeSRLanguagesWindowController::CZCustomizeSRLanguagesWindowController(Q
     ui.explanationLabel->setText(texts().text(QStringLiteral("SRLanguageCustomizationExplanation")));
     m_searchField->setPlaceholderText(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
     m_searchField->setAccessibleName(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
+    // The field's clear button is a control of its own.
+    for (QToolButton *clear : m_searchField->findChildren<QToolButton *>()) {
+        clear->setAccessibleName(texts().text(QStringLiteral("SearchClearButtonName")));
+    }
     m_noResultsFoundTextField->setText(texts().text(QStringLiteral("VoiceCustomizationNoResults")));
     m_okButton->setText(texts().text(QStringLiteral("OK")));
     m_cancelButton->setText(texts().text(QStringLiteral("Cancel")));
@@ -280,10 +285,11 @@ CZSRLanguageTableCellView *CZCustomizeSRLanguagesWindowController::viewForRow(
     view->activeCheckbox()->setEnabled(!greyed);
     view->activeCheckbox()->setLocaleIdentifier(item->localeIdentifier());
     view->activeCheckbox()->setProperty("cellIdentifier", QStringLiteral("_CADENZA_VOICE_CHECKBOX"));
-    view->activeCheckbox()->setAccessibleName(item->displayTitle());
+    view->activeCheckbox()->setAccessibleName(SRLanguageSelectionModel::accessibleNameForItem(*item));
     // A pop-up reads its choice as its name on Linux and its label elsewhere; the description says
     // what it chooses on every platform.
-    const QString sizeChoice = texts().format(QStringLiteral("DownloadVariantAccessibleFormat"), {item->displayTitle()});
+    const QString sizeChoice = texts().format(QStringLiteral("DownloadVariantAccessibleFormat"),
+        {SRLanguageSelectionModel::accessibleNameForItem(*item)});
     view->downloadVariantPopUpButton()->setAccessibleName(sizeChoice);
     view->downloadVariantPopUpButton()->setAccessibleDescription(sizeChoice);
     _setRowStatusFieldView(

@@ -5,6 +5,7 @@ import sys
 import time
 
 import pyatspi
+from gi.repository import GLib
 
 APP_NAME = "cadenza-settings"
 # Roles a user operates: each must have a name.
@@ -123,20 +124,29 @@ def find_all(root, predicate):
     return found
 
 
+def showing_window(app, title):
+    """The shown top-level window (frame, dialog or alert) called title, or None; raises when the
+    bus could not answer."""
+    fresh(app)
+    for i in range(app.childCount):
+        child = app.getChildAtIndex(i)
+        if child is not None and child.name == title and pyatspi.STATE_SHOWING in states(child):
+            return child
+    return None
+
+
 def window(app, title, timeout=15.0):
-    """The shown top-level window (frame, dialog or alert) called title."""
-    def look():
-        fresh(app)
-        for i in range(app.childCount):
-            child = app.getChildAtIndex(i)
-            if child is not None and child.name == title and pyatspi.STATE_SHOWING in states(child):
-                return child
-        return None
-    return wait_for(look, timeout)
+    return wait_for(lambda: showing_window(app, title), timeout)
 
 
 def gone(app, title, timeout=15.0):
-    return wait_for(lambda: window(app, title, timeout=0) is None, timeout)
+    """True once no shown window is called title (an unanswered question is not an answer)."""
+    def closed():
+        try:
+            return showing_window(app, title) is None
+        except Exception:
+            return False
+    return wait_for(closed, timeout)
 
 
 def dump(node, out=sys.stdout):
@@ -152,12 +162,23 @@ def dump(node, out=sys.stdout):
             continue
 
 
+def labels(node):
+    """The names of what labels node (its labelled-by relations): how a pop-up is introduced."""
+    names = []
+    for relation in node.getRelationSet():
+        if relation.getRelationType() == pyatspi.RELATION_LABELLED_BY:
+            for i in range(relation.getNTargets()):
+                names.append(relation.getTarget(i).name.replace("&", ""))
+    return names
+
+
 def unnamed_controls(root):
     """Controls that are shown but have no name, as (role, parent name) pairs."""
     missing = []
     for node, _ in walk(fresh(root)):
         try:
-            if role(node) in CONTROL_ROLES and pyatspi.STATE_SHOWING in states(node) and not node.name:
+            if role(node) in CONTROL_ROLES and pyatspi.STATE_SHOWING in states(node) and not node.name \
+                    and not labels(node) and not node.description:
                 parent = node.parent
                 missing.append("%s in %s %r" % (node.getRoleName(), parent.getRoleName(), parent.name))
         except Exception:
@@ -165,10 +186,81 @@ def unnamed_controls(root):
     return missing
 
 
+class EventLog:
+    """AT-SPI events of the given types as (type, source name, detail1, source description), in order."""
+
+    def __init__(self, *types):
+        self.seen = []
+        self.types = types
+        pyatspi.Registry.registerEventListener(self._heard, *types)
+
+    def _heard(self, event):
+        try:
+            self.seen.append((event.type, event.source.name, event.detail1, event.source.description))
+        except Exception:
+            self.seen.append((event.type, None, event.detail1, None))
+
+    def pump(self, seconds=1.0):
+        context = GLib.MainContext.default()
+        deadline = time.monotonic() + seconds
+        while time.monotonic() < deadline:
+            while context.pending():
+                context.iteration(False)
+            time.sleep(0.05)
+
+    def wait_for(self, predicate, timeout=10.0):
+        deadline = time.monotonic() + timeout
+        while time.monotonic() < deadline:
+            self.pump(0.2)
+            for entry in self.seen:
+                if predicate(entry):
+                    return entry
+        return None
+
+    def clear(self):
+        self.pump(0.2)
+        self.seen = []
+
+
 def keys(*names):
     """Key presses through the X server, as a keyboard would make them."""
     subprocess.run(["xdotool", "key", "--delay", "120"] + list(names), check=True)
     time.sleep(0.4)
+
+
+def focus_window(title):
+    """Gives the X input focus back to a window, as a window manager would when a sheet closes."""
+    found = subprocess.run(["xdotool", "search", "--onlyvisible", "--name", "^%s$" % title],
+                           capture_output=True, text=True).stdout.split()
+    if found:
+        subprocess.run(["xdotool", "windowfocus", "--sync", found[0]], check=False)
+        time.sleep(0.5)
+
+
+def focused_in(root):
+    """The innermost focused node under root: a row of a focused table rather than the table."""
+    found = None
+    for node, _ in walk(fresh(root)):
+        try:
+            if pyatspi.STATE_FOCUSED in states(node) and role(node) not in (pyatspi.ROLE_FRAME,
+                                                                            pyatspi.ROLE_DIALOG):
+                found = node
+        except Exception:
+            continue
+    return found
+
+
+def tab_to(root, predicate, presses=20):
+    """Presses Tab until the focus is on a node matching predicate; returns it, or None."""
+    for _ in range(presses):
+        node = focused_in(root)
+        try:
+            if node is not None and predicate(node):
+                return node
+        except Exception:
+            pass
+        keys("Tab")
+    return None
 
 
 def type_text(text):
