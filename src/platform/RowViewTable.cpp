@@ -38,7 +38,11 @@ RowViewTable::RowViewTable(QWidget *parent)
 
 RowViewTable::~RowViewTable()
 {
-    forgetAccessibleRows();
+    // After the application object is gone the accessibility cache may be gone too; then the
+    // process ends and the stand-ins with it.
+    if (QCoreApplication::instance()) {
+        forgetAccessibleRows();
+    }
 }
 
 void RowViewTable::setModel(QAbstractItemModel *model)

@@ -9,7 +9,7 @@ import sys
 
 sys.path.insert(0, os.path.dirname(os.path.abspath(__file__)))
 import pyatspi  # noqa: E402
-from atspi_support import (EventLog, application, check, dump, find, finish, focused_in, fresh, gone, keys, log, role,  # noqa: E402
+from atspi_support import (EventLog, application, check, find, finish, focused_in, fresh, gone, keys, log, role,  # noqa: E402
                            screenshot, states, type_text, wait_for, window)
 
 

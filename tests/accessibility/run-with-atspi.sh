@@ -38,7 +38,7 @@ fi
 pids+=($!)
 
 "$source/scripts/install-sample-voices" --root "$CADENZA_ROOT" >/dev/null
-/usr/bin/python3 "$source/tests/accessibility/slow_repository.py" "$build/data/repository" 8 >"$world/port" &
+/usr/bin/python3 "$source/tests/accessibility/slow_repository.py" "$build/data/repository" 20 >"$world/port" &
 pids+=($!)
 for _ in $(seq 50); do [ -s "$world/port" ] && break; sleep 0.1; done
 port=$(cat "$world/port")

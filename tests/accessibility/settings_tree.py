@@ -7,8 +7,9 @@ import time
 
 sys.path.insert(0, os.path.dirname(os.path.abspath(__file__)))
 import pyatspi  # noqa: E402
-from atspi_support import (application, check, dump, find, find_all, finish, focus_window, fresh, gone, keys, tab_to,  # noqa: E402
-                           labels, log, role, screenshot, states, type_text, unnamed_controls, wait_for, window)
+from atspi_support import (application, check, dump, find, find_all, finish, focus_window, focused_in,  # noqa: E402
+                           fresh, gone, keys, labels, role, screenshot, states, tab_to, type_text,
+                           unnamed_controls, wait_for, window)
 
 app = application()
 main = window(app, "Speech")
@@ -62,6 +63,43 @@ femke = next((b for b in boxes if b.name.startswith("Femke,")), None)
 check(femke is not None and pyatspi.STATE_CHECKED not in states(femke), "Femke's row is there, unchecked")
 check(find(sheet, lambda n: role(n) == pyatspi.ROLE_PUSH_BUTTON and n.name == "Play") is not None,
       "Play is a named button")
+
+# The upgrade tick of a row (Orin's better quality) is its child, reached with Tab from the table.
+def upgrade_box(row):
+    for i in range(row.childCount):
+        child = row.getChildAtIndex(i)
+        if role(child) == pyatspi.ROLE_CHECK_BOX and child.name.startswith("Update ("):
+            return child
+    return None
+
+
+upgradable = next((b for b in boxes if upgrade_box(b) is not None), None)
+check(upgradable is not None, "a row offers its upgrade as a named check box child")
+if upgradable is not None:
+    target = upgradable.name
+    keys("Tab")
+    for _ in range(len(rows)):
+        current = focused_in(sheet)
+        if current is not None and current.name == target:
+            break
+        keys("Down")
+    check(current is not None and current.name == target, "Down reaches %r" % target)
+    keys("Tab")
+    box = focused_in(sheet)
+    check(box is not None and box.name.startswith("Update ("), "Tab reaches its upgrade tick: %r"
+          % (box.name if box else None))
+    if box is not None:
+        before = pyatspi.STATE_CHECKED in states(box)
+        keys("space")
+        check(wait_for(lambda: (pyatspi.STATE_CHECKED in states(fresh(box))) != before, 5) is not None,
+              "Space toggles the upgrade tick")
+        keys("space")
+    keys("shift+Tab")
+    back = focused_in(sheet)
+    check(back is not None and back.name == target, "Shift+Tab goes back to the row")
+    keys("shift+Tab")
+    back = focused_in(sheet)
+    check(back is not None and back.name == "Search", "Shift+Tab from the table reaches the search field")
 
 # Search, tick from the keyboard: the row reads as checked, with its status and size choice.
 type_text("Femke")
