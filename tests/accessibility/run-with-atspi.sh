@@ -25,7 +25,7 @@ mkdir -p "$world"/{home,config,data,root,shots}
 mkdir -m 0700 "$world/runtime"
 export HOME="$world/home" XDG_CONFIG_HOME="$world/config" XDG_DATA_HOME="$world/data"
 export XDG_RUNTIME_DIR="$world/runtime" CADENZA_ROOT="$world/root" LANGUAGE=en_US LANG=C.UTF-8
-export QT_QPA_PLATFORM=xcb QT_LINUX_ACCESSIBILITY_ALWAYS_ON=1
+export QT_QPA_PLATFORM=xcb QT_LINUX_ACCESSIBILITY_ALWAYS_ON=1 PYTHONDONTWRITEBYTECODE=1
 export CADENZA_CLI="$build/apps/cadenza/cadenza" CADENZA_SHOTS="${CADENZA_SCREENSHOTS:-$world/shots}"
 mkdir -p "$CADENZA_SHOTS"
 
