@@ -8,6 +8,7 @@
 #include "voice-settings/VoiceSettingsAlertController.h"
 #include "voice-settings/VoiceSettingsSheetController.h"
 
+#include <QAccessibleWidget>
 #include <QApplication>
 #include <QCommandLineParser>
 #include <QDialog>
@@ -86,6 +87,11 @@ int main(int argc, char *argv[])
     parser.addOption(screenshots);
     parser.process(app);
 
+    // The main window is a plain widget; screen readers should meet it as a window.
+    QAccessible::installFactory([](const QString &, QObject *object) -> QAccessibleInterface * {
+        auto *settings = qobject_cast<SettingsWindow *>(object);
+        return settings ? new QAccessibleWidget(settings, QAccessible::Window) : nullptr;
+    });
     SettingsWindow window;
     if (parser.isSet(screenshots)) {
         return writeScreenshots(window, parser.value(screenshots));

@@ -331,5 +331,29 @@
         <source>volume %1</source>
         <translation>Lautstärke %1</translation>
     </message>
+    <message id="DownloadVariantAccessibleFormat">
+        <source>Download size for %1</source>
+        <translation>Downloadgröße für %1</translation>
+    </message>
+    <message id="LanguageWithCountryFormat">
+        <source>%1 (%2)</source>
+        <translation>%1 (%2)</translation>
+    </message>
+    <message id="AccessibleRowNameFormat">
+        <source>%1, %2</source>
+        <translation>%1, %2</translation>
+    </message>
+    <message id="VoiceDownloadProgressName">
+        <source>Voice download progress</source>
+        <translation>Fortschritt des Stimmen-Downloads</translation>
+    </message>
+    <message id="LanguageDownloadProgressName">
+        <source>Language download progress</source>
+        <translation>Fortschritt des Sprachpaket-Downloads</translation>
+    </message>
+    <message id="SearchClearButtonName">
+        <source>Clear search</source>
+        <translation>Suche leeren</translation>
+    </message>
 </context>
 </TS>

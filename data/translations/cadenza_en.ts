@@ -331,5 +331,29 @@
         <source>volume %1</source>
         <translation>volume %1</translation>
     </message>
+    <message id="DownloadVariantAccessibleFormat">
+        <source>Download size for %1</source>
+        <translation>Download size for %1</translation>
+    </message>
+    <message id="LanguageWithCountryFormat">
+        <source>%1 (%2)</source>
+        <translation>%1 (%2)</translation>
+    </message>
+    <message id="AccessibleRowNameFormat">
+        <source>%1, %2</source>
+        <translation>%1, %2</translation>
+    </message>
+    <message id="VoiceDownloadProgressName">
+        <source>Voice download progress</source>
+        <translation>Voice download progress</translation>
+    </message>
+    <message id="LanguageDownloadProgressName">
+        <source>Language download progress</source>
+        <translation>Language download progress</translation>
+    </message>
+    <message id="SearchClearButtonName">
+        <source>Clear search</source>
+        <translation>Clear search</translation>
+    </message>
 </context>
 </TS>

@@ -10,6 +10,7 @@
 #include "platform/DistributedNotificationCenter.h"
 #include "platform/LocalizationTable.h"
 #include "platform/PreferencesStore.h"
+#include "platform/RowView.h"
 #include "platform/Services.h"
 #include "platform/SizeVariants.h"
 #include "platform/SoundService.h"
@@ -33,6 +34,7 @@
 #include <QStyle>
 #include <QTableView>
 #include <QTimer>
+#include <QToolButton>
 
 #include <cmath>
 
@@ -75,12 +77,17 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
     ui.explanationLabel->setText(texts().text(QStringLiteral("VoiceCustomizationExplanation")));
     m_searchField->setPlaceholderText(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
     m_searchField->setAccessibleName(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
+    // The field's clear button is a control of its own.
+    for (QToolButton *clear : m_searchField->findChildren<QToolButton *>()) {
+        clear->setAccessibleName(texts().text(QStringLiteral("SearchClearButtonName")));
+    }
     m_noResultsFoundTextField->setText(texts().text(QStringLiteral("VoiceCustomizationNoResults")));
     m_okButton->setText(texts().text(QStringLiteral("OK")));
     m_cancelButton->setText(texts().text(QStringLiteral("Cancel")));
     m_playStopButton->setText(texts().text(QStringLiteral("PlayButtonName")));
     m_voiceSelectionTableView->setAccessibleName(texts().text(QStringLiteral("VoiceCustomizationTable")));
 
+    m_model->setColumnTitle(m_voiceSelectionTableView->accessibleName());
     m_voiceSelectionTableView->setModel(m_model);
     m_rowViews = new Platform::VisibleRowViews(
         m_voiceSelectionTableView,
@@ -296,6 +303,9 @@ void CustomizeVoicesWindowController::_updateDisplayedVoicesUsingFilterString(co
             = VoiceTableRow::arrangedRowsFromVoiceObjects(candidates, languageCodeOnly, false, true, true);
         m_model->setRows(m_currentlyDisplayedVoiceRows, m_showIndividualVoiceQualities);
         m_noResultsFoundTextField->setVisible(m_currentlyDisplayedVoiceRows.isEmpty());
+        // Said while the search field has the focus, so a screen reader hears that nothing matched.
+        m_searchField->setAccessibleDescription(
+            m_currentlyDisplayedVoiceRows.isEmpty() ? m_noResultsFoundTextField->text() : QString());
     }
     QTimer::singleShot(1000, this, &CustomizeVoicesWindowController::_updateButtonStates);
 }
@@ -361,8 +371,12 @@ void CustomizeVoicesWindowController::fillRowView(VoiceTableCellView *view, cons
     view->activeCheckbox()->setVoiceIdentifier(voice->identifier());
     view->activeCheckbox()->setObjectName(QStringLiteral("activeCheckbox"));
     view->activeCheckbox()->setProperty("cellIdentifier", QStringLiteral("_CADENZA_VOICE_CHECKBOX"));
-    view->activeCheckbox()->setAccessibleName(label);
-    view->downloadVariantPopUpButton()->setAccessibleName(label);
+    view->activeCheckbox()->setAccessibleName(m_model->accessibleNameForVoice(*voice));
+    // A pop-up reads its choice as its name on Linux and its label elsewhere; the description says
+    // what it chooses on every platform.
+    const QString sizeChoice = texts().format(QStringLiteral("DownloadVariantAccessibleFormat"), {label});
+    view->downloadVariantPopUpButton()->setAccessibleName(sizeChoice);
+    view->downloadVariantPopUpButton()->setAccessibleDescription(sizeChoice);
     _setRowStatusFieldView(
         view->downloadMessageTextField(), view->downloadVariantPopUpButton(), voice, row->isSelected());
     _setRowDownloadCheckbox(view->downloadCheckbox(), voice, row->isSelected());
@@ -393,7 +407,7 @@ void CustomizeVoicesWindowController::_setRowStatusFieldView(
                 downloadable->byteSize(), downloadable->fullSizeByteSize(), downloadable->downloadFullSize());
         }
     }
-    statusField->setText(text);
+    Platform::RowView::setStatusText(statusField, text);
 }
 
 void CustomizeVoicesWindowController::_setRowDownloadCheckbox(

@@ -1,5 +1,7 @@
 #include "VoiceSelectionModel.h"
 
+#include "platform/LocalizationTable.h"
+
 namespace Cadenza {
 
 VoiceSelectionModel::VoiceSelectionModel(QObject *parent)
@@ -17,6 +19,26 @@ void VoiceSelectionModel::setRows(const QList<VoiceTableRowPtr> &rows, bool show
 QString VoiceSelectionModel::labelForVoice(const CZVoiceObject &voice) const
 {
     return m_showIndividualVoiceQualities ? voice.displayName() : voice.displayNameRoot();
+}
+
+QString VoiceSelectionModel::accessibleNameForVoice(const CZVoiceObject &voice) const
+{
+    const Platform::LocalizationTable &texts = Platform::LocalizationTable::shared();
+    const QString country = voice.countryDisplayString();
+    const QString language = country.isEmpty()
+        ? voice.languageDisplayString()
+        : texts.format(QStringLiteral("LanguageWithCountryFormat"), {voice.languageDisplayString(), country});
+    if (language.isEmpty()) {
+        return labelForVoice(voice);
+    }
+    return texts.format(QStringLiteral("AccessibleRowNameFormat"), {labelForVoice(voice), language});
+}
+
+QString VoiceSelectionModel::accessibleTextAt(int row) const
+{
+    const VoiceTableRowPtr &entry = m_rows.at(row);
+    return entry->isGroupRow() || !entry->voiceObject() ? entry->title()
+                                                        : accessibleNameForVoice(*entry->voiceObject());
 }
 
 void VoiceSelectionModel::refreshVoiceRow(int row)

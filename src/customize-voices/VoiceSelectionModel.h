@@ -19,6 +19,8 @@ public:
     [[nodiscard]] const QList<VoiceTableRowPtr> &rows() const { return m_rows; }
     /// The label of a voice row.
     [[nodiscard]] QString labelForVoice(const CZVoiceObject &voice) const;
+    /// What a screen reader calls a voice: its label and its language ("Maren, English (United States)").
+    [[nodiscard]] QString accessibleNameForVoice(const CZVoiceObject &voice) const;
     /// Tells views that a voice row's text or state changed.
     void refreshVoiceRow(int row);
 
@@ -27,6 +29,8 @@ protected:
     bool isGroupRowAt(int row) const override { return m_rows.at(row)->isGroupRow(); }
     QString textAt(int row) const override;
     QString identifierAt(int row) const override;
+    QString accessibleTextAt(int row) const override;
+    bool isTickedAt(int row) const override { return m_rows.at(row)->isSelected(); }
 
 private:
     QList<VoiceTableRowPtr> m_rows;

@@ -2,6 +2,7 @@
 
 #include "CZVoiceRowCheckboxButton.h"
 #include "CZVoiceRowTextView.h"
+#include "platform/PopUpButton.h"
 
 #include <QComboBox>
 #include <QHBoxLayout>
@@ -10,16 +11,14 @@
 namespace Cadenza {
 
 VoiceTableCellView::VoiceTableCellView(QWidget *parent)
-    : QWidget(parent)
+    : Platform::RowView(parent)
     , m_activeCheckbox(new CZVoiceRowCheckboxButton(this))
     , m_textField(new CZVoiceRowTextView(this))
     , m_downloadMessageTextField(new QLabel(this))
     , m_downloadCheckbox(new CZVoiceRowCheckboxButton(this))
-    , m_downloadVariantPopUpButton(new QComboBox(this))
+    , m_downloadVariantPopUpButton(new Platform::PopUpButton(this))
 {
     setObjectName(QStringLiteral("VoiceRow"));
-    // A row view lies over the table's own drawing of the row; it must hide it.
-    setAutoFillBackground(true);
     m_activeCheckbox->setObjectName(QStringLiteral("activeCheckbox"));
     m_textField->setObjectName(QStringLiteral("textField"));
     m_downloadMessageTextField->setObjectName(QStringLiteral("downloadMessageTextField"));
@@ -42,7 +41,7 @@ VoiceTableCellView::VoiceTableCellView(QWidget *parent)
     layout->addWidget(m_downloadMessageTextField);
     layout->addWidget(m_downloadVariantPopUpButton);
     layout->addWidget(m_downloadCheckbox);
-    setFocusProxy(m_activeCheckbox);
+    setParts(m_activeCheckbox, m_textField, m_downloadMessageTextField);
 }
 
 VoiceTableCellView::~VoiceTableCellView() = default;

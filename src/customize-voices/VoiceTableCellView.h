@@ -3,7 +3,7 @@
 
 #include "cadenza_export.h"
 
-#include <QWidget>
+#include "platform/RowView.h"
 
 class QComboBox;
 class QLabel;
@@ -21,7 +21,7 @@ class CZVoiceRowTextView;
  * "downloadCheckbox", "downloadVariantPopUpButton") so tests and style sheets can find them. The
  * size pop-up holds two items whose data are the tags 0 (compact) and 1 (full size).
  */
-class CADENZA_EXPORT VoiceTableCellView : public QWidget
+class CADENZA_EXPORT VoiceTableCellView : public Platform::RowView
 {
     Q_OBJECT
 public:

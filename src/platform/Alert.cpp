@@ -33,15 +33,20 @@ QMessageBox *makeBox(const AlertRequest &request, QWidget *parent)
     } else {
         box->setIcon(QMessageBox::Warning);
     }
+    // Screen readers name the alert by its title.
+    box->setWindowTitle(request.title);
     for (int i = 0; i < request.buttons.size(); ++i) {
-        // Roles only order the buttons; the answer is the index.
+        // The first button is the default; the second, when there are more, is Cancel and answers Escape
+        // (a lone button answers it too). Roles only place the buttons; the answer is the index.
         const auto role = i == 0 ? QMessageBox::AcceptRole
-                                 : (request.buttons.size() == 3 && i == 1 ? QMessageBox::RejectRole
-                                                                          : QMessageBox::DestructiveRole);
+                                 : (i == 1 ? QMessageBox::RejectRole : QMessageBox::DestructiveRole);
         QPushButton *button = box->addButton(request.buttons.at(i), role);
         button->setProperty("alertAnswer", i);
         if (i == 0) {
             box->setDefaultButton(button);
+        }
+        if (i == 1 || request.buttons.size() == 1) {
+            box->setEscapeButton(button);
         }
     }
     return box;

@@ -31,8 +31,9 @@ QVariant GroupedRowsModel::data(const QModelIndex &index, int role) const
     }
     switch (role) {
     case Qt::DisplayRole:
-    case Qt::AccessibleTextRole:
         return textAt(index.row());
+    case Qt::AccessibleTextRole:
+        return accessibleTextAt(index.row());
     case Qt::FontRole:
         if (isGroupRowAt(index.row())) {
             QFont bold;
@@ -44,6 +45,8 @@ QVariant GroupedRowsModel::data(const QModelIndex &index, int role) const
         return isGroupRowAt(index.row());
     case IdentifierRole:
         return identifierAt(index.row());
+    case TickedRole:
+        return !isGroupRowAt(index.row()) && isTickedAt(index.row());
     default:
         return {};
     }
@@ -52,7 +55,7 @@ QVariant GroupedRowsModel::data(const QModelIndex &index, int role) const
 QVariant GroupedRowsModel::headerData(int section, Qt::Orientation orientation, int role) const
 {
     if (orientation == Qt::Horizontal && section == 0 && role == Qt::DisplayRole) {
-        return QStringLiteral("title");
+        return m_columnTitle;
     }
     return {};
 }

@@ -1,6 +1,7 @@
 #include "VisibleRowViews.h"
 
 #include "RecyclingItemDelegate.h"
+#include "RowViewTable.h"
 
 #include <QAbstractButton>
 #include <QKeyEvent>
@@ -95,6 +96,9 @@ void VisibleRowViews::sync()
         }
         m_table->setIndexWidget(model->index(row, 0), view);
         m_views.insert(row, view);
+        if (auto *table = qobject_cast<RowViewTable *>(m_table)) {
+            table->adoptRowView(row, view);
+        }
     }
 }
 

@@ -5,6 +5,7 @@
 #include "platform/Alert.h"
 #include "platform/DistributedNotificationCenter.h"
 #include "platform/LocalizationTable.h"
+#include "platform/RowView.h"
 #include "platform/Services.h"
 #include "platform/SizeVariants.h"
 #include "platform/VisibleRowViews.h"
@@ -26,6 +27,7 @@
 #include <QStyle>
 #include <QTableView>
 #include <QTimer>
+#include <QToolButton>
 
 #include <cmath>
 
@@ -64,11 +66,16 @@ CZCustomizeSRLanguagesWindowController::CZCustomizeSRLanguagesWindowController(Q
     ui.explanationLabel->setText(texts().text(QStringLiteral("SRLanguageCustomizationExplanation")));
     m_searchField->setPlaceholderText(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
     m_searchField->setAccessibleName(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
+    // The field's clear button is a control of its own.
+    for (QToolButton *clear : m_searchField->findChildren<QToolButton *>()) {
+        clear->setAccessibleName(texts().text(QStringLiteral("SearchClearButtonName")));
+    }
     m_noResultsFoundTextField->setText(texts().text(QStringLiteral("VoiceCustomizationNoResults")));
     m_okButton->setText(texts().text(QStringLiteral("OK")));
     m_cancelButton->setText(texts().text(QStringLiteral("Cancel")));
     m_selectionTableView->setAccessibleName(texts().text(QStringLiteral("SRLanguageCustomizationTable")));
 
+    m_model->setColumnTitle(m_selectionTableView->accessibleName());
     m_selectionTableView->setModel(m_model);
     m_selectionTableView->verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
     m_selectionTableView->verticalHeader()->setDefaultSectionSize(
@@ -223,6 +230,9 @@ void CZCustomizeSRLanguagesWindowController::_updateDisplayUsingFilterString(con
         = CZSRLanguageRow::arrangedRowsFromSRLanguageItems(shown, true, languageCodeOnly, true);
     m_model->setRows(m_currentlyDisplayedRows);
     m_noResultsFoundTextField->setVisible(m_currentlyDisplayedRows.isEmpty());
+    // Said while the search field has the focus, so a screen reader hears that nothing matched.
+    m_searchField->setAccessibleDescription(
+        m_currentlyDisplayedRows.isEmpty() ? m_noResultsFoundTextField->text() : QString());
 }
 
 void CZCustomizeSRLanguagesWindowController::searchFieldChanged()
@@ -275,8 +285,13 @@ CZSRLanguageTableCellView *CZCustomizeSRLanguagesWindowController::viewForRow(
     view->activeCheckbox()->setEnabled(!greyed);
     view->activeCheckbox()->setLocaleIdentifier(item->localeIdentifier());
     view->activeCheckbox()->setProperty("cellIdentifier", QStringLiteral("_CADENZA_VOICE_CHECKBOX"));
-    view->activeCheckbox()->setAccessibleName(item->displayTitle());
-    view->downloadVariantPopUpButton()->setAccessibleName(item->displayTitle());
+    view->activeCheckbox()->setAccessibleName(SRLanguageSelectionModel::accessibleNameForItem(*item));
+    // A pop-up reads its choice as its name on Linux and its label elsewhere; the description says
+    // what it chooses on every platform.
+    const QString sizeChoice = texts().format(QStringLiteral("DownloadVariantAccessibleFormat"),
+        {SRLanguageSelectionModel::accessibleNameForItem(*item)});
+    view->downloadVariantPopUpButton()->setAccessibleName(sizeChoice);
+    view->downloadVariantPopUpButton()->setAccessibleDescription(sizeChoice);
     _setRowStatusFieldView(
         view->downloadMessageTextField(), view->downloadVariantPopUpButton(), item, entry->isSelected());
     return view;
@@ -319,7 +334,7 @@ void CZCustomizeSRLanguagesWindowController::_setRowStatusFieldView(QLabel *stat
         break;
     }
     statusField->show();
-    statusField->setText(text);
+    Platform::RowView::setStatusText(statusField, text);
 }
 
 int CZCustomizeSRLanguagesWindowController::displayedRowOfLocale(const QString &localeIdentifier) const

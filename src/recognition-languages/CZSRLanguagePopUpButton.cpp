@@ -55,7 +55,7 @@ QString tagOf(const QVariantMap &record)
 } // namespace
 
 CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
-    : QComboBox(parent)
+    : Platform::PopUpButton(parent)
     , m_downloadDisplayManager(std::make_unique<CZDownloadDisplayManager>())
     , m_menu(new VoiceMenuModel(this))
 {
@@ -98,6 +98,9 @@ void CZSRLanguagePopUpButton::setDownloadStatusProgressIndicator(QProgressBar *i
     if (indicator) {
         indicator->setRange(0, 0);
         indicator->setTextVisible(false);
+        if (indicator->accessibleName().isEmpty()) {
+            indicator->setAccessibleName(texts().text(QStringLiteral("LanguageDownloadProgressName")));
+        }
         indicator->hide();
     }
 }
@@ -300,9 +303,7 @@ QString CZSRLanguagePopUpButton::_statusStringForActiveDownloads()
 void CZSRLanguagePopUpButton::_updateDownloadStatusFields()
 {
     const QString status = _statusStringForActiveDownloads();
-    if (m_downloadStatusTextField) {
-        m_downloadStatusTextField->setText(status.isNull() ? QString() : status);
-    }
+    showStatusLine(m_downloadStatusTextField, status.isNull() ? QString() : status);
     if (m_downloadStatusProgressIndicator) {
         m_downloadStatusProgressIndicator->setVisible(!status.isNull());
     }

@@ -5,7 +5,7 @@
 #include "recognition-languages/CZSRLanguageItem.h"
 #include "recognition-languages/CZSRLanguageRow.h"
 
-#include <QComboBox>
+#include "platform/PopUpButton.h"
 #include <QPointer>
 #include <QStringList>
 
@@ -39,7 +39,7 @@ class VoiceMenuModel;
  * });
  * @endcode
  */
-class CADENZA_EXPORT CZSRLanguagePopUpButton : public QComboBox
+class CADENZA_EXPORT CZSRLanguagePopUpButton : public Platform::PopUpButton
 {
     Q_OBJECT
     Q_PROPERTY(bool languagesAreDownloadable READ languagesAreDownloadable WRITE setLanguagesAreDownloadable)

@@ -2,6 +2,7 @@
 
 #include "CZSRLanguageRowCheckboxButton.h"
 #include "CZSRLanguageRowTextView.h"
+#include "platform/PopUpButton.h"
 
 #include <QComboBox>
 #include <QHBoxLayout>
@@ -10,14 +11,13 @@
 namespace Cadenza {
 
 CZSRLanguageTableCellView::CZSRLanguageTableCellView(QWidget *parent)
-    : QWidget(parent)
+    : Platform::RowView(parent)
     , m_activeCheckbox(new CZSRLanguageRowCheckboxButton(this))
     , m_textField(new CZSRLanguageRowTextView(this))
     , m_downloadMessageTextField(new QLabel(this))
-    , m_downloadVariantPopUpButton(new QComboBox(this))
+    , m_downloadVariantPopUpButton(new Platform::PopUpButton(this))
 {
     setObjectName(QStringLiteral("LanguageRow"));
-    setAutoFillBackground(true); // lies over the table's own drawing of the row
     m_activeCheckbox->setObjectName(QStringLiteral("activeCheckbox"));
     m_textField->setObjectName(QStringLiteral("textField"));
     m_textField->setBuddy(m_activeCheckbox);
@@ -34,7 +34,7 @@ CZSRLanguageTableCellView::CZSRLanguageTableCellView(QWidget *parent)
     layout->addWidget(m_textField, 1);
     layout->addWidget(m_downloadMessageTextField);
     layout->addWidget(m_downloadVariantPopUpButton);
-    setFocusProxy(m_activeCheckbox);
+    setParts(m_activeCheckbox, m_textField, m_downloadMessageTextField);
 }
 
 CZSRLanguageTableCellView::~CZSRLanguageTableCellView() = default;

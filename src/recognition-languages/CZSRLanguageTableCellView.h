@@ -3,7 +3,7 @@
 
 #include "cadenza_export.h"
 
-#include <QWidget>
+#include "platform/RowView.h"
 
 class QComboBox;
 class QLabel;
@@ -19,7 +19,7 @@ class CZSRLanguageRowTextView;
  * sizes. Children carry the object names "activeCheckbox", "textField", "downloadMessageTextField"
  * and "downloadVariantPopUpButton"; the size pop-up's items hold the tags 0 and 1 as their data.
  */
-class CADENZA_EXPORT CZSRLanguageTableCellView : public QWidget
+class CADENZA_EXPORT CZSRLanguageTableCellView : public Platform::RowView
 {
     Q_OBJECT
 public:

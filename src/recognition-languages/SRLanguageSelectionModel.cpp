@@ -1,5 +1,6 @@
 #include "SRLanguageSelectionModel.h"
 
+#include "platform/LocalizationTable.h"
 #include "recognition-languages/CZSRLanguageItem.h"
 
 namespace Cadenza {
@@ -21,6 +22,25 @@ QString SRLanguageSelectionModel::textAt(int row) const
     const CZSRLanguageItemPtr item = entry->srLanguageItem();
     // Under a language heading a row shows its country.
     return entry->isGroupRow() || !item ? entry->title() : item->countryDisplayString();
+}
+
+QString SRLanguageSelectionModel::accessibleNameForItem(const CZSRLanguageItem &item)
+{
+    const QString language = item.languageDisplayString();
+    const QString country = item.countryDisplayString();
+    if (country.isEmpty() || language.isEmpty()) {
+        return item.displayTitle();
+    }
+    return Platform::LocalizationTable::shared().format(
+        QStringLiteral("LanguageWithCountryFormat"), {language, country});
+}
+
+QString SRLanguageSelectionModel::accessibleTextAt(int row) const
+{
+    // Read out of its heading's sight, a country alone would not say which language it is.
+    const CZSRLanguageRowPtr &entry = m_rows.at(row);
+    const CZSRLanguageItemPtr item = entry->srLanguageItem();
+    return entry->isGroupRow() || !item ? entry->title() : accessibleNameForItem(*item);
 }
 
 QString SRLanguageSelectionModel::identifierAt(int row) const

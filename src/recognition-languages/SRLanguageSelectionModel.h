@@ -7,6 +7,8 @@
 
 namespace Cadenza {
 
+class CZSRLanguageItem;
+
 /// The rows of the customise recognition languages table: language headings, and countries.
 class CADENZA_EXPORT SRLanguageSelectionModel : public Platform::GroupedRowsModel
 {
@@ -15,6 +17,9 @@ public:
     explicit SRLanguageSelectionModel(QObject *parent = nullptr);
 
     void setRows(const QList<CZSRLanguageRowPtr> &rows);
+    /// What a screen reader calls a language row: language and country ("German (Germany)"), since the
+    /// row itself shows only the country under its language's heading.
+    [[nodiscard]] static QString accessibleNameForItem(const CZSRLanguageItem &item);
     [[nodiscard]] const QList<CZSRLanguageRowPtr> &rows() const { return m_rows; }
 
 protected:
@@ -22,6 +27,8 @@ protected:
     bool isGroupRowAt(int row) const override { return m_rows.at(row)->isGroupRow(); }
     QString textAt(int row) const override;
     QString identifierAt(int row) const override;
+    QString accessibleTextAt(int row) const override;
+    bool isTickedAt(int row) const override { return m_rows.at(row)->isSelected(); }
 
 private:
     QList<CZSRLanguageRowPtr> m_rows;

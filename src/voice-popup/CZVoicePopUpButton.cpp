@@ -107,7 +107,7 @@ void registerProcessWideObservers()
 } // namespace
 
 CZVoicePopUpButton::CZVoicePopUpButton(QWidget *parent)
-    : QComboBox(parent)
+    : Platform::PopUpButton(parent)
     , m_downloadDisplayManager(std::make_unique<CZDownloadDisplayManager>())
     , m_menu(new VoiceMenuModel(this))
 {
@@ -163,6 +163,9 @@ void CZVoicePopUpButton::setDownloadStatusProgressIndicator(QProgressBar *indica
     if (indicator) {
         indicator->setRange(0, 0); // busy, not a fraction
         indicator->setTextVisible(false);
+        if (indicator->accessibleName().isEmpty()) {
+            indicator->setAccessibleName(texts().text(QStringLiteral("VoiceDownloadProgressName")));
+        }
         indicator->hide();
     }
 }
@@ -604,9 +607,7 @@ QString CZVoicePopUpButton::_statusStringForActiveDownloads()
 void CZVoicePopUpButton::_updateDownloadStatusFields()
 {
     const QString line = _statusStringForActiveDownloads();
-    if (m_downloadStatusTextField) {
-        m_downloadStatusTextField->setText(line.isNull() ? QString() : line);
-    }
+    showStatusLine(m_downloadStatusTextField, line.isNull() ? QString() : line);
     if (m_downloadStatusProgressIndicator) {
         m_downloadStatusProgressIndicator->setVisible(!line.isNull());
     }

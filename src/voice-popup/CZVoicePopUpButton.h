@@ -3,7 +3,7 @@
 
 #include "cadenza_export.h"
 
-#include <QComboBox>
+#include "platform/PopUpButton.h"
 #include <QPointer>
 #include <QVariantMap>
 
@@ -41,7 +41,7 @@ class VoiceMenuModel;
  * });
  * @endcode
  */
-class CADENZA_EXPORT CZVoicePopUpButton : public QComboBox
+class CADENZA_EXPORT CZVoicePopUpButton : public Platform::PopUpButton
 {
     Q_OBJECT
     Q_PROPERTY(bool allowSystemVoiceChoice READ allowSystemVoiceChoice WRITE setAllowSystemVoiceChoice)

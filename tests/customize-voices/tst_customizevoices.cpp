@@ -137,7 +137,7 @@ private Q_SLOTS:
         VoiceTableCellView *maren = view(QStringLiteral("Maren"));
         QVERIFY(maren);
         QCOMPARE(maren->activeCheckbox()->voiceIdentifier(), P + QStringLiteral("maren.compact"));
-        QCOMPARE(maren->activeCheckbox()->accessibleName(), QStringLiteral("Maren"));
+        QCOMPARE(maren->activeCheckbox()->accessibleName(), QStringLiteral("Maren, English (United States)"));
         QVERIFY(m_controller->isDownloadStatusPolling());
         QCOMPARE(m_controller->window()->parentWidget(), m_client.get());
     }

@@ -16,6 +16,7 @@
 #include "voice-popup/CZVoicePopUpButton_p.h"
 
 #include <QAbstractItemModelTester>
+#include <QAbstractItemView>
 #include <QLabel>
 #include <QProcess>
 #include <QProgressBar>
@@ -98,6 +99,41 @@ private Q_SLOTS:
         m_daemon.reset();
         Services::setNotifications(nullptr);
         m_environment.reset();
+    }
+
+    void keysOnAClosedPopUpOpenItsMenu()
+    {
+        // Walking past a closed pop-up with the keyboard must not choose (and save) every voice on the
+        // way, nor open the customise sheet at the last item.
+        QWidget window;
+        auto *popUp = new CZVoicePopUpButton(&window);
+        popUp->setAllowSystemVoiceChoice(true);
+        popUp->buildPopUpButtonWithSelectVoiceIdentifier(P + QStringLiteral("tobias.compact"));
+        window.show();
+        QVERIFY(QTest::qWaitForWindowExposed(&window));
+        popUp->setFocus();
+        QSignalSpy chosen(popUp, &CZVoicePopUpButton::voiceActivated);
+        QSignalSpy activated(popUp, &QComboBox::activated);
+        const int before = popUp->currentIndex();
+        for (const Qt::Key key : {Qt::Key_Down, Qt::Key_Up, Qt::Key_End, Qt::Key_PageDown, Qt::Key_Home,
+                 Qt::Key_PageUp, Qt::Key_M}) {
+            QTest::keyClick(popUp, key);
+            QTRY_VERIFY2(popUp->view()->isVisible(), qPrintable(QString::number(key, 16)));
+            popUp->hidePopup();
+            QTRY_VERIFY(!popUp->view()->isVisible());
+        }
+        QCOMPARE(popUp->currentIndex(), before);
+        QVERIFY(chosen.isEmpty());
+        QVERIFY(activated.isEmpty());
+        QVERIFY(m_presented.isEmpty());
+        // In the open menu the keys move, and Return chooses.
+        QTest::keyClick(popUp, Qt::Key_Space);
+        QTRY_VERIFY(popUp->view()->isVisible());
+        QTest::keyClick(popUp->view(), Qt::Key_Up);
+        QTest::keyClick(popUp->view(), Qt::Key_Return);
+        QTRY_COMPARE(activated.size(), 1);
+        QCOMPARE(popUp->currentText(), QStringLiteral("Maren"));
+        QCOMPARE(chosen.size(), 1);
     }
 
     void menuLayout()
@@ -246,8 +282,12 @@ private Q_SLOTS:
         popUp->setFocus();
         QVERIFY(QTest::qWaitForWindowExposed(&window));
         popUp->setCurrentIndex(titles(*popUp).indexOf(QStringLiteral("Maren")));
-        QTest::keyClick(popUp, Qt::Key_Down);
-        QCOMPARE(popUp->currentText(), QStringLiteral("Tobias"));
+        QTest::keyClick(popUp, Qt::Key_Down); // opens the menu; choosing is done in it
+        QTRY_VERIFY(popUp->view()->isVisible());
+        QCOMPARE(sent.size(), 0);
+        QTest::keyClick(popUp->view(), Qt::Key_Down);
+        QTest::keyClick(popUp->view(), Qt::Key_Return);
+        QTRY_COMPARE(popUp->currentText(), QStringLiteral("Tobias"));
         QCOMPARE(sent.size(), 1);
         QCOMPARE(popUp->_previouslyChosenVoiceIdentifier(), P + QStringLiteral("tobias.compact"));
         QVERIFY(CZVoicePopUpButton::isRequiredVoiceIdentifier(P + QStringLiteral("tobias.compact")));
