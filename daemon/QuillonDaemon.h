@@ -36,6 +36,8 @@ public:
         int requestPortDescriptor = -1; ///< a listening socket handed over by the service manager
         int idleExitSeconds = 0; ///< 0: run until stopped
         int maximumQueuedRequests = 256;
+        int retryWindowMilliseconds = 60000; ///< how long a download tries sources that do not answer
+        qint64 fileRate = 0; ///< bytes a second for file:// sources; 0: no limit
     };
 
     QuillonDaemon(PackageCatalogue catalogue, Options options, QObject *parent = nullptr);

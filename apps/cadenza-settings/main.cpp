@@ -2,21 +2,70 @@
 #include "SettingsWindow.h"
 
 #include "customize-voices/CustomizeVoicesWindowController.h"
+#include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
+#include "installation/InstallerProtocol.h"
 #include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-settings/VoiceSettingsAlertController.h"
 #include "voice-settings/VoiceSettingsSheetController.h"
+#include "voices/DownloadableVoice.h"
 
 #include <QApplication>
 #include <QCommandLineParser>
+#include <QDeadlineTimer>
 #include <QDialog>
 #include <QDir>
+#include <QEventLoop>
 #include <QTimer>
 
 #include <cstdio>
 
 namespace {
+
+void wait(int milliseconds)
+{
+    QEventLoop loop;
+    QTimer::singleShot(milliseconds, &loop, &QEventLoop::quit);
+    loop.exec();
+}
+
+// Asks the daemon for a downloadable voice of the user's language (or any) and waits until its bytes
+// are arriving; false when no daemon answers or nothing is downloading within 15 s.
+bool startOneDownload()
+{
+    using namespace Cadenza::InstallerProtocol;
+    auto *manager = Cadenza::CZSpeechInstallationManager::sharedManager();
+    if (!manager->_serverIsReachable()) {
+        return false;
+    }
+    Cadenza::DownloadableVoicePtr chosen;
+    for (const auto &voice : manager->downloadableVoices()) {
+        if (voice->downloadStatus() != NotInstalledStatus) {
+            continue;
+        }
+        if (!chosen
+            || (voice->isAppropriateForSystemLangauge() && !chosen->isAppropriateForSystemLangauge())) {
+            chosen = voice;
+        }
+    }
+    if (!chosen || !manager->startInstallingDownloadableVoices({chosen}, true, 0)) {
+        return false;
+    }
+    QDeadlineTimer deadline(15000);
+    while (!deadline.hasExpired()) {
+        for (const QVariant &value : manager->activeInstallations()) {
+            const QVariantMap record = value.toMap();
+            if (record.value(ItemSoftwareUpdateStateKey).toLongLong() == DownloadingState
+                && record.value(ItemDownloadByteCountKey).toULongLong() > 0) {
+                return true;
+            }
+        }
+        wait(100);
+    }
+    return false;
+}
+
 // Renders the windows the way they look now and writes them as PNG files into @p folder.
 int writeScreenshots(SettingsWindow &window, const QString &folder)
 {
@@ -56,6 +105,21 @@ int writeScreenshots(SettingsWindow &window, const QString &folder)
     QCoreApplication::processEvents();
     save(sheet->window(), "customize-voices.png");
     sheet->cancelVoiceSelection();
+
+    // A download in progress, asked of the installer daemon the way OK in the sheet asks it.
+    if (startOneDownload()) {
+        wait(1500); // the pop-ups refresh their status line every half second
+        save(&window, "main-window-downloading.png");
+        Cadenza::CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(&window, false);
+        sheet->window()->resize(680, 520);
+        wait(500);
+        save(sheet->window(), "customize-voices-downloading.png");
+        sheet->cancelVoiceSelection();
+    } else {
+        std::fprintf(stderr,
+            "cadenza-settings: no download could be started (is quillond running?); "
+            "no screenshots of a download in progress\n");
+    }
 
     Cadenza::CZSpeechInstallationManagerSheets::showSRLanguagesSelectionSheetForWindow(&window,
         QStringList {QStringLiteral("en_US"), QStringLiteral("de_DE"), QStringLiteral("fr_FR")},
