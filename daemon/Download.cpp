@@ -88,8 +88,9 @@ void Download::endOfRound()
     if (!m_outage.isValid()) {
         m_outage.start();
     }
-    const int pause = qMin(1000 << qMin(m_pauses, 4), 15000);
-    if (m_outage.elapsed() + pause > m_retryWindow) {
+    const qint64 left = m_retryWindow - m_outage.elapsed();
+    const int pause = int(qMin<qint64>(qMin(1000 << qMin(m_pauses, 4), 15000), left));
+    if (left <= 0) {
         fail(Failure::Network,
             QStringLiteral(
                 "network: no source answered for %1 s; the download stopped at %2 of %3 bytes (%4)")

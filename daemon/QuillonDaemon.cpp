@@ -129,8 +129,7 @@ std::optional<QByteArray> QuillonDaemon::handle(
     case StartInstallingMessage: {
         const auto request = CZDecodeSecureDictionary(data);
         if (!request) {
-            qCWarning(lcDaemon, "Ignoring an installation request from process %lld that does not decode",
-                static_cast<long long>(peer.processId));
+            refuseUndecodable(data, peer);
             return std::nullopt;
         }
         enqueue(*request);
@@ -149,6 +148,30 @@ std::optional<QByteArray> QuillonDaemon::handle(
             static_cast<long long>(peer.processId));
         return std::nullopt;
     }
+}
+
+void QuillonDaemon::refuseUndecodable(const QByteArray &data, const Platform::MessagePeer &peer)
+{
+    // Read once more, allowing what a request may not hold, only to find where to say no.
+    using Platform::ArchiveClass;
+    using Platform::ArchiveClasses;
+    QString why;
+    (void)Platform::KeyedArchive::decode(
+        data, ArchiveClasses(ArchiveClass::Dictionary) | Platform::PropertyListLeaves, &why);
+    const auto lenient = Platform::KeyedArchive::decode(
+        data, ArchiveClasses(ArchiveClass::Array) | ArchiveClass::Dictionary | Platform::PropertyListLeaves);
+    if (!lenient || lenient->typeId() != QMetaType::QVariantMap) {
+        qCWarning(lcDaemon, "Ignoring an installation request from process %lld that does not decode",
+            static_cast<long long>(peer.processId));
+        return;
+    }
+    const QVariantMap request = lenient->toMap();
+    QString problem = RequestCheck::problemWith(request);
+    if (problem.isEmpty()) {
+        problem = QStringLiteral("the request does not decode: %1").arg(why);
+    }
+    qCWarning(lcDaemon, "Refusing an installation request: %s", qPrintable(problem));
+    reply(request, FailedCompletion, problem);
 }
 
 void QuillonDaemon::enqueue(const QVariantMap &request)

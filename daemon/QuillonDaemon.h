@@ -58,6 +58,8 @@ Q_SIGNALS:
 private:
     std::optional<QByteArray> handle(
         qint32 messageId, const QByteArray &data, const Cadenza::Platform::MessagePeer &peer);
+    /// Answers a request that does not decode as a request, when it names a port to answer on.
+    void refuseUndecodable(const QByteArray &data, const Cadenza::Platform::MessagePeer &peer);
     void enqueue(const QVariantMap &request);
     void cancelAll();
     QByteArray statusRecords() const;

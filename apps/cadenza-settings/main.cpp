@@ -1,7 +1,9 @@
 // cadenza-settings: a small speech settings application hosting Cadenza's controls.
 #include "SettingsWindow.h"
 
+#include "customize-voices/CZVoiceRowCheckboxButton.h"
 #include "customize-voices/CustomizeVoicesWindowController.h"
+#include "customize-voices/VoiceTableCellView.h"
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
 #include "installation/InstallerProtocol.h"
@@ -9,7 +11,7 @@
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-settings/VoiceSettingsAlertController.h"
 #include "voice-settings/VoiceSettingsSheetController.h"
-#include "voices/DownloadableVoice.h"
+#include "voices/CZVoiceObject.h"
 
 #include <QApplication>
 #include <QCommandLineParser>
@@ -17,9 +19,12 @@
 #include <QDialog>
 #include <QDir>
 #include <QEventLoop>
+#include <QPushButton>
+#include <QTableView>
 #include <QTimer>
 
 #include <cstdio>
+#include <functional>
 
 namespace {
 
@@ -30,28 +35,37 @@ void wait(int milliseconds)
     loop.exec();
 }
 
-// Asks the daemon for a downloadable voice of the user's language (or any) and waits until its bytes
-// are arriving; false when no daemon answers or nothing is downloading within 15 s.
-bool startOneDownload()
+// Ticks a downloadable voice in the customise voices sheet, pictures the sheet with its size and
+// presses OK, which asks the installer daemon for it; then waits until its bytes are arriving. False
+// when no daemon can be reached (the sheet is cancelled) or nothing is downloading within 15 s.
+bool tickAndDownload(Cadenza::CustomizeVoicesWindowController *sheet, const std::function<void()> &picture)
 {
     using namespace Cadenza::InstallerProtocol;
     auto *manager = Cadenza::CZSpeechInstallationManager::sharedManager();
-    if (!manager->_serverIsReachable()) {
-        return false;
-    }
-    Cadenza::DownloadableVoicePtr chosen;
-    for (const auto &voice : manager->downloadableVoices()) {
-        if (voice->downloadStatus() != NotInstalledStatus) {
-            continue;
-        }
-        if (!chosen
-            || (voice->isAppropriateForSystemLangauge() && !chosen->isAppropriateForSystemLangauge())) {
-            chosen = voice;
+    const QList<Cadenza::VoiceTableRowPtr> rows = sheet->currentlyDisplayedVoiceRows();
+    int chosen = -1;
+    for (int row = 0; row < rows.size() && chosen < 0; ++row) {
+        const auto voice = rows.at(row)->voiceObject();
+        if (voice && voice->downloadStatus() == NotInstalledStatus) {
+            chosen = row;
         }
     }
-    if (!chosen || !manager->startInstallingDownloadableVoices({chosen}, true, 0)) {
+    if (chosen < 0 || !manager->_serverIsReachable()) {
+        sheet->cancelVoiceSelection();
         return false;
     }
+    sheet->voiceSelectionTableView()->scrollTo(sheet->voiceSelectionTableView()->model()->index(chosen, 0));
+    wait(200);
+    Cadenza::VoiceTableCellView *view = sheet->existingViewForRow(chosen);
+    auto *ok = sheet->window()->findChild<QPushButton *>(QStringLiteral("okButton"));
+    if (!view || !ok) {
+        sheet->cancelVoiceSelection();
+        return false;
+    }
+    view->activeCheckbox()->click();
+    wait(200);
+    picture();
+    ok->click();
     QDeadlineTimer deadline(15000);
     while (!deadline.hasExpired()) {
         for (const QVariant &value : manager->activeInstallations()) {
@@ -104,10 +118,9 @@ int writeScreenshots(SettingsWindow &window, const QString &folder)
     sheet->window()->resize(680, 520);
     QCoreApplication::processEvents();
     save(sheet->window(), "customize-voices.png");
-    sheet->cancelVoiceSelection();
 
-    // A download in progress, asked of the installer daemon the way OK in the sheet asks it.
-    if (startOneDownload()) {
+    // A voice ticked for download, with its size; OK asks the installer daemon for it.
+    if (tickAndDownload(sheet, [&] { save(sheet->window(), "customize-voices-ticked.png"); })) {
         wait(1500); // the pop-ups refresh their status line every half second
         save(&window, "main-window-downloading.png");
         Cadenza::CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(&window, false);

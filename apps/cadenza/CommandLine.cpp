@@ -2,6 +2,8 @@
 
 #include "platform/LocalizationTable.h"
 
+#include <QCoreApplication>
+
 #include <cstdio>
 
 using Cadenza::Platform::LocalizationTable;
@@ -26,10 +28,11 @@ std::optional<int> CommandLine::parse(
     if (parser.isSet(QStringLiteral("help"))) {
         // Qt names the executable's path; users typed "cadenza COMMAND".
         QString help = parser.helpText();
+        const QString executable = QCoreApplication::arguments().value(0);
         const qsizetype lineEnd = help.indexOf(QLatin1Char('\n'));
-        const qsizetype optionsAt = help.indexOf(QStringLiteral(" [options]"));
-        if (help.startsWith(QStringLiteral("Usage: ")) && optionsAt > 0 && optionsAt < lineEnd) {
-            help.replace(7, optionsAt - 7, arguments.first());
+        const qsizetype at = executable.isEmpty() ? -1 : help.indexOf(executable);
+        if (at >= 0 && at < lineEnd) {
+            help.replace(at, executable.size(), arguments.first());
         }
         help += QLatin1Char('\n') + text(QStringLiteral("CLIExitStatusHelp")) + QLatin1Char('\n');
         std::fputs(help.toLocal8Bit().constData(), stdout);

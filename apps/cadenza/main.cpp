@@ -8,7 +8,12 @@
 #include "SayCommand.h"
 #include "VoicesCommand.h"
 
+#include "platform/LocalizationTable.h"
+
 #include <QCoreApplication>
+#include <QLibraryInfo>
+#include <QLocale>
+#include <QTranslator>
 
 #include <cstdio>
 
@@ -26,6 +31,14 @@ int main(int argc, char *argv[])
 {
     QCoreApplication app(argc, argv);
     QCoreApplication::setApplicationName(QStringLiteral("cadenza"));
+    // Qt's own words ("Usage:", "Options:") in the language Cadenza's texts are in.
+    QTranslator qtTexts;
+    const QString language = Cadenza::Platform::LocalizationTable::shared().language();
+    if (language != u"en"
+        && qtTexts.load(QLocale(language), QStringLiteral("qtbase"), QStringLiteral("_"),
+            QLibraryInfo::path(QLibraryInfo::TranslationsPath))) {
+        QCoreApplication::installTranslator(&qtTexts);
+    }
     QStringList arguments = QCoreApplication::arguments();
     if (arguments.size() < 2) {
         printUsage(stderr);

@@ -404,6 +404,8 @@ private Q_SLOTS:
         QVERIFY2(r.err.contains(QStringLiteral("unerwartetes Argument „alles“")), qPrintable(r.err));
         r = cadenza({QStringLiteral("voices"), QStringLiteral("--help")}, german);
         QVERIFY2(r.out.contains(QStringLiteral("Listet die installierten Stimmen auf")), qPrintable(r.out));
+        QVERIFY2(
+            r.out.startsWith(QStringLiteral("Aufruf: cadenza voices")), qPrintable(r.out)); // Qt's words too
         r = cadenza({QStringLiteral("languages")}, german);
         QVERIFY2(r.out.contains(QStringLiteral("ladbar")), qPrintable(r.out));
     }

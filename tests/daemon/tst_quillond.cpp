@@ -398,10 +398,17 @@ private Q_SLOTS:
         const QString socket = Platform::UnixMessagePortService::socketPath(ServicePortName);
         QProcess manager;
         manager.setProcessChannelMode(QProcess::ForwardedChannels);
+        // The activator passes on only the variables it is told to.
+        QStringList arguments {QStringLiteral("-l"), socket};
+        for (const char *name : {"HOME", "XDG_RUNTIME_DIR", "XDG_DATA_HOME", "XDG_CACHE_HOME",
+                 "XDG_CONFIG_HOME", "CADENZA_ROOT", "DBUS_SESSION_BUS_ADDRESS"}) {
+            arguments << QStringLiteral("-E") << QString::fromLatin1(name);
+        }
         manager.start(activator,
-            {QStringLiteral("-l"), socket, QStringLiteral(QUILLOND_PATH), QStringLiteral("--idle-exit"),
-                QStringLiteral("2"), QStringLiteral("--catalogue"), m_catalogue,
-                QStringLiteral("--repository"), m_http->baseUrl().toString()});
+            arguments
+                + QStringList {QStringLiteral(QUILLOND_PATH), QStringLiteral("--idle-exit"),
+                    QStringLiteral("2"), QStringLiteral("--catalogue"), m_catalogue,
+                    QStringLiteral("--repository"), m_http->baseUrl().toString()});
         QVERIFY(manager.waitForStarted(5000));
         QVERIFY(QTest::qWaitFor([&] { return QFileInfo::exists(socket); }, 5000));
         // The service manager holds the request port; the daemon itself is not there yet.

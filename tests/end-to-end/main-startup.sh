@@ -11,7 +11,7 @@ world=$(mktemp -d -t cadenza-main.XXXXXX)
 pids=()
 cleanup() {
   for pid in "${pids[@]}"; do kill "$pid" 2>/dev/null || true; done
-  rm -rf "$world"
+  [ -n "${KEEP_WORLD:-}" ] || rm -rf "$world"
 }
 trap cleanup EXIT
 mkdir -p "$world"/{home,config,data,cache,root}
@@ -44,7 +44,7 @@ again=$("$source/scripts/start-quillond" "$build" --repository "file://$build/da
 
 shots="$world/shots"
 "$build/apps/cadenza-settings/cadenza-settings" --screenshots "$shots" >/dev/null
-for picture in customize-voices.png main-window-downloading.png customize-voices-downloading.png; do
+for picture in customize-voices.png customize-voices-ticked.png main-window-downloading.png customize-voices-downloading.png; do
   [ -s "$shots/$picture" ] || fail "no $picture"
 done
 "$cli" status | grep -q "downloading" || fail "the daemon is not downloading what the settings asked for"
