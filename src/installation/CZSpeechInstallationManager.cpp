@@ -182,7 +182,7 @@ bool CZSpeechInstallationManager::_requestInstallation(const QString &tagName, c
     if (m_lastSendStatus != Platform::MessagePortStatus::Success) {
         // Nobody will ever answer this port: close it, and let the user know.
         releaseLocalPort(port->name());
-        Q_EMIT installationRequestFailed(tagName, itemName);
+        Q_EMIT installationRequestFailed(tagName, itemName, userInteractionMode);
         return false;
     }
     return true;

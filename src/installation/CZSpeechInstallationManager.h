@@ -145,8 +145,10 @@ Q_SIGNALS:
     /// Emitted with each completion, after the delegate: the whole answer, which may carry
     /// "QLNDFailureReason".
     void installationFinished(const QString &tagName, qint32 message, const QVariantMap &answer);
-    /// Emitted when an installation request could not be delivered to the daemon (it is not running).
-    void installationRequestFailed(const QString &tagName, const QString &itemName);
+    /// Emitted when an installation request could not be delivered to the daemon (it is not running),
+    /// with the request's user-interaction mode (1: an automatic request nobody asked for).
+    void installationRequestFailed(
+        const QString &tagName, const QString &itemName, qint64 userInteractionMode);
 
 private:
     friend std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port, qint32 messageId,

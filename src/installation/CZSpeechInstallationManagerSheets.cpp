@@ -26,6 +26,9 @@ CZSpeechInstallationManagerSheets::SRLanguageSheetPresenter &languagePresenter()
     static CZSpeechInstallationManagerSheets::SRLanguageSheetPresenter present;
     return present;
 }
+// The mode of the requests the download policy makes on its own.
+constexpr qint64 AutomaticInteractionMode = 1;
+
 // The window an alert about the sheets' requests belongs on: the one the sheet was shown on.
 QPointer<QWidget> &alertWindow()
 {
@@ -44,7 +47,10 @@ void tellWhenRequestsCannotBeSent()
     auto unsent = std::make_shared<QStringList>();
     QObject::connect(CZSpeechInstallationManager::sharedManager(),
         &CZSpeechInstallationManager::installationRequestFailed, qApp,
-        [unsent](const QString &, const QString &itemName) {
+        [unsent](const QString &, const QString &itemName, qint64 userInteractionMode) {
+            if (userInteractionMode == AutomaticInteractionMode) {
+                return; // a background fetch the user did not ask for: nothing to tell
+            }
             unsent->append(itemName);
             if (unsent->size() > 1) {
                 return; // the alert is on its way

@@ -8,6 +8,7 @@
 #include "installation/CZSpeechInstallationManagerSheets.h"
 #include "platform/Alert.h"
 #include "voices/CZVoiceObject.h"
+#include "voices/DownloadableVoice.h"
 
 #include <QAbstractItemView>
 #include <QDialog>
@@ -76,6 +77,20 @@ private Q_SLOTS:
         }
         QCOMPARE(unreachable, 1);
         QVERIFY(CZSpeechInstallationManager::sharedManager()->pendingLocalPortNames().isEmpty());
+    }
+
+    void aBackgroundFetchDoesNotAlert()
+    {
+        (void)CZSpeechInstallationManagerSheets::voiceSelectionWindowController(); // the alerts are wired
+        auto *manager = CZSpeechInstallationManager::sharedManager();
+        const QList<DownloadableVoicePtr> voices = manager->downloadableVoices();
+        QVERIFY(!voices.isEmpty());
+        const int before = int(Platform::Alert::answeredRequests().size());
+        QVERIFY(!manager->startInstallingDownloadableVoices({voices.first()}, true, 1)); // the policy's mode
+        QTest::qWait(100);
+        QCOMPARE(Platform::Alert::answeredRequests().size(), before);
+        QVERIFY(!manager->startInstallingDownloadableVoices({voices.first()}, true, 0)); // the user's
+        QTRY_COMPARE(Platform::Alert::answeredRequests().size(), before + 1);
     }
 
 private:

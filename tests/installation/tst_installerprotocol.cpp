@@ -189,6 +189,7 @@ private Q_SLOTS:
         QCOMPARE(failed.size(), 1);
         QCOMPARE(failed.first().at(0).toString(), QStringLiteral("VOICEID:v.premium"));
         QCOMPARE(failed.first().at(1).toString(), QStringLiteral("V"));
+        QCOMPARE(failed.first().at(2).toLongLong(), 0);
         QVERIFY(m_manager->pendingLocalPortNames().isEmpty()); // nobody would ever answer it
 
         Testing::FakeInstallerDaemon daemon(*m_ports);
