@@ -14,7 +14,8 @@ namespace Quillond {
 
 namespace {
 constexpr qint64 ChunkSize = 1 << 20;
-}
+constexpr qint64 MinimumPauseMilliseconds = 250;
+} // namespace
 
 Download::Download(QList<QUrl> sources, QString destination, quint64 expectedSize,
     QNetworkAccessManager *network, QObject *parent)
@@ -90,11 +91,11 @@ void Download::endOfRound()
     }
     const qint64 left = m_retryWindow - m_outage.elapsed();
     const int pause = int(qMin<qint64>(qMin(1000 << qMin(m_pauses, 4), 15000), left));
-    if (left <= 0) {
+    if (left < MinimumPauseMilliseconds) { // no room left for one more real attempt
         fail(Failure::Network,
             QStringLiteral(
                 "network: no source answered for %1 s; the download stopped at %2 of %3 bytes (%4)")
-                .arg(qMax<qint64>(1, m_outage.elapsed() / 1000))
+                .arg(qMax<qint64>(1, qRound64(double(m_outage.elapsed()) / 1000.0)))
                 .arg(m_received.load())
                 .arg(m_expectedSize)
                 .arg(m_lastSourceError));
