@@ -64,12 +64,20 @@ bool OutputFile::write(const QString &path, const QByteArray &bytes, QString *er
         setReason(error, reason);
         return false;
     case Kind::Stream: {
-        // No O_CREAT, no O_TRUNC: the device or FIFO stays what it is.
-        const int fd = ::open(QFile::encodeName(path).constData(), O_WRONLY | O_CLOEXEC | O_NOCTTY);
+        // No O_CREAT, no O_TRUNC: the device or FIFO stays what it is. Opened without waiting, so a
+        // FIFO that nobody reads is an error rather than a wait without end; written with waiting.
+        const int fd
+            = ::open(QFile::encodeName(path).constData(), O_WRONLY | O_CLOEXEC | O_NOCTTY | O_NONBLOCK);
         if (fd < 0) {
             setReason(error,
-                QStringLiteral("cannot open %1: %2").arg(path, QString::fromLocal8Bit(std::strerror(errno))));
+                errno == ENXIO ? QStringLiteral("nobody reads from the FIFO %1").arg(path)
+                               : QStringLiteral("cannot open %1: %2")
+                                     .arg(path, QString::fromLocal8Bit(std::strerror(errno))));
             return false;
+        }
+        const int flags = ::fcntl(fd, F_GETFL);
+        if (flags >= 0) {
+            (void)::fcntl(fd, F_SETFL, flags & ~O_NONBLOCK);
         }
         qsizetype written = 0;
         while (written < bytes.size()) {

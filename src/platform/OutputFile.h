@@ -14,8 +14,9 @@ namespace Cadenza::Platform {
  * A regular file (or nothing) at the path is replaced atomically: the bytes go into a temporary file
  * beside it, which is renamed over it only once complete, keeping the old file's permissions. A
  * character device or a FIFO is written directly, as a shell redirection would, and is never
- * replaced. A folder, a block device or a socket is refused: nothing that is not a regular file
- * Cadenza writes is ever deleted or replaced. A symbolic link is followed to what it names.
+ * replaced; a FIFO must have a reader already (nothing waits for one to come). A folder, a block device or a
+ * socket is refused: nothing that is not a regular file Cadenza writes is ever deleted or replaced. A
+ * symbolic link is followed to what it names.
  */
 class CADENZACORE_EXPORT OutputFile
 {

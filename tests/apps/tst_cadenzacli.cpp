@@ -330,7 +330,14 @@ private Q_SLOTS:
         QProcess reader;
         reader.start(QStringLiteral("cat"), {fifo});
         QVERIFY(reader.waitForStarted());
-        r = cadenza({QStringLiteral("say"), QStringLiteral("--output"), fifo, QStringLiteral("Hello")});
+        // Until the reader is there, a FIFO nobody reads is refused rather than waited on.
+        for (int attempt = 0; attempt < 50; ++attempt) {
+            r = cadenza({QStringLiteral("say"), QStringLiteral("--output"), fifo, QStringLiteral("Hello")});
+            if (r.exitCode == 0 || !r.err.contains(QStringLiteral("nobody reads"))) {
+                break;
+            }
+            QTest::qWait(100);
+        }
         QVERIFY2(r.exitCode == 0, qPrintable(r.err));
         QVERIFY(reader.waitForFinished(10000));
         const QByteArray wav = reader.readAllStandardOutput();

@@ -46,10 +46,21 @@ private Q_SLOTS:
 
         const QString fifo = m_environment->path(QStringLiteral("pipe"));
         QCOMPARE(::mkfifo(QFile::encodeName(fifo).constData(), 0600), 0);
+        QString error;
+        QVERIFY(!OutputFile::write(fifo, "nobody listens", &error)); // no reader: no wait without end
+        QVERIFY2(error.contains(QStringLiteral("nobody reads")), qPrintable(error));
         QProcess reader;
         reader.start(QStringLiteral("cat"), {fifo});
         QVERIFY(reader.waitForStarted());
-        QVERIFY(OutputFile::write(fifo, "through the pipe"));
+        // Once the reader has opened its end, the bytes go through.
+        bool written = false;
+        for (int attempt = 0; attempt < 100 && !written; ++attempt) {
+            written = OutputFile::write(fifo, "through the pipe");
+            if (!written) {
+                QTest::qWait(20);
+            }
+        }
+        QVERIFY(written);
         QVERIFY(reader.waitForFinished(5000));
         QCOMPARE(reader.readAllStandardOutput(), QByteArray("through the pipe"));
         QCOMPARE(::stat(QFile::encodeName(fifo).constData(), &st), 0);
