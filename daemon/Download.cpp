@@ -5,6 +5,7 @@
 #include <QNetworkAccessManager>
 #include <QNetworkReply>
 #include <QNetworkRequest>
+#include <QThread>
 #include <QtConcurrent/QtConcurrentRun>
 
 Q_LOGGING_CATEGORY(lcDownload, "quillond.download", QtInfoMsg)
@@ -13,7 +14,8 @@ namespace Quillond {
 
 namespace {
 constexpr qint64 ChunkSize = 1 << 20;
-}
+constexpr qint64 MinimumPauseMilliseconds = 250;
+} // namespace
 
 Download::Download(QList<QUrl> sources, QString destination, quint64 expectedSize,
     QNetworkAccessManager *network, QObject *parent)
@@ -25,6 +27,12 @@ Download::Download(QList<QUrl> sources, QString destination, quint64 expectedSiz
     , m_cancelled(std::make_shared<std::atomic<bool>>(false))
 {
     m_progressTimer.setInterval(100);
+    m_retryTimer.setSingleShot(true);
+    connect(&m_retryTimer, &QTimer::timeout, this, [this] {
+        m_nextSource = 0;
+        m_roundHadTransientFailure = false;
+        tryNextSource();
+    });
     connect(&m_progressTimer, &QTimer::timeout, this, [this] { Q_EMIT progressed(m_received.load()); });
 }
 
@@ -39,6 +47,14 @@ Download::~Download()
 
 void Download::start()
 {
+    m_file.setFileName(m_destination);
+    if (!m_file.open(QIODevice::WriteOnly | QIODevice::Truncate)) {
+        fail(Failure::Disk,
+            QStringLiteral("disk: cannot write %1: %2").arg(m_destination, m_file.errorString()));
+        return;
+    }
+    m_hash = std::make_unique<QCryptographicHash>(QCryptographicHash::Sha256);
+    m_received = 0;
     tryNextSource();
 }
 
@@ -48,6 +64,46 @@ void Download::cancel()
     if (m_reply) {
         m_reply->abort();
     }
+    if (m_retryTimer.isActive()) {
+        m_retryTimer.stop();
+        fail(Failure::Cancelled, QStringLiteral("cancelled"));
+    }
+}
+
+void Download::madeProgress()
+{
+    m_outage.invalidate();
+    m_pauses = 0;
+}
+
+void Download::endOfRound()
+{
+    if (!m_roundHadTransientFailure) {
+        fail(Failure::Network,
+            QStringLiteral("network: no source delivered the file (%1)")
+                .arg(m_lastSourceError.isEmpty() ? QStringLiteral("no sources") : m_lastSourceError));
+        return;
+    }
+    // Every source failed in a way that may pass (no connection, a server error): wait and try them
+    // all again, with growing pauses, until the window is spent.
+    if (!m_outage.isValid()) {
+        m_outage.start();
+    }
+    const qint64 left = m_retryWindow - m_outage.elapsed();
+    const int pause = int(qMin<qint64>(qMin(1000 << qMin(m_pauses, 4), 15000), left));
+    if (left < MinimumPauseMilliseconds) { // no room left for one more real attempt
+        fail(Failure::Network,
+            QStringLiteral(
+                "network: no source answered for %1 s; the download stopped at %2 of %3 bytes (%4)")
+                .arg(qMax<qint64>(1, qRound64(double(m_outage.elapsed()) / 1000.0)))
+                .arg(m_received.load())
+                .arg(m_expectedSize)
+                .arg(m_lastSourceError));
+        return;
+    }
+    ++m_pauses;
+    qCInfo(lcDownload, "No source answers (%s); trying again in %d ms", qPrintable(m_lastSourceError), pause);
+    m_retryTimer.start(pause);
 }
 
 void Download::tryNextSource()
@@ -57,26 +113,18 @@ void Download::tryNextSource()
         return;
     }
     if (m_nextSource >= m_sources.size()) {
-        fail(Failure::Network,
-            QStringLiteral("network: no source delivered the file (%1)")
-                .arg(m_lastSourceError.isEmpty() ? QStringLiteral("no sources") : m_lastSourceError));
+        endOfRound();
         return;
     }
     m_current = m_sources.at(m_nextSource++);
-    m_received = 0;
-    m_resumes = 0;
-    m_hash = std::make_unique<QCryptographicHash>(QCryptographicHash::Sha256);
-    m_file.close();
-    m_file.setFileName(m_destination);
-    if (!m_file.open(QIODevice::WriteOnly | QIODevice::Truncate)) {
-        fail(Failure::Disk,
-            QStringLiteral("disk: cannot write %1: %2").arg(m_destination, m_file.errorString()));
-        return;
-    }
     if (m_current.isLocalFile()) {
+        // A local copy starts from the beginning: it is fast, and has no ranges.
+        m_received = 0;
+        m_hash->reset();
         copyLocalFile(m_current.toLocalFile());
     } else if (m_current.scheme() == u"http" || m_current.scheme() == u"https") {
-        fetch(false);
+        // The bytes fetched so far, from whichever source, are kept: every source serves the same file.
+        fetch(true);
     } else {
         m_lastSourceError = QStringLiteral("unsupported source %1").arg(m_current.toDisplayString());
         tryNextSource();
@@ -85,13 +133,14 @@ void Download::tryNextSource()
 
 void Download::copyLocalFile(const QString &path)
 {
-    m_file.close(); // the worker opens its own handles
+    m_file.close(); // the worker opens its own handles; reopened if the next source is fetched
     m_progressTimer.start();
     auto cancelled = m_cancelled;
     const QString destination = m_destination;
     const quint64 limit = m_expectedSize;
     auto *received = &m_received;
     auto *hash = m_hash.get();
+    const qint64 rate = m_fileRate;
     auto result = std::make_shared<std::pair<Failure, QString>>(Failure::None, QString());
     m_copy = QtConcurrent::run([=] {
         QFile in(path);
@@ -105,8 +154,17 @@ void Download::copyLocalFile(const QString &path)
                 QStringLiteral("disk: cannot write %1: %2").arg(destination, out.errorString())};
             return;
         }
-        QByteArray buffer(ChunkSize, Qt::Uninitialized);
+        // Limited, it goes in tenths of a second's worth, so that progress shows as it goes.
+        QByteArray buffer(rate > 0 ? qBound<qint64>(1, rate / 10, ChunkSize) : ChunkSize, Qt::Uninitialized);
+        QElapsedTimer clock;
+        clock.start();
         while (true) {
+            if (rate > 0) {
+                const qint64 due = qint64(received->load()) * 1000 / rate;
+                while (clock.elapsed() < due && !cancelled->load()) {
+                    QThread::msleep(quint64(qMin<qint64>(50, due - clock.elapsed())));
+                }
+            }
             if (cancelled->load()) {
                 *result = {Failure::Cancelled, QStringLiteral("cancelled")};
                 return;
@@ -146,6 +204,13 @@ void Download::copyLocalFile(const QString &path)
             succeed();
         } else if (result->first == Failure::Network) {
             m_lastSourceError = result->second;
+            if (!m_file.open(QIODevice::WriteOnly | QIODevice::Truncate)) {
+                fail(Failure::Disk,
+                    QStringLiteral("disk: cannot write %1: %2").arg(m_destination, m_file.errorString()));
+                return;
+            }
+            m_received = 0;
+            m_hash->reset();
             tryNextSource();
         } else {
             fail(result->first, result->second);
@@ -159,6 +224,7 @@ void Download::fetch(bool resume)
     QNetworkRequest request(m_current);
     request.setAttribute(QNetworkRequest::RedirectPolicyAttribute, QNetworkRequest::NoLessSafeRedirectPolicy);
     request.setTransferTimeout(30000);
+    m_replyDelivered = false;
     m_rangeRequested = resume && m_received.load() > 0;
     if (m_rangeRequested) {
         request.setRawHeader("Range", "bytes=" + QByteArray::number(m_received.load()) + '-');
@@ -197,6 +263,10 @@ void Download::onReadyRead()
         return;
     }
     m_received.fetch_add(quint64(data.size()));
+    if (!data.isEmpty()) {
+        madeProgress();
+        m_replyDelivered = true;
+    }
     Q_EMIT progressed(m_received.load());
 }
 
@@ -224,21 +294,26 @@ void Download::onReplyFinished()
         succeed();
         return;
     }
-    // A dropped connection after some data is resumed where it stopped; anything else moves on.
+    // A dropped connection, a refused one or a server error may pass; a missing file or a refusal
+    // will not.
+    const QNetworkReply::NetworkError error = reply->error();
     const bool connectionLost
-        = (reply->error() != QNetworkReply::NoError && reply->error() < QNetworkReply::ContentAccessDenied)
-        || (reply->error() == QNetworkReply::NoError && shortAnswer);
-    const bool transient = connectionLost || status >= 500;
-    if (transient && m_received.load() > 0 && m_resumes < MaximumResumes) {
-        ++m_resumes;
-        qCInfo(lcDownload, "Resuming %s at byte %llu", qPrintable(m_current.toDisplayString()),
-            static_cast<unsigned long long>(m_received.load()));
-        fetch(true);
-        return;
-    }
+        = (error != QNetworkReply::NoError && error < QNetworkReply::ContentAccessDenied)
+        || error == QNetworkReply::ProxyConnectionRefusedError || error == QNetworkReply::ProxyTimeoutError
+        || (error == QNetworkReply::NoError && shortAnswer);
+    const bool transient = connectionLost || status >= 500 || status == 408 || status == 429;
     m_lastSourceError = status
         ? QStringLiteral("%1 answered HTTP %2").arg(m_current.toDisplayString()).arg(status)
         : QStringLiteral("%1: %2").arg(m_current.toDisplayString(), reply->errorString());
+    if (transient && std::exchange(m_replyDelivered, false)) {
+        // It was delivering: resume where it stopped, at once.
+        qCInfo(lcDownload, "Resuming %s at byte %llu", qPrintable(m_current.toDisplayString()),
+            static_cast<unsigned long long>(m_received.load()));
+        --m_nextSource;
+        tryNextSource();
+        return;
+    }
+    m_roundHadTransientFailure = m_roundHadTransientFailure || transient;
     tryNextSource();
 }
 

@@ -2,6 +2,7 @@
 #define QUILLOND_DOWNLOAD_H
 
 #include <QCryptographicHash>
+#include <QElapsedTimer>
 #include <QFile>
 #include <QFuture>
 #include <QObject>
@@ -21,7 +22,9 @@ namespace Quillond {
  * Fetches one file from the first source that delivers it, hashing it with SHA-256 on the way.
  *
  * file:// sources are copied on a worker thread; http(s):// sources are fetched with Qt Network and
- * resumed with a range request when the connection drops. Progress is reported as it goes.
+ * resumed with a range request when the connection drops. When no source answers (the network or the
+ * servers are down), every source is tried again after growing pauses for as long as the retry window
+ * allows, and the bytes already fetched are kept and resumed from. Progress is reported as it goes.
  */
 class Download : public QObject
 {
@@ -41,8 +44,11 @@ public:
     [[nodiscard]] QString errorText() const { return m_error; }
     [[nodiscard]] Failure failure() const { return m_failure; }
 
-    /// How many times an interrupted HTTP transfer is resumed before the next source is tried.
-    static constexpr int MaximumResumes = 5;
+    /// How long sources that do not answer are tried again before the download fails.
+    static constexpr int DefaultRetryWindowMilliseconds = 60000;
+    void setRetryWindow(int milliseconds) { m_retryWindow = milliseconds; }
+    /// Copies file:// sources at most this many bytes a second (0: as fast as the disks go).
+    void setFileRate(qint64 bytesPerSecond) { m_fileRate = bytesPerSecond; }
 
 Q_SIGNALS:
     void progressed(quint64 received);
@@ -50,6 +56,8 @@ Q_SIGNALS:
 
 private:
     void tryNextSource();
+    void endOfRound();
+    void madeProgress();
     void copyLocalFile(const QString &path);
     void fetch(bool resume);
     void onReadyRead();
@@ -74,7 +82,13 @@ private:
     QString m_error;
     QString m_lastSourceError;
     Failure m_failure = Failure::None;
-    int m_resumes = 0;
+    int m_retryWindow = DefaultRetryWindowMilliseconds;
+    qint64 m_fileRate = 0;
+    QTimer m_retryTimer;
+    QElapsedTimer m_outage; ///< since the last byte arrived, while no source delivers
+    int m_pauses = 0; ///< pauses since the last byte arrived
+    bool m_roundHadTransientFailure = false;
+    bool m_replyDelivered = false; ///< the current reply brought bytes
     bool m_rangeRequested = false; ///< until the first answer to a resumed request
     bool m_done = false;
 };

@@ -148,6 +148,8 @@ void InstallationJob::prepare()
         + QString::fromLatin1(m_package.sha256.toHex()) + QStringLiteral(".part");
     m_phase = Phase::Downloading;
     m_download = new Download(sources, m_downloadPath, m_package.byteSize, m_network, this);
+    m_download->setRetryWindow(m_retryWindow);
+    m_download->setFileRate(m_fileRate);
     connect(m_download, &Download::progressed, this, [this](quint64 received) { m_received = received; });
     connect(m_download, &Download::finished, this, &InstallationJob::downloadFinished);
     m_download->start();

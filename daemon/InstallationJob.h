@@ -45,6 +45,10 @@ public:
 
     void start();
     void cancel();
+    /// How long a download keeps trying sources that do not answer.
+    void setRetryWindow(int milliseconds) { m_retryWindow = milliseconds; }
+    /// Copies file:// sources at most this many bytes a second (0: no limit).
+    void setFileRate(qint64 bytesPerSecond) { m_fileRate = bytesPerSecond; }
 
     [[nodiscard]] Phase phase() const { return m_phase; }
     [[nodiscard]] Outcome outcome() const { return m_outcome; }
@@ -76,6 +80,8 @@ private:
     QList<QUrl> m_repositories;
     Places m_places;
     QNetworkAccessManager *m_network;
+    int m_retryWindow = 60000;
+    qint64 m_fileRate = 0;
     Phase m_phase = Phase::Waiting;
     Outcome m_outcome = Outcome::None;
     QString m_failureReason;

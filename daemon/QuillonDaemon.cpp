@@ -1,5 +1,7 @@
 #include "QuillonDaemon.h"
 
+#include "RequestCheck.h"
+
 #include "installation/InstallerProtocol.h"
 #include "installation/SecureArchiving.h"
 #include "platform/DistributedNotificationCenter.h"
@@ -11,7 +13,6 @@
 
 #include <QDir>
 #include <QLoggingCategory>
-#include <QRegularExpression>
 
 Q_LOGGING_CATEGORY(lcDaemon, "quillond", QtInfoMsg)
 
@@ -22,19 +23,10 @@ using namespace Cadenza::InstallerProtocol;
 
 namespace {
 
-// Clients name their ports "<service>-<number>"; nothing else is ever connected to.
-bool isClientPortName(const QString &name)
-{
-    static const QRegularExpression pattern(
-        QStringLiteral("^%1-([0-9]{1,5})$").arg(QRegularExpression::escape(ServicePortName)));
-    const auto match = pattern.match(name);
-    return match.hasMatch() && match.captured(1).toInt() <= 65535;
-}
-
-bool isString(const QVariantMap &map, const QString &key, qsizetype maximum = 1024)
+bool isString(const QVariantMap &map, const QString &key)
 {
     const QVariant v = map.value(key);
-    return v.typeId() == QMetaType::QString && !v.toString().isEmpty() && v.toString().size() <= maximum;
+    return v.typeId() == QMetaType::QString && !v.toString().isEmpty();
 }
 
 } // namespace
@@ -137,8 +129,7 @@ std::optional<QByteArray> QuillonDaemon::handle(
     case StartInstallingMessage: {
         const auto request = CZDecodeSecureDictionary(data);
         if (!request) {
-            qCWarning(lcDaemon, "Ignoring an installation request from process %lld that does not decode",
-                static_cast<long long>(peer.processId));
+            refuseUndecodable(data, peer);
             return std::nullopt;
         }
         enqueue(*request);
@@ -159,11 +150,36 @@ std::optional<QByteArray> QuillonDaemon::handle(
     }
 }
 
+void QuillonDaemon::refuseUndecodable(const QByteArray &data, const Platform::MessagePeer &peer)
+{
+    // Read once more, allowing what a request may not hold, only to find where to say no.
+    using Platform::ArchiveClass;
+    using Platform::ArchiveClasses;
+    QString why;
+    (void)Platform::KeyedArchive::decode(
+        data, ArchiveClasses(ArchiveClass::Dictionary) | Platform::PropertyListLeaves, &why);
+    const auto lenient = Platform::KeyedArchive::decode(
+        data, ArchiveClasses(ArchiveClass::Array) | ArchiveClass::Dictionary | Platform::PropertyListLeaves);
+    if (!lenient || lenient->typeId() != QMetaType::QVariantMap) {
+        qCWarning(lcDaemon, "Ignoring an installation request from process %lld that does not decode",
+            static_cast<long long>(peer.processId));
+        return;
+    }
+    const QVariantMap request = lenient->toMap();
+    QString problem = RequestCheck::problemWith(request);
+    if (problem.isEmpty()) {
+        problem = QStringLiteral("the request does not decode: %1").arg(why);
+    }
+    qCWarning(lcDaemon, "Refusing an installation request: %s", qPrintable(problem));
+    reply(request, FailedCompletion, problem);
+}
+
 void QuillonDaemon::enqueue(const QVariantMap &request)
 {
-    if (!isString(request, TagNameKey) || !isString(request, ClientPortNameKey)
-        || !isClientPortName(request.value(ClientPortNameKey).toString())) {
-        qCWarning(lcDaemon, "Ignoring an installation request without a tag or a valid client port");
+    // Every request that names a port it can be answered on gets an answer, a refusal included.
+    if (const QString problem = RequestCheck::problemWith(request); !problem.isEmpty()) {
+        qCWarning(lcDaemon, "Refusing an installation request: %s", qPrintable(problem));
+        reply(request, FailedCompletion, problem);
         return;
     }
     const QString tag = request.value(TagNameKey).toString();
@@ -185,6 +201,8 @@ void QuillonDaemon::enqueue(const QVariantMap &request)
         package->objectIdentifier.isEmpty() ? request.value(ObjectIDKey) : package->objectIdentifier);
     record.insert(ItemByteSizeKey, QVariant::fromValue<quint64>(package->byteSize));
     auto *job = new InstallationJob(record, *package, m_options.repositories, m_places, &m_network, this);
+    job->setRetryWindow(m_options.retryWindowMilliseconds);
+    job->setFileRate(m_options.fileRate);
     connect(job, &InstallationJob::started, this, [this, job] {
         Platform::Services::notifications().postNotification(
             StartedInstallationNotification, QString(), {{ObjectIDKey, job->request().value(ObjectIDKey)}});
@@ -238,15 +256,22 @@ void QuillonDaemon::jobFinished(InstallationJob *job)
 void QuillonDaemon::reply(const QVariantMap &request, qint32 completion, const QString &reason)
 {
     const QString portName = request.value(ClientPortNameKey).toString();
-    if (!isClientPortName(portName)) {
-        return;
+    if (request.value(ClientPortNameKey).typeId() != QMetaType::QString
+        || !RequestCheck::isClientPortName(portName)) {
+        return; // nowhere to answer
     }
     auto port = Platform::Services::messagePorts().createRemotePort(portName);
     if (!port) {
         qCInfo(lcDaemon, "Client port %s is gone; nobody to tell", qPrintable(portName));
         return;
     }
-    QVariantMap answer {{TagNameKey, request.value(TagNameKey)}, {ObjectIDKey, request.value(ObjectIDKey)}};
+    // Only strings go back: a client's odd value must not make the answer undecodable.
+    QVariantMap answer;
+    for (const QString &key : {TagNameKey, ObjectIDKey}) {
+        if (const QVariant value = RequestCheck::echoable(request.value(key)); value.isValid()) {
+            answer.insert(key, value);
+        }
+    }
     if (!reason.isEmpty() && completion == FailedCompletion) {
         answer.insert(FailureReasonKey, reason);
     }

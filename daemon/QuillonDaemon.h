@@ -36,6 +36,8 @@ public:
         int requestPortDescriptor = -1; ///< a listening socket handed over by the service manager
         int idleExitSeconds = 0; ///< 0: run until stopped
         int maximumQueuedRequests = 256;
+        int retryWindowMilliseconds = 60000; ///< how long a download tries sources that do not answer
+        qint64 fileRate = 0; ///< bytes a second for file:// sources; 0: no limit
     };
 
     QuillonDaemon(PackageCatalogue catalogue, Options options, QObject *parent = nullptr);
@@ -56,6 +58,8 @@ Q_SIGNALS:
 private:
     std::optional<QByteArray> handle(
         qint32 messageId, const QByteArray &data, const Cadenza::Platform::MessagePeer &peer);
+    /// Answers a request that does not decode as a request, when it names a port to answer on.
+    void refuseUndecodable(const QByteArray &data, const Cadenza::Platform::MessagePeer &peer);
     void enqueue(const QVariantMap &request);
     void cancelAll();
     QByteArray statusRecords() const;

@@ -74,7 +74,15 @@ int main(int argc, char *argv[])
     const QCommandLineOption idleExit(QStringLiteral("idle-exit"),
         QStringLiteral("Exit after SECONDS without work (for socket activation)."),
         QStringLiteral("SECONDS"));
-    parser.addOptions({repository, catalogue, idleExit});
+    const QCommandLineOption retryWindow(QStringLiteral("retry-window"),
+        QStringLiteral("Keep trying sources that do not answer for SECONDS before a download fails "
+                       "(default 60)."),
+        QStringLiteral("SECONDS"));
+    const QCommandLineOption fileRate(QStringLiteral("file-rate"),
+        QStringLiteral("Copy file:// sources at most BYTES a second, to watch a download's progress with a "
+                       "local repository (default: no limit)."),
+        QStringLiteral("BYTES"));
+    parser.addOptions({repository, catalogue, idleExit, retryWindow, fileRate});
     parser.process(app);
 
     Quillond::QuillonDaemon::Options options;
@@ -98,6 +106,25 @@ int main(int argc, char *argv[])
         options.idleExitSeconds = parser.value(idleExit).toInt(&ok);
         if (!ok || options.idleExitSeconds < 1) {
             std::fprintf(stderr, "quillond: --idle-exit takes a number of seconds\n");
+            return 2;
+        }
+    }
+    if (parser.isSet(retryWindow)) {
+        bool ok = false;
+        const double seconds = parser.value(retryWindow).toDouble(&ok);
+        if (!ok || !(seconds >= 0 && seconds <= 24 * 3600)) {
+            std::fprintf(stderr, "quillond: --retry-window takes a number of seconds, not '%s'\n",
+                qPrintable(parser.value(retryWindow)));
+            return 2;
+        }
+        options.retryWindowMilliseconds = int(seconds * 1000);
+    }
+    if (parser.isSet(fileRate)) {
+        bool ok = false;
+        options.fileRate = parser.value(fileRate).toLongLong(&ok);
+        if (!ok || options.fileRate < 0) {
+            std::fprintf(stderr, "quillond: --file-rate takes a number of bytes a second, not '%s'\n",
+                qPrintable(parser.value(fileRate)));
             return 2;
         }
     }

@@ -1,23 +1,86 @@
 // cadenza-settings: a small speech settings application hosting Cadenza's controls.
 #include "SettingsWindow.h"
 
+#include "customize-voices/CZVoiceRowCheckboxButton.h"
 #include "customize-voices/CustomizeVoicesWindowController.h"
+#include "customize-voices/VoiceTableCellView.h"
+#include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
+#include "installation/InstallerProtocol.h"
 #include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-settings/VoiceSettingsAlertController.h"
 #include "voice-settings/VoiceSettingsSheetController.h"
+#include "voices/CZVoiceObject.h"
 
 #include <QAccessibleWidget>
 #include <QApplication>
 #include <QCommandLineParser>
+#include <QDeadlineTimer>
 #include <QDialog>
 #include <QDir>
+#include <QEventLoop>
+#include <QPushButton>
+#include <QTableView>
 #include <QTimer>
 
 #include <cstdio>
+#include <functional>
 
 namespace {
+
+void wait(int milliseconds)
+{
+    QEventLoop loop;
+    QTimer::singleShot(milliseconds, &loop, &QEventLoop::quit);
+    loop.exec();
+}
+
+// Ticks a downloadable voice in the customise voices sheet, pictures the sheet with its size and
+// presses OK, which asks the installer daemon for it; then waits until its bytes are arriving. False
+// when no daemon can be reached (the sheet is cancelled) or nothing is downloading within 15 s.
+bool tickAndDownload(Cadenza::CustomizeVoicesWindowController *sheet, const std::function<void()> &picture)
+{
+    using namespace Cadenza::InstallerProtocol;
+    auto *manager = Cadenza::CZSpeechInstallationManager::sharedManager();
+    const QList<Cadenza::VoiceTableRowPtr> rows = sheet->currentlyDisplayedVoiceRows();
+    int chosen = -1;
+    for (int row = 0; row < rows.size() && chosen < 0; ++row) {
+        const auto voice = rows.at(row)->voiceObject();
+        if (voice && voice->downloadStatus() == NotInstalledStatus) {
+            chosen = row;
+        }
+    }
+    if (chosen < 0 || !manager->_serverIsReachable()) {
+        sheet->cancelVoiceSelection();
+        return false;
+    }
+    sheet->voiceSelectionTableView()->scrollTo(sheet->voiceSelectionTableView()->model()->index(chosen, 0));
+    wait(200);
+    Cadenza::VoiceTableCellView *view = sheet->existingViewForRow(chosen);
+    auto *ok = sheet->window()->findChild<QPushButton *>(QStringLiteral("okButton"));
+    if (!view || !ok) {
+        sheet->cancelVoiceSelection();
+        return false;
+    }
+    view->activeCheckbox()->click();
+    wait(200);
+    picture();
+    ok->click();
+    QDeadlineTimer deadline(15000);
+    while (!deadline.hasExpired()) {
+        for (const QVariant &value : manager->activeInstallations()) {
+            const QVariantMap record = value.toMap();
+            if (record.value(ItemSoftwareUpdateStateKey).toLongLong() == DownloadingState
+                && record.value(ItemDownloadByteCountKey).toULongLong() > 0) {
+                return true;
+            }
+        }
+        wait(100);
+    }
+    return false;
+}
+
 // Renders the windows the way they look now and writes them as PNG files into @p folder.
 int writeScreenshots(SettingsWindow &window, const QString &folder)
 {
@@ -56,7 +119,21 @@ int writeScreenshots(SettingsWindow &window, const QString &folder)
     sheet->window()->resize(680, 520);
     QCoreApplication::processEvents();
     save(sheet->window(), "customize-voices.png");
-    sheet->cancelVoiceSelection();
+
+    // A voice ticked for download, with its size; OK asks the installer daemon for it.
+    if (tickAndDownload(sheet, [&] { save(sheet->window(), "customize-voices-ticked.png"); })) {
+        wait(1500); // the pop-ups refresh their status line every half second
+        save(&window, "main-window-downloading.png");
+        Cadenza::CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(&window, false);
+        sheet->window()->resize(680, 520);
+        wait(500);
+        save(sheet->window(), "customize-voices-downloading.png");
+        sheet->cancelVoiceSelection();
+    } else {
+        std::fprintf(stderr,
+            "cadenza-settings: no download could be started (is quillond running?); "
+            "no screenshots of a download in progress\n");
+    }
 
     Cadenza::CZSpeechInstallationManagerSheets::showSRLanguagesSelectionSheetForWindow(&window,
         QStringList {QStringLiteral("en_US"), QStringLiteral("de_DE"), QStringLiteral("fr_FR")},

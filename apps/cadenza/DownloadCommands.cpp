@@ -21,11 +21,8 @@ using namespace Cadenza;
 int DownloadCommands::downloadables(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral(
-        "Lists the voices and recognition languages that can be downloaded or upgraded, with their download "
-        "status (1 upgrade available, 2 not installed, 3 downloading, 4 waiting) and size."));
-    const QCommandLineOption json(
-        QStringLiteral("json"), QStringLiteral("Print a JSON array instead of a table."));
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLIDownloadablesDescription")));
+    const QCommandLineOption json(QStringLiteral("json"), CommandLine::text(QStringLiteral("CLIJsonOption")));
     parser.addOption(json);
     if (const auto done = CommandLine::parse(parser, arguments)) {
         return *done;
@@ -52,7 +49,7 @@ int DownloadCommands::downloadables(const QStringList &arguments)
     }
     if (parser.isSet(json)) {
         std::fputs(QJsonDocument(rows).toJson().constData(), stdout);
-        return 0;
+        return CommandLine::Success;
     }
     for (const auto &value : rows) {
         const QJsonObject row = value.toObject();
@@ -69,17 +66,15 @@ int DownloadCommands::downloadables(const QStringList &arguments)
 int DownloadCommands::remove(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral(
-        "Removes a downloaded voice (by identifier) or recognition language (by locale, such as de_DE), "
-        "asking "
-        "for administrator rights when it is installed for every user, and records the removal."));
-    parser.addPositionalArgument(QStringLiteral("ID|LOCALE"), QStringLiteral("What to remove."));
-    if (const auto done = CommandLine::parse(parser, arguments)) {
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLIRemoveDescription")));
+    parser.addPositionalArgument(
+        QStringLiteral("ID|LOCALE"), CommandLine::text(QStringLiteral("CLIRemoveOperand")));
+    if (const auto done = CommandLine::parse(parser, arguments, 1)) {
         return *done;
     }
     if (parser.positionalArguments().size() != 1) {
-        CommandLine::fail(arguments, QStringLiteral("give one voice identifier or locale"));
-        return 2;
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIGiveOneVoiceOrLocale")));
+        return CommandLine::BadUsage;
     }
     const QString what = parser.positionalArguments().first();
     CZSpeechInstallationManager &manager = *CZSpeechInstallationManager::sharedManager();
@@ -95,47 +90,42 @@ int DownloadCommands::remove(const QStringList &arguments)
         bundle = manager.bundleForRemovableLanguage(*language, nullptr);
     }
     if (!bundle) {
-        CommandLine::fail(arguments,
-            QStringLiteral("'%1' is not a downloaded voice or language that can be removed").arg(what));
-        return 1;
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLINotRemovable"), {what}));
+        return CommandLine::Failed;
     }
     manager.startRemovingDownloadedSpeechItems({item});
     QTimer::singleShot(0, qApp, &QCoreApplication::quit); // after the removal, which runs from the event loop
     QCoreApplication::exec();
     if (QFileInfo::exists(bundle->path)) {
-        CommandLine::fail(arguments, QStringLiteral("%1 was not removed").arg(bundle->path));
-        return 1;
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLINotRemoved"), {bundle->path}));
+        return CommandLine::Failed;
     }
-    std::fprintf(stdout, "Removed %s\n", qPrintable(bundle->path));
-    return 0;
+    CommandLine::print(stdout, CommandLine::text(QStringLiteral("CLIRemoved"), {bundle->path}));
+    return CommandLine::Success;
 }
 
 int DownloadCommands::upgrade(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral(
-        "Starts downloading the best quality of voice ID in the background when the rules allow it: on mains "
-        "power, not removed or prohibited by the user, within the attempt limits. Prints whether it may go "
-        "on."));
-    parser.addPositionalArgument(QStringLiteral("ID"), QStringLiteral("A voice identifier."));
-    if (const auto done = CommandLine::parse(parser, arguments)) {
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLIUpgradeDescription")));
+    parser.addPositionalArgument(QStringLiteral("ID"), CommandLine::text(QStringLiteral("CLIVoiceOperand")));
+    if (const auto done = CommandLine::parse(parser, arguments, 1)) {
         return *done;
     }
     if (parser.positionalArguments().size() != 1) {
-        CommandLine::fail(arguments, QStringLiteral("give one voice identifier"));
-        return 2;
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIGiveOneVoice")));
+        return CommandLine::BadUsage;
     }
     const bool allowed
         = StartDownloadingHighestQualityIfNecessaryForVoiceIdentifier(parser.positionalArguments().first());
     std::fputs(allowed ? "yes\n" : "no\n", stdout);
-    return allowed ? 0 : 1;
+    return allowed ? CommandLine::Success : CommandLine::Failed;
 }
 
 int DownloadCommands::power(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(
-        QStringLiteral("Says whether this computer runs on mains power (\"AC Power\")."));
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLIPowerDescription")));
     if (const auto done = CommandLine::parse(parser, arguments)) {
         return *done;
     }

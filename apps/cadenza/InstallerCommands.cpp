@@ -4,6 +4,7 @@
 
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/InstallerProtocol.h"
+#include "platform/LocalizationTable.h"
 #include "platform/PropertyList.h"
 
 #include <QCommandLineParser>
@@ -11,6 +12,7 @@
 #include <QJsonArray>
 #include <QJsonDocument>
 #include <QJsonObject>
+#include <QLocale>
 #include <QTimer>
 #include <QtMath>
 
@@ -67,21 +69,23 @@ QString describe(const QVariantMap &record)
     const QString name = record.value(ItemNameKey).toString();
     const qint64 state = record.value(ItemSoftwareUpdateStateKey).toLongLong();
     if (record.value(ItemDownloadStatusKey).toLongLong() == WaitingStatus) {
-        return QStringLiteral("%1: waiting").arg(name);
+        return CommandLine::text(QStringLiteral("CLIStatusWaiting"), {name});
     }
     if (state == DownloadingState) {
         const double remaining = record.value(ItemSecondsRemainingKey).toDouble();
-        return QStringLiteral("%1: downloading, %2 %, %3 of %4 bytes%5")
-            .arg(name)
-            .arg(record.value(ItemPercentCompleteKey).toDouble(), 0, 'f', 0)
-            .arg(record.value(ItemDownloadByteCountKey).toULongLong())
-            .arg(record.value(ItemByteSizeKey).toULongLong())
-            .arg(remaining > 0 ? QStringLiteral(", about %1 s left").arg(qCeil(remaining)) : QString());
+        const QLocale locale(Platform::LocalizationTable::shared().language());
+        return CommandLine::text(QStringLiteral("CLIStatusDownloading"),
+                   {name, locale.toString(record.value(ItemPercentCompleteKey).toDouble(), 'f', 0),
+                       locale.toString(record.value(ItemDownloadByteCountKey).toULongLong()),
+                       locale.toString(record.value(ItemByteSizeKey).toULongLong())})
+            + (remaining > 0 ? CommandLine::text(
+                   QStringLiteral("CLIStatusSecondsLeft"), {QString::number(qCeil(remaining))})
+                             : QString());
     }
     if (state == InstallingState) {
-        return QStringLiteral("%1: installing").arg(name);
+        return CommandLine::text(QStringLiteral("CLIStatusInstalling"), {name});
     }
-    return QStringLiteral("%1: preparing").arg(name);
+    return CommandLine::text(QStringLiteral("CLIStatusPreparing"), {name});
 }
 
 } // namespace
@@ -89,100 +93,121 @@ QString describe(const QVariantMap &record)
 int InstallerCommands::status(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral(
-        "Shows the installations that the installer daemon is working on; nothing when it is not running."));
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLIStatusDescription")));
     const QCommandLineOption json(
-        QStringLiteral("json"), QStringLiteral("Print the daemon's records as JSON."));
+        QStringLiteral("json"), CommandLine::text(QStringLiteral("CLIJsonRecordsOption")));
     parser.addOption(json);
     if (const auto done = CommandLine::parse(parser, arguments)) {
         return *done;
     }
     CZSpeechInstallationManager manager;
+    if (!manager._serverIsReachable()) {
+        if (parser.isSet(json)) {
+            std::fputs("[]\n", stdout);
+        }
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonNotRunning")));
+        return CommandLine::DaemonUnreachable;
+    }
+    // A daemon the service manager has yet to start has nothing to do: it is not asked, or started.
     const QVariantList records = manager.activeInstallations();
     if (parser.isSet(json)) {
         std::fputs(QJsonDocument(QJsonArray::fromVariantList(records)).toJson().constData(), stdout);
-        return 0;
+        return CommandLine::Success;
     }
     if (records.isEmpty()) {
-        std::fputs(manager._serverIsRunning() ? "Nothing is being installed.\n"
-                                              : "The installer daemon is not running.\n",
-            stdout);
-        return 0;
+        CommandLine::print(stdout, CommandLine::text(QStringLiteral("CLINothingInstalling")));
+        return CommandLine::Success;
     }
     for (const QVariant &record : records) {
-        std::fprintf(stdout, "%s\n", qPrintable(describe(record.toMap())));
+        CommandLine::print(stdout, describe(record.toMap()));
     }
-    return 0;
+    return CommandLine::Success;
 }
 
 int InstallerCommands::install(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(
-        QStringLiteral("Asks the installer daemon to install TAG, such as "
-                       "VOICEID:com.vendra.speech.synthesis.voice.jonas.premium "
-                       "or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given."));
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLIInstallDescription")));
     const QCommandLineOption noWait(
-        QStringLiteral("no-wait"), QStringLiteral("Return once the request is sent."));
+        QStringLiteral("no-wait"), CommandLine::text(QStringLiteral("CLINoWaitOption")));
     parser.addOption(noWait);
-    parser.addPositionalArgument(QStringLiteral("TAG"), QStringLiteral("The installer tag of the item."));
-    if (const auto done = CommandLine::parse(parser, arguments)) {
+    parser.addPositionalArgument(QStringLiteral("TAG"), CommandLine::text(QStringLiteral("CLITagOperand")));
+    if (const auto done = CommandLine::parse(parser, arguments, 1)) {
         return *done;
     }
     if (parser.positionalArguments().size() != 1) {
-        CommandLine::fail(arguments, QStringLiteral("give exactly one tag"));
-        return 2;
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIGiveOneTag")));
+        return CommandLine::BadUsage;
     }
     const QString tag = parser.positionalArguments().first();
+    if (tag.trimmed().isEmpty()) {
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIEmptyTag")));
+        return CommandLine::BadUsage;
+    }
+    if (tag.size() > MaximumFieldLength) {
+        CommandLine::fail(arguments,
+            CommandLine::text(QStringLiteral("CLITagTooLong"), {QString::number(MaximumFieldLength)}));
+        return CommandLine::BadUsage;
+    }
     CZSpeechInstallationManager manager;
-    if (!manager._serverIsRunning()) {
-        CommandLine::fail(arguments, QStringLiteral("the installer daemon is not running (start quillond)"));
-        return 1;
+    if (!manager._serverIsReachable()) {
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonUnreachable")));
+        return CommandLine::DaemonUnreachable;
     }
     // Tags the catalogue does not know still go to the daemon, which has the last word.
-    const CatalogueItem item = findInCatalogue(tag).value_or(
+    CatalogueItem item = findInCatalogue(tag).value_or(
         CatalogueItem {tag.section(QLatin1Char(':'), 1), tag.section(QLatin1Char(':'), 1), 0});
+    if (item.name.isEmpty()) {
+        item.name = tag;
+    }
+    if (item.objectIdentifier.isEmpty()) {
+        item.objectIdentifier = tag;
+    }
     QEventLoop loop;
-    int exitCode = 1;
+    int exitCode = CommandLine::Failed;
     QObject::connect(&manager, &CZSpeechInstallationManager::installationFinished, &loop,
         [&](const QString &finishedTag, qint32 message, const QVariantMap &answer) {
             if (finishedTag != tag) {
                 return;
             }
             if (message == InstalledCompletion) {
-                std::fprintf(stdout, "Installed %s\n", qPrintable(tag));
-                exitCode = 0;
+                CommandLine::print(stdout, CommandLine::text(QStringLiteral("CLIInstalled"), {tag}));
+                exitCode = CommandLine::Success;
             } else if (message == CancelledCompletion) {
-                std::fprintf(stderr, "%s: the installation of %s was cancelled\n",
-                    qPrintable(arguments.first()), qPrintable(tag));
+                CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIInstallCancelled"), {tag}));
             } else {
-                std::fprintf(stderr, "%s: installing %s failed: %s\n", qPrintable(arguments.first()),
-                    qPrintable(tag), qPrintable(answer.value(FailureReasonKey).toString()));
+                CommandLine::fail(arguments,
+                    CommandLine::text(QStringLiteral("CLIInstallFailed"),
+                        {tag, answer.value(FailureReasonKey).toString()}));
             }
             loop.quit();
         });
-    if (!manager._requestInstallation(tag, item.name.isEmpty() ? tag : item.name, item.byteSize,
-            item.objectIdentifier.isEmpty() ? tag : item.objectIdentifier, 0)) {
-        CommandLine::fail(arguments, QStringLiteral("could not send the request"));
-        return 1;
+    if (!manager._requestInstallation(tag, item.name, item.byteSize, item.objectIdentifier, 0)) {
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonUnreachable")));
+        return CommandLine::DaemonUnreachable;
     }
     if (parser.isSet(noWait)) {
-        return 0;
+        return CommandLine::Success;
     }
     QTimer progress;
     QString lastLine;
+    bool seenRunning = false;
     QObject::connect(&progress, &QTimer::timeout, &loop, [&] {
         for (const QVariant &record : manager.activeInstallations()) {
             if (record.toMap().value(TagNameKey).toString() == tag) {
                 const QString line = describe(record.toMap());
                 if (line != lastLine) {
-                    std::fprintf(stderr, "%s\n", qPrintable(line));
+                    CommandLine::print(stderr, line);
                     lastLine = line;
                 }
             }
         }
-        if (!manager._serverIsRunning()) {
-            std::fprintf(stderr, "%s: the installer daemon stopped\n", qPrintable(arguments.first()));
+        // A socket-activated daemon may take a moment to come up; once it ran, its going is the end.
+        const bool running = manager._serverIsRunning();
+        seenRunning = seenRunning || running;
+        if ((seenRunning && !running) || !manager._serverIsReachable()) {
+            CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonStopped")));
+            exitCode = CommandLine::DaemonUnreachable;
             loop.exit();
         }
     });
@@ -194,15 +219,15 @@ int InstallerCommands::install(const QStringList &arguments)
 int InstallerCommands::cancel(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral("Cancels every installation of the installer daemon."));
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLICancelDescription")));
     if (const auto done = CommandLine::parse(parser, arguments)) {
         return *done;
     }
     CZSpeechInstallationManager manager;
-    if (!manager._serverIsRunning()) {
-        std::fputs("The installer daemon is not running.\n", stdout);
-        return 0;
+    if (!manager._serverIsReachable()) {
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonNotRunning")));
+        return CommandLine::DaemonUnreachable;
     }
     manager.cancelAllInstallations();
-    return 0;
+    return CommandLine::Success;
 }

@@ -2,6 +2,7 @@
 
 #include "CommandLine.h"
 
+#include "installation/CZSpeechInstallationManager.h"
 #include "recognition-languages/CZSRLanguageItem.h"
 
 #include <QCommandLineParser>
@@ -16,13 +17,8 @@ using namespace Cadenza;
 int LanguagesCommand::run(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral(
-        "Lists the recognition (dictation) languages: those installed on this computer and those that can be "
-        "downloaded, with their names in your language and whether you chose to show them (0 hidden, 1 "
-        "shown, "
-        "2 automatic)."));
-    const QCommandLineOption json(
-        QStringLiteral("json"), QStringLiteral("Print a JSON array instead of a table."));
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLILanguagesDescription")));
+    const QCommandLineOption json(QStringLiteral("json"), CommandLine::text(QStringLiteral("CLIJsonOption")));
     parser.addOption(json);
     if (const auto done = CommandLine::parse(parser, arguments)) {
         return *done;
@@ -36,7 +32,8 @@ int LanguagesCommand::run(const QStringList &arguments)
     for (const auto &item : CZSRLanguageItem::availableLocalRecognizerLanguageItems()) {
         lines.append({QStringLiteral("installed"), item});
     }
-    for (const auto &item : CZSRLanguageItem::downloadableLocalSRLanguageItems()) {
+    // The installation manager's list, as the sheets show it: what is installed is not offered again.
+    for (const auto &item : CZSpeechInstallationManager::sharedManager()->downloadableSRLanguageItems()) {
         lines.append({QStringLiteral("downloadable"), item});
     }
     for (auto &line : lines) {
@@ -53,17 +50,24 @@ int LanguagesCommand::run(const QStringList &arguments)
                 {QStringLiteral("size"), QString::number(line.item->byteSize())}});
         }
         std::fputs(QJsonDocument(array).toJson().constData(), stdout);
-        return 0;
+        return CommandLine::Success;
     }
     if (lines.isEmpty()) {
-        std::fputs("No recognition languages are installed or offered.\n", stderr);
-        return 0;
+        CommandLine::print(stderr, CommandLine::text(QStringLiteral("CLINoLanguages")));
+        return CommandLine::Success;
     }
+    const QString installed = CommandLine::text(QStringLiteral("CLIKindInstalled"));
+    const QString downloadable = CommandLine::text(QStringLiteral("CLIKindDownloadable"));
+    const qsizetype kindWidth = qMax(installed.size(), downloadable.size());
     for (const auto &line : lines) {
-        std::fprintf(stdout, "%-12s %-8s %-40s %lld %s\n", qPrintable(line.kind),
-            qPrintable(line.item->localeIdentifier()), qPrintable(line.item->displayTitle()),
-            static_cast<long long>(line.item->visibility()),
-            line.kind == u"downloadable" ? qPrintable(line.item->displayedSize()) : "");
+        const bool offered = line.kind == u"downloadable";
+        QString text = QStringLiteral("%1 %2 %3 %4 %5")
+                           .arg(offered ? downloadable : installed, -int(kindWidth))
+                           .arg(line.item->localeIdentifier(), -8)
+                           .arg(line.item->displayTitle(), -40)
+                           .arg(line.item->visibility())
+                           .arg(offered ? line.item->displayedSize() : QString());
+        CommandLine::print(stdout, text.trimmed());
     }
-    return 0;
+    return CommandLine::Success;
 }

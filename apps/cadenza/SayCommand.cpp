@@ -2,6 +2,7 @@
 
 #include "CommandLine.h"
 
+#include "platform/OutputFile.h"
 #include "platform/Services.h"
 #include "platform/SpeechSynthesisService.h"
 #include "voices/SpeechSynthesizer.h"
@@ -11,7 +12,8 @@
 #include <QFile>
 #include <QTimer>
 
-#include <cstdio>
+#include <cmath>
+#include <limits>
 
 using namespace Cadenza;
 using namespace Cadenza::Platform;
@@ -19,63 +21,65 @@ using namespace Cadenza::Platform;
 int SayCommand::run(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral(
-        "Speaks TEXT (or standard input when no TEXT is given) with the default voice or the one chosen "
-        "with --voice, on the audio output or into a WAV file."));
-    const QCommandLineOption voice(QStringLiteral("voice"),
-        QStringLiteral(
-            "Speak with the voice ID (an identifier, or the start of one of 36 characters or more)."),
-        QStringLiteral("ID"));
-    const QCommandLineOption rate(QStringLiteral("rate"),
-        QStringLiteral("Speak at WPM words per minute (80 to 450)."), QStringLiteral("WPM"));
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLISayDescription")));
+    const QCommandLineOption voice(
+        QStringLiteral("voice"), CommandLine::text(QStringLiteral("CLIVoiceOption")), QStringLiteral("ID"));
+    const QCommandLineOption rate(
+        QStringLiteral("rate"), CommandLine::text(QStringLiteral("CLIRateOption")), QStringLiteral("WPM"));
     const QCommandLineOption output(QStringLiteral("output"),
-        QStringLiteral("Write the speech to FILE.wav (16-bit mono) instead of playing it."),
-        QStringLiteral("FILE.wav"));
+        CommandLine::text(QStringLiteral("CLIOutputOption")), QStringLiteral("FILE.wav"));
     parser.addOptions({voice, rate, output});
-    parser.addPositionalArgument(
-        QStringLiteral("TEXT"), QStringLiteral("What to say."), QStringLiteral("[TEXT...]"));
-    const QString program = arguments.first();
-    if (const auto done = CommandLine::parse(parser, arguments)) {
+    parser.addPositionalArgument(QStringLiteral("TEXT"), CommandLine::text(QStringLiteral("CLITextOperand")),
+        QStringLiteral("[TEXT...]"));
+    if (const auto done = CommandLine::parse(parser, arguments, std::numeric_limits<qsizetype>::max())) {
         return *done;
     }
 
     SpeechRequest request;
+    // The values are checked before any work, and before standard input is read.
+    if (parser.isSet(rate)) {
+        bool ok = false;
+        request.wordsPerMinute = parser.value(rate).toDouble(&ok);
+        if (!ok || !std::isfinite(request.wordsPerMinute) || request.wordsPerMinute < 80
+            || request.wordsPerMinute > 450) {
+            CommandLine::fail(
+                arguments, CommandLine::text(QStringLiteral("CLIRateRange"), {parser.value(rate)}));
+            return CommandLine::BadUsage;
+        }
+    }
+    if (parser.isSet(output)) {
+        QString reason;
+        if (OutputFile::kindOf(parser.value(output), &reason) == OutputFile::Kind::Refused) {
+            CommandLine::fail(arguments, reason);
+            return CommandLine::BadUsage;
+        }
+    }
     request.text = parser.positionalArguments().join(QLatin1Char(' '));
     if (parser.positionalArguments().isEmpty()) {
         QFile input;
         if (!input.open(stdin, QIODevice::ReadOnly)) {
-            std::fprintf(stderr, "%s: cannot read standard input\n", qPrintable(program));
-            return 1;
+            CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLICannotReadInput")));
+            return CommandLine::Failed;
         }
         request.text = QString::fromUtf8(input.readAll());
     }
     if (request.text.trimmed().isEmpty()) {
-        std::fprintf(stderr, "%s: nothing to say\n", qPrintable(program));
-        return 2;
-    }
-    if (parser.isSet(rate)) {
-        bool ok = false;
-        request.wordsPerMinute = parser.value(rate).toDouble(&ok);
-        if (!ok || request.wordsPerMinute < 80 || request.wordsPerMinute > 450) {
-            std::fprintf(stderr, "%s: --rate takes words per minute from 80 to 450, not '%s'\n",
-                qPrintable(program), qPrintable(parser.value(rate)));
-            return 2;
-        }
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLINothingToSay")));
+        return CommandLine::BadUsage;
     }
     if (parser.isSet(voice)) {
         const QString wanted = parser.value(voice);
         request.voiceIdentifier
             = SpeechSynthesizer::resolveVoiceIdentifier(wanted, SpeechSynthesizer::allVoices());
         if (request.voiceIdentifier.isEmpty()) {
-            std::fprintf(stderr, "%s: no installed voice '%s' (see 'cadenza voices --all')\n",
-                qPrintable(program), qPrintable(wanted));
-            return 1;
+            CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLINoSuchVoice"), {wanted}));
+            return CommandLine::Failed;
         }
     } else {
         request.voiceIdentifier = SpeechSynthesizer::defaultVoiceFromMainstreamVoices();
         if (request.voiceIdentifier.isEmpty()) {
-            std::fprintf(stderr, "%s: no voices are installed\n", qPrintable(program));
-            return 1;
+            CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLINoVoices")));
+            return CommandLine::Failed;
         }
     }
 
@@ -83,10 +87,10 @@ int SayCommand::run(const QStringList &arguments)
     if (parser.isSet(output)) {
         QString error;
         if (!service.renderToFile(request, parser.value(output), &error)) {
-            std::fprintf(stderr, "%s: %s\n", qPrintable(program), qPrintable(error));
-            return 1;
+            CommandLine::fail(arguments, error);
+            return CommandLine::Failed;
         }
-        return 0;
+        return CommandLine::Success;
     }
 
     QEventLoop loop;
@@ -100,14 +104,14 @@ int SayCommand::run(const QStringList &arguments)
     });
     requestId = service.startSpeaking(request);
     if (requestId == 0) {
-        std::fprintf(stderr, "%s: could not speak with '%s'\n", qPrintable(program),
-            qPrintable(request.voiceIdentifier));
-        return 1;
+        CommandLine::fail(
+            arguments, CommandLine::text(QStringLiteral("CLICannotSpeak"), {request.voiceIdentifier}));
+        return CommandLine::Failed;
     }
     loop.exec();
     if (!completed) {
-        std::fprintf(stderr, "%s: speaking failed\n", qPrintable(program));
-        return 1;
+        CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLISpeakingFailed")));
+        return CommandLine::Failed;
     }
-    return 0;
+    return CommandLine::Success;
 }

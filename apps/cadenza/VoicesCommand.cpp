@@ -54,21 +54,12 @@ QString displayName(const Platform::Locale &in, const QString &key, const QStrin
 int VoicesCommand::run(const QStringList &arguments)
 {
     QCommandLineParser parser;
-    parser.setApplicationDescription(QStringLiteral(
-        "Lists the installed voices: identifier, name, locale, language, country and gender, with names in "
-        "your language. The default voice is marked with '*'."));
-    const QCommandLineOption all(QStringLiteral("all"),
-        QStringLiteral("List every voice of every quality, not only the best quality of each voice."));
-    const QCommandLineOption json(
-        QStringLiteral("json"), QStringLiteral("Print a JSON array instead of a table."));
+    parser.setApplicationDescription(CommandLine::text(QStringLiteral("CLIVoicesDescription")));
+    const QCommandLineOption all(QStringLiteral("all"), CommandLine::text(QStringLiteral("CLIAllOption")));
+    const QCommandLineOption json(QStringLiteral("json"), CommandLine::text(QStringLiteral("CLIJsonOption")));
     parser.addOptions({all, json});
     if (const auto done = CommandLine::parse(parser, arguments)) {
         return *done;
-    }
-    if (!parser.positionalArguments().isEmpty()) {
-        CommandLine::fail(
-            arguments, QStringLiteral("unexpected argument '%1'").arg(parser.positionalArguments().first()));
-        return 2;
     }
 
     const bool everyQuality = parser.isSet(all);
@@ -113,8 +104,8 @@ int VoicesCommand::run(const QStringList &arguments)
     }
 
     if (lines.isEmpty()) {
-        std::fputs("No voices are installed.\n", stderr);
-        return 0;
+        CommandLine::print(stderr, CommandLine::text(QStringLiteral("CLINoVoicesInstalled")));
+        return CommandLine::Success;
     }
     qsizetype widths[5] = {0, 0, 0, 0, 0};
     for (const auto &line : lines) {

@@ -1,5 +1,6 @@
 // cadenza: Cadenza's command-line tool.
 
+#include "CommandLine.h"
 #include "DownloadCommands.h"
 #include "InstallerCommands.h"
 #include "LanguagesCommand.h"
@@ -7,8 +8,12 @@
 #include "SayCommand.h"
 #include "VoicesCommand.h"
 
+#include "platform/LocalizationTable.h"
+
 #include <QCoreApplication>
-#include <QTextStream>
+#include <QLibraryInfo>
+#include <QLocale>
+#include <QTranslator>
 
 #include <cstdio>
 
@@ -16,25 +21,8 @@ namespace {
 
 void printUsage(FILE *to)
 {
-    std::fputs(
-        "Usage: cadenza COMMAND [OPTIONS]\n"
-        "\n"
-        "Commands:\n"
-        "  voices   list the installed voices\n"
-        "  say      speak a text, or write it to a WAV file\n"
-        "  languages list the installed and downloadable recognition languages\n"
-        "  post     post a notification to every process of the session\n"
-        "  notify   the same as post, e.g. cadenza notify DictationIMNotificationRecognizerDidPreHeat\n"
-        "  status   show what the installer daemon is installing\n"
-        "  install  install a voice or recognition language by its tag\n"
-        "  cancel   cancel every installation\n"
-        "  downloadables list what can be downloaded or upgraded\n"
-        "  remove   remove a downloaded voice or recognition language\n"
-        "  upgrade  fetch the best quality of a voice in the background, when allowed\n"
-        "  power    say whether this computer runs on mains power\n"
-        "\n"
-        "Run 'cadenza COMMAND --help' for the options of a command.\n",
-        to);
+    CommandLine::print(to, CommandLine::text(QStringLiteral("CLIUsage")));
+    CommandLine::print(to, CommandLine::text(QStringLiteral("CLIExitStatusHelp")));
 }
 
 } // namespace
@@ -43,15 +31,23 @@ int main(int argc, char *argv[])
 {
     QCoreApplication app(argc, argv);
     QCoreApplication::setApplicationName(QStringLiteral("cadenza"));
+    // Qt's own words ("Usage:", "Options:") in the language Cadenza's texts are in.
+    QTranslator qtTexts;
+    const QString language = Cadenza::Platform::LocalizationTable::shared().language();
+    if (language != u"en"
+        && qtTexts.load(QLocale(language), QStringLiteral("qtbase"), QStringLiteral("_"),
+            QLibraryInfo::path(QLibraryInfo::TranslationsPath))) {
+        QCoreApplication::installTranslator(&qtTexts);
+    }
     QStringList arguments = QCoreApplication::arguments();
     if (arguments.size() < 2) {
         printUsage(stderr);
-        return 2;
+        return CommandLine::BadUsage;
     }
     const QString command = arguments.at(1);
     if (command == u"-h" || command == u"--help" || command == u"help") {
         printUsage(stdout);
-        return 0;
+        return CommandLine::Success;
     }
     // Each command parses "cadenza COMMAND ..." as its own program name and options.
     arguments.removeAt(1);
@@ -89,7 +85,9 @@ int main(int argc, char *argv[])
     if (command == u"cancel") {
         return InstallerCommands::cancel(arguments);
     }
-    std::fprintf(stderr, "cadenza: unknown command '%s'\n\n", qPrintable(command));
+    CommandLine::print(stderr,
+        QStringLiteral("cadenza: ") + CommandLine::text(QStringLiteral("CLIUnknownCommand"), {command})
+            + u'\n');
     printUsage(stderr);
-    return 2;
+    return CommandLine::BadUsage;
 }

@@ -3,6 +3,302 @@
 <TS version="2.1" language="en_US">
 <context>
     <name></name>
+    <message id="CLIUsage">
+        <source>Usage: cadenza COMMAND [OPTIONS]
+
+Commands:
+  voices         list the installed voices
+  say            speak a text, or write it to a WAV file
+  languages      list the installed and downloadable recognition languages
+  post           post a notification to every process of the session
+  notify         the same as post, e.g. cadenza notify DictationIMNotificationRecognizerDidPreHeat
+  status         show what the installer daemon is installing
+  install        install a voice or recognition language by its tag
+  cancel         cancel every installation
+  downloadables  list what can be downloaded or upgraded
+  remove         remove a downloaded voice or recognition language
+  upgrade        fetch the best quality of a voice in the background, when allowed
+  power          say whether this computer runs on mains power
+
+Run 'cadenza COMMAND --help' for the options of a command.</source>
+        <translation>Usage: cadenza COMMAND [OPTIONS]
+
+Commands:
+  voices         list the installed voices
+  say            speak a text, or write it to a WAV file
+  languages      list the installed and downloadable recognition languages
+  post           post a notification to every process of the session
+  notify         the same as post, e.g. cadenza notify DictationIMNotificationRecognizerDidPreHeat
+  status         show what the installer daemon is installing
+  install        install a voice or recognition language by its tag
+  cancel         cancel every installation
+  downloadables  list what can be downloaded or upgraded
+  remove         remove a downloaded voice or recognition language
+  upgrade        fetch the best quality of a voice in the background, when allowed
+  power          say whether this computer runs on mains power
+
+Run 'cadenza COMMAND --help' for the options of a command.</translation>
+    </message>
+    <message id="CLIExitStatusHelp">
+        <source>Exit status: 0 success, 1 the operation failed, 2 bad usage (unknown option, stray operand, bad value), 3 the installer daemon cannot be reached.</source>
+        <translation>Exit status: 0 success, 1 the operation failed, 2 bad usage (unknown option, stray operand, bad value), 3 the installer daemon cannot be reached.</translation>
+    </message>
+    <message id="CLIUnknownCommand">
+        <source>unknown command '%1'</source>
+        <translation>unknown command '%1'</translation>
+    </message>
+    <message id="CLIUnknownOption">
+        <source>unknown option '%1'</source>
+        <translation>unknown option '%1'</translation>
+    </message>
+    <message id="CLIUnexpectedArgument">
+        <source>unexpected argument '%1'</source>
+        <translation>unexpected argument '%1'</translation>
+    </message>
+    <message id="CLIDaemonNotRunning">
+        <source>The installer daemon is not running.</source>
+        <translation>The installer daemon is not running.</translation>
+    </message>
+    <message id="CLIDaemonUnreachable">
+        <source>the installer daemon cannot be reached (start quillond)</source>
+        <translation>the installer daemon cannot be reached (start quillond)</translation>
+    </message>
+    <message id="CLIDaemonStopped">
+        <source>the installer daemon stopped</source>
+        <translation>the installer daemon stopped</translation>
+    </message>
+    <message id="CLINothingInstalling">
+        <source>Nothing is being installed.</source>
+        <translation>Nothing is being installed.</translation>
+    </message>
+    <message id="CLIStatusWaiting">
+        <source>%1: waiting</source>
+        <translation>%1: waiting</translation>
+    </message>
+    <message id="CLIStatusDownloading">
+        <source>%1: downloading, %2 %%, %3 of %4 bytes</source>
+        <translation>%1: downloading, %2 %%, %3 of %4 bytes</translation>
+    </message>
+    <message id="CLIStatusSecondsLeft">
+        <source>, about %1 s left</source>
+        <translation>, about %1 s left</translation>
+    </message>
+    <message id="CLIStatusInstalling">
+        <source>%1: installing</source>
+        <translation>%1: installing</translation>
+    </message>
+    <message id="CLIStatusPreparing">
+        <source>%1: preparing</source>
+        <translation>%1: preparing</translation>
+    </message>
+    <message id="CLIStatusDescription">
+        <source>Shows the installations that the installer daemon is working on.</source>
+        <translation>Shows the installations that the installer daemon is working on.</translation>
+    </message>
+    <message id="CLIJsonRecordsOption">
+        <source>Print the daemon's records as JSON.</source>
+        <translation>Print the daemon's records as JSON.</translation>
+    </message>
+    <message id="CLIJsonOption">
+        <source>Print a JSON array instead of a table.</source>
+        <translation>Print a JSON array instead of a table.</translation>
+    </message>
+    <message id="CLIInstallDescription">
+        <source>Asks the installer daemon to install TAG, such as VOICEID:com.vendra.speech.synthesis.voice.jonas.premium or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given.</source>
+        <translation>Asks the installer daemon to install TAG, such as VOICEID:com.vendra.speech.synthesis.voice.jonas.premium or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given.</translation>
+    </message>
+    <message id="CLINoWaitOption">
+        <source>Return once the request is sent.</source>
+        <translation>Return once the request is sent.</translation>
+    </message>
+    <message id="CLITagOperand">
+        <source>The installer tag of the item.</source>
+        <translation>The installer tag of the item.</translation>
+    </message>
+    <message id="CLIGiveOneTag">
+        <source>give exactly one tag</source>
+        <translation>give exactly one tag</translation>
+    </message>
+    <message id="CLIEmptyTag">
+        <source>the tag is empty</source>
+        <translation>the tag is empty</translation>
+    </message>
+    <message id="CLITagTooLong">
+        <source>the tag is longer than %1 characters</source>
+        <translation>the tag is longer than %1 characters</translation>
+    </message>
+    <message id="CLIInstalled">
+        <source>Installed %1</source>
+        <translation>Installed %1</translation>
+    </message>
+    <message id="CLIInstallCancelled">
+        <source>the installation of %1 was cancelled</source>
+        <translation>the installation of %1 was cancelled</translation>
+    </message>
+    <message id="CLIInstallFailed">
+        <source>installing %1 failed: %2</source>
+        <translation>installing %1 failed: %2</translation>
+    </message>
+    <message id="CLICancelDescription">
+        <source>Cancels every installation of the installer daemon.</source>
+        <translation>Cancels every installation of the installer daemon.</translation>
+    </message>
+    <message id="CLISayDescription">
+        <source>Speaks TEXT (or standard input when no TEXT is given) with the default voice or the one chosen with --voice, on the audio output or into a WAV file.</source>
+        <translation>Speaks TEXT (or standard input when no TEXT is given) with the default voice or the one chosen with --voice, on the audio output or into a WAV file.</translation>
+    </message>
+    <message id="CLIVoiceOption">
+        <source>Speak with the voice ID (an identifier, or the start of one of 36 characters or more).</source>
+        <translation>Speak with the voice ID (an identifier, or the start of one of 36 characters or more).</translation>
+    </message>
+    <message id="CLIRateOption">
+        <source>Speak at WPM words per minute (80 to 450).</source>
+        <translation>Speak at WPM words per minute (80 to 450).</translation>
+    </message>
+    <message id="CLIOutputOption">
+        <source>Write the speech to FILE.wav (16-bit mono) instead of playing it; a device or FIFO is written in place, a folder is refused.</source>
+        <translation>Write the speech to FILE.wav (16-bit mono) instead of playing it; a device or FIFO is written in place, a folder is refused.</translation>
+    </message>
+    <message id="CLITextOperand">
+        <source>What to say.</source>
+        <translation>What to say.</translation>
+    </message>
+    <message id="CLIRateRange">
+        <source>--rate takes words per minute from 80 to 450, not '%1'</source>
+        <translation>--rate takes words per minute from 80 to 450, not '%1'</translation>
+    </message>
+    <message id="CLICannotReadInput">
+        <source>cannot read standard input</source>
+        <translation>cannot read standard input</translation>
+    </message>
+    <message id="CLINothingToSay">
+        <source>nothing to say</source>
+        <translation>nothing to say</translation>
+    </message>
+    <message id="CLINoSuchVoice">
+        <source>no installed voice '%1' (see 'cadenza voices --all')</source>
+        <translation>no installed voice '%1' (see 'cadenza voices --all')</translation>
+    </message>
+    <message id="CLINoVoices">
+        <source>no voices are installed</source>
+        <translation>no voices are installed</translation>
+    </message>
+    <message id="CLICannotSpeak">
+        <source>could not speak with '%1'</source>
+        <translation>could not speak with '%1'</translation>
+    </message>
+    <message id="CLISpeakingFailed">
+        <source>speaking failed</source>
+        <translation>speaking failed</translation>
+    </message>
+    <message id="CLILanguagesDescription">
+        <source>Lists the recognition (dictation) languages: those installed on this computer and those that can be downloaded, with their names in your language and whether you chose to show them (0 hidden, 1 shown, 2 automatic).</source>
+        <translation>Lists the recognition (dictation) languages: those installed on this computer and those that can be downloaded, with their names in your language and whether you chose to show them (0 hidden, 1 shown, 2 automatic).</translation>
+    </message>
+    <message id="CLINoLanguages">
+        <source>No recognition languages are installed or offered.</source>
+        <translation>No recognition languages are installed or offered.</translation>
+    </message>
+    <message id="CLIKindInstalled">
+        <source>installed</source>
+        <translation>installed</translation>
+    </message>
+    <message id="CLIKindDownloadable">
+        <source>downloadable</source>
+        <translation>downloadable</translation>
+    </message>
+    <message id="CLIVoicesDescription">
+        <source>Lists the installed voices: identifier, name, locale, language, country and gender, with names in your language. The default voice is marked with '*'.</source>
+        <translation>Lists the installed voices: identifier, name, locale, language, country and gender, with names in your language. The default voice is marked with '*'.</translation>
+    </message>
+    <message id="CLIAllOption">
+        <source>List every voice of every quality, not only the best quality of each voice.</source>
+        <translation>List every voice of every quality, not only the best quality of each voice.</translation>
+    </message>
+    <message id="CLINoVoicesInstalled">
+        <source>No voices are installed.</source>
+        <translation>No voices are installed.</translation>
+    </message>
+    <message id="CLIPostDescription">
+        <source>Posts the distributed notification NAME to every process of this session, such as com.vendra.speech.DefaultVoiceChangedNotification, or the dictation engine's DictationIMNotificationRecognizerDidPreHeat and DictationIMNotificationWillStartListening. 'cadenza notify' is the same command.</source>
+        <translation>Posts the distributed notification NAME to every process of this session, such as com.vendra.speech.DefaultVoiceChangedNotification, or the dictation engine's DictationIMNotificationRecognizerDidPreHeat and DictationIMNotificationWillStartListening. 'cadenza notify' is the same command.</translation>
+    </message>
+    <message id="CLIObjectOption">
+        <source>The notification's object.</source>
+        <translation>The notification's object.</translation>
+    </message>
+    <message id="CLIInfoOption">
+        <source>Adds KEY with the string VALUE to the user information; may be repeated.</source>
+        <translation>Adds KEY with the string VALUE to the user information; may be repeated.</translation>
+    </message>
+    <message id="CLINameOperand">
+        <source>The notification's name.</source>
+        <translation>The notification's name.</translation>
+    </message>
+    <message id="CLIGiveOneName">
+        <source>give exactly one notification name</source>
+        <translation>give exactly one notification name</translation>
+    </message>
+    <message id="CLIInfoFormat">
+        <source>--info takes KEY=VALUE, not '%1'</source>
+        <translation>--info takes KEY=VALUE, not '%1'</translation>
+    </message>
+    <message id="CLINoSessionBus">
+        <source>no session bus: nobody else can hear the notification</source>
+        <translation>no session bus: nobody else can hear the notification</translation>
+    </message>
+    <message id="CLIDownloadablesDescription">
+        <source>Lists the voices and recognition languages that can be downloaded or upgraded, with their download status (1 upgrade available, 2 not installed, 3 downloading, 4 waiting) and size.</source>
+        <translation>Lists the voices and recognition languages that can be downloaded or upgraded, with their download status (1 upgrade available, 2 not installed, 3 downloading, 4 waiting) and size.</translation>
+    </message>
+    <message id="CLIRemoveDescription">
+        <source>Removes a downloaded voice (by identifier) or recognition language (by locale, such as de_DE), asking for administrator rights when it is installed for every user, and records the removal.</source>
+        <translation>Removes a downloaded voice (by identifier) or recognition language (by locale, such as de_DE), asking for administrator rights when it is installed for every user, and records the removal.</translation>
+    </message>
+    <message id="CLIRemoveOperand">
+        <source>What to remove.</source>
+        <translation>What to remove.</translation>
+    </message>
+    <message id="CLIGiveOneVoiceOrLocale">
+        <source>give one voice identifier or locale</source>
+        <translation>give one voice identifier or locale</translation>
+    </message>
+    <message id="CLINotRemovable">
+        <source>'%1' is not a downloaded voice or language that can be removed</source>
+        <translation>'%1' is not a downloaded voice or language that can be removed</translation>
+    </message>
+    <message id="CLINotRemoved">
+        <source>%1 was not removed</source>
+        <translation>%1 was not removed</translation>
+    </message>
+    <message id="CLIRemoved">
+        <source>Removed %1</source>
+        <translation>Removed %1</translation>
+    </message>
+    <message id="CLIUpgradeDescription">
+        <source>Starts downloading the best quality of voice ID in the background when the rules allow it: on mains power, not removed or prohibited by the user, within the attempt limits. Prints whether it may go on.</source>
+        <translation>Starts downloading the best quality of voice ID in the background when the rules allow it: on mains power, not removed or prohibited by the user, within the attempt limits. Prints whether it may go on.</translation>
+    </message>
+    <message id="CLIVoiceOperand">
+        <source>A voice identifier.</source>
+        <translation>A voice identifier.</translation>
+    </message>
+    <message id="CLIGiveOneVoice">
+        <source>give one voice identifier</source>
+        <translation>give one voice identifier</translation>
+    </message>
+    <message id="CLIPowerDescription">
+        <source>Says whether this computer runs on mains power ("AC Power").</source>
+        <translation>Says whether this computer runs on mains power ("AC Power").</translation>
+    </message>
+    <message id="InstallerUnreachableAlertTitleText">
+        <source>The download could not be started.</source>
+        <translation>The download could not be started.</translation>
+    </message>
+    <message id="InstallerUnreachableAlertMessageText">
+        <source>The installer daemon quillond is not running, so %1 cannot be downloaded. Start quillond and try again.</source>
+        <translation>The installer daemon quillond is not running, so %1 cannot be downloaded. Start quillond and try again.</translation>
+    </message>
     <message id="Male">
         <source>Male</source>
         <translation>Male</translation>

@@ -58,6 +58,13 @@ bool CZSpeechInstallationManager::_serverIsRunning()
     return valid;
 }
 
+bool CZSpeechInstallationManager::_serverIsReachable()
+{
+    // The request port accepts connections while a daemon or the service manager listens on it; a
+    // socket left by a daemon that died refuses them.
+    return _serverIsRunning() || _createServerPortIfNeeded();
+}
+
 bool CZSpeechInstallationManager::_createServerPortIfNeeded()
 {
     if (_serverPortRef && !_serverPortRef->isValid()) {
@@ -101,12 +108,14 @@ Platform::LocalMessagePort *CZSpeechInstallationManager::_createLocalPort()
 std::optional<QByteArray> CZSpeechInstallationManager::_sendMessage(
     qint32 messageId, const QByteArray &withData, bool withReply)
 {
+    m_lastSendStatus = Platform::MessagePortStatus::IsInvalid;
     if (!_createServerPortIfNeeded()) {
         return std::nullopt;
     }
     const double receiveTimeout = withReply ? ReceiveTimeout : 0.0;
     const QByteArray data = withData.isNull() ? QByteArray("") : withData;
     const auto result = _serverPortRef->sendRequest(messageId, data, SendTimeout, receiveTimeout, withReply);
+    m_lastSendStatus = result.status;
     if (result.status != Platform::MessagePortStatus::Success) {
         qCWarning(lcInstallation, "failed to send request %d: %d\n", int(messageId), result.status);
         return std::nullopt;
@@ -170,6 +179,12 @@ bool CZSpeechInstallationManager::_requestInstallation(const QString &tagName, c
         {ClientProcessIDKey, qint64(QCoreApplication::applicationPid())}, {ObjectIDKey, objectIdentifier},
         {UserInteractionModeKey, userInteractionMode}, {ItemDownloadStatusKey, qint64(WaitingStatus)}};
     (void)_sendMessage(StartInstallingMessage, CZEncodeSecureObject(record), false);
+    if (m_lastSendStatus != Platform::MessagePortStatus::Success) {
+        // Nobody will ever answer this port: close it, and let the user know.
+        releaseLocalPort(port->name());
+        Q_EMIT installationRequestFailed(tagName, itemName, userInteractionMode);
+        return false;
+    }
     return true;
 }
 

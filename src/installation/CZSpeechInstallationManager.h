@@ -131,11 +131,19 @@ public:
     bool startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(const QString &voiceIdentifier);
     [[nodiscard]] bool doesLanguageDataNeedToBeDownloadedForLocaleIdentifier(const QString &localeIdentifier);
 
-    /// Sends one installation request (message 1) with its own local port; false when none was sent.
+    /**
+     * Sends one installation request (message 1) with its own local port; false when none was sent.
+     * A request that cannot reach the daemon emits installationRequestFailed().
+     */
     bool _requestInstallation(const QString &tagName, const QString &itemName, quint64 byteSize,
         const QString &objectIdentifier, qint64 userInteractionMode);
 
     [[nodiscard]] bool _serverIsRunning();
+    /**
+     * Whether a request would reach the daemon: it runs, or its request port is held for it by the
+     * service manager, which starts it on the first request (socket activation).
+     */
+    [[nodiscard]] bool _serverIsReachable();
     [[nodiscard]] bool _createServerPortIfNeeded();
     /// A new local port for one request's completion, owned by the manager until it completes.
     [[nodiscard]] Platform::LocalMessagePort *_createLocalPort();
@@ -149,6 +157,10 @@ Q_SIGNALS:
     /// Emitted with each completion, after the delegate: the whole answer, which may carry
     /// "QLNDFailureReason".
     void installationFinished(const QString &tagName, qint32 message, const QVariantMap &answer);
+    /// Emitted when an installation request could not be delivered to the daemon (it is not running),
+    /// with the request's user-interaction mode (1: an automatic request nobody asked for).
+    void installationRequestFailed(
+        const QString &tagName, const QString &itemName, qint64 userInteractionMode);
 
 private:
     friend std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port, qint32 messageId,
@@ -161,6 +173,7 @@ private:
     std::shared_ptr<CZSpeechInstallationManagerDelegate> _delegate;
     std::unique_ptr<Platform::RemoteMessagePort> _serverPortRef;
     QHash<QString, std::shared_ptr<Platform::LocalMessagePort>> m_localPorts;
+    int m_lastSendStatus = 0; ///< of the last _sendMessage()
 };
 
 /// The exported entry point of the background policy: the shared manager's

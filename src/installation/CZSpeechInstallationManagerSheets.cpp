@@ -1,9 +1,17 @@
 #include "CZSpeechInstallationManagerSheets.h"
 
+#include "CZSpeechInstallationManager.h"
+
 #include "customize-voices/CustomizeVoicesWindowController.h"
+#include "platform/Alert.h"
+#include "platform/LocalizationTable.h"
 #include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 
+#include <QApplication>
 #include <QDialog>
+#include <QLocale>
+#include <QPointer>
+#include <QTimer>
 
 namespace Cadenza {
 
@@ -18,12 +26,60 @@ CZSpeechInstallationManagerSheets::SRLanguageSheetPresenter &languagePresenter()
     static CZSpeechInstallationManagerSheets::SRLanguageSheetPresenter present;
     return present;
 }
+// The mode of the requests the download policy makes on its own.
+constexpr qint64 AutomaticInteractionMode = 1;
+
+// The window an alert about the sheets' requests belongs on: the one the sheet was shown on.
+QPointer<QWidget> &alertWindow()
+{
+    static QPointer<QWidget> window;
+    return window;
+}
+
+// The sheets send their requests when OK closes them; if the daemon cannot be reached, nothing would
+// ever happen, so the user is told, once for all the items of one OK.
+void tellWhenRequestsCannotBeSent()
+{
+    static bool connected = false;
+    if (std::exchange(connected, true)) {
+        return;
+    }
+    auto unsent = std::make_shared<QStringList>();
+    QObject::connect(CZSpeechInstallationManager::sharedManager(),
+        &CZSpeechInstallationManager::installationRequestFailed, qApp,
+        [unsent](const QString &, const QString &itemName, qint64 userInteractionMode) {
+            if (userInteractionMode == AutomaticInteractionMode) {
+                return; // a background fetch the user did not ask for: nothing to tell
+            }
+            unsent->append(itemName);
+            if (unsent->size() > 1) {
+                return; // the alert is on its way
+            }
+            QTimer::singleShot(0, qApp, [unsent] {
+                const auto &table = Platform::LocalizationTable::shared();
+                Platform::AlertRequest alert;
+                alert.title = table.text(QStringLiteral("InstallerUnreachableAlertTitleText"));
+                alert.message = table.format(QStringLiteral("InstallerUnreachableAlertMessageText"),
+                    {QLocale().createSeparatedList(*unsent)});
+                alert.buttons = {table.text(QStringLiteral("OK"))};
+                unsent->clear();
+                QWidget *window = alertWindow() ? alertWindow()->window() : QApplication::activeWindow();
+                if (window) {
+                    Platform::Alert::beginSheet(alert, window, [](int) {});
+                } else {
+                    (void)Platform::Alert::runModal(alert);
+                }
+            });
+        });
+}
+
 } // namespace
 
 CustomizeVoicesWindowController *CZSpeechInstallationManagerSheets::voiceSelectionWindowController()
 {
     // Made once and kept for the life of the process; never deleted after the application object.
     static CustomizeVoicesWindowController *controller = [] {
+        tellWhenRequestsCannotBeSent();
         auto *made = new CustomizeVoicesWindowController;
         made->window()->ensurePolished();
         return made;
@@ -38,6 +94,7 @@ void CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(
         presenter()(window, showIndividualVoiceQualities);
         return;
     }
+    alertWindow() = window;
     voiceSelectionWindowController()->showSheetForWindow(window, showIndividualVoiceQualities);
 }
 
@@ -50,6 +107,7 @@ CZCustomizeSRLanguagesWindowController *
 CZSpeechInstallationManagerSheets::srLanguagesSelectionWindowController()
 {
     static CZCustomizeSRLanguagesWindowController *controller = [] {
+        tellWhenRequestsCannotBeSent();
         auto *made = new CZCustomizeSRLanguagesWindowController;
         made->window()->ensurePolished();
         return made;
@@ -66,6 +124,7 @@ void CZSpeechInstallationManagerSheets::showSRLanguagesSelectionSheetForWindow(Q
             window, networkSupportedLocaleIdentifiers, requiredLocaleIdentifier, supportDownloads);
         return;
     }
+    alertWindow() = window;
     srLanguagesSelectionWindowController()->showSheetForWindow(
         window, networkSupportedLocaleIdentifiers, requiredLocaleIdentifier, supportDownloads);
 }

@@ -66,6 +66,9 @@ inline const QString RecognitionTagPrefix = QStringLiteral("SRCLANGID:");
 /// Seconds between 1970-01-01 and 2001-01-01, the reference date of times in records.
 constexpr double ReferenceDateOffset = 978307200.0;
 
+/// The longest tag, object identifier or item name a request may carry, in characters.
+constexpr qsizetype MaximumFieldLength = 1024;
+
 constexpr double SendTimeout = 10.0;
 constexpr double ReceiveTimeout = 10.0;
 

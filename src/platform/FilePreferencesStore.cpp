@@ -3,13 +3,13 @@
 #include "FileLock.h"
 
 #include "Logging.h"
+#include "OutputFile.h"
 #include "Paths.h"
 #include "PropertyList.h"
 
 #include <QDateTime>
 #include <QDir>
 #include <QFile>
-#include <QSaveFile>
 
 #include <sys/stat.h>
 
@@ -152,12 +152,9 @@ bool FilePreferencesStore::synchronize(const QString &domain)
     // Merge onto the file as it is now, so keys written meanwhile by other processes survive.
     reload(domain, state);
 
-    QSaveFile file(path);
-    file.setDirectWriteFallback(false);
-    if (!file.open(QIODevice::WriteOnly) || file.write(PropertyList::serialize(state.values)) < 0
-        || !file.commit()) {
-        qCWarning(lcPreferences, "Cannot write preferences %s: %s", qPrintable(path),
-            qPrintable(file.errorString()));
+    QString error;
+    if (!OutputFile::write(path, PropertyList::serialize(state.values), &error)) {
+        qCWarning(lcPreferences, "Cannot write preferences %s: %s", qPrintable(path), qPrintable(error));
         return false;
     }
     state.pending.clear();

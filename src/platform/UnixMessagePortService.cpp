@@ -16,6 +16,7 @@
 
 #include <cerrno>
 #include <cstring>
+#include <fcntl.h>
 #include <poll.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
@@ -180,13 +181,37 @@ public:
     }
 
     bool listen(const QString &path) { return m_server.listen(path); }
-    bool adopt(int descriptor) { return m_server.listen(qintptr(descriptor)); }
+
+    // A socket handed over by the service manager belongs to it: it is accepted on here, but never
+    // unlinked, or nobody could reach the next instance it starts. QLocalServer would unlink it on
+    // close, so it is not given to QLocalServer.
+    bool adopt(int descriptor)
+    {
+        int accepting = 0;
+        socklen_t size = sizeof(accepting);
+        if (::getsockopt(descriptor, SOL_SOCKET, SO_ACCEPTCONN, &accepting, &size) != 0 || !accepting) {
+            return false;
+        }
+        const int flags = ::fcntl(descriptor, F_GETFL);
+        if (flags < 0 || ::fcntl(descriptor, F_SETFL, flags | O_NONBLOCK) != 0) {
+            return false;
+        }
+        m_adopted = descriptor;
+        m_adoptedNotifier = std::make_unique<QSocketNotifier>(descriptor, QSocketNotifier::Read);
+        connect(
+            m_adoptedNotifier.get(), &QSocketNotifier::activated, this, &UnixLocalPort::acceptConnections);
+        return true;
+    }
 
     QString name() const override { return m_name; }
-    bool isValid() const override { return m_server.isListening(); }
+    bool isValid() const override { return m_adopted >= 0 || m_server.isListening(); }
 
     void invalidate() override
     {
+        if (m_adopted >= 0) {
+            m_adoptedNotifier.reset();
+            ::close(std::exchange(m_adopted, -1));
+        }
         if (m_server.isListening()) {
             const QString path = m_server.fullServerName();
             m_server.close();
@@ -208,9 +233,28 @@ private:
         MessagePeer peer;
     };
 
+    QLocalSocket *nextPendingConnection()
+    {
+        if (m_adopted < 0) {
+            return m_server.nextPendingConnection();
+        }
+        while (true) {
+            const int fd = ::accept4(m_adopted, nullptr, nullptr, SOCK_NONBLOCK | SOCK_CLOEXEC);
+            if (fd < 0) {
+                return nullptr; // EAGAIN: none left; anything else: the next notification tries again
+            }
+            auto *socket = new QLocalSocket(this);
+            if (socket->setSocketDescriptor(fd, QLocalSocket::ConnectedState, QIODevice::ReadWrite)) {
+                return socket;
+            }
+            ::close(fd);
+            delete socket;
+        }
+    }
+
     void acceptConnections()
     {
-        while (QLocalSocket *socket = m_server.nextPendingConnection()) {
+        while (QLocalSocket *socket = nextPendingConnection()) {
             ucred credentials {};
             socklen_t size = sizeof(credentials);
             const int fd = int(socket->socketDescriptor());
@@ -323,6 +367,8 @@ private:
     LocalMessagePort::Handler m_handler;
     LocalPortLimits m_limits;
     QLocalServer m_server;
+    int m_adopted = -1; ///< the service manager's listening socket, when adopted
+    std::unique_ptr<QSocketNotifier> m_adoptedNotifier;
     QHash<QLocalSocket *, Connection> m_connections;
     std::shared_ptr<bool> m_alive;
 };

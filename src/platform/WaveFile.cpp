@@ -1,10 +1,13 @@
 #include "WaveFile.h"
 
+#include "OutputFile.h"
+
 #include <QFile>
 
 #include <sndfile.h>
 
 #include <cmath>
+#include <cstring>
 
 namespace Cadenza::Platform {
 
@@ -20,39 +23,95 @@ double PcmAudio::rootMeanSquare() const
     return std::sqrt(sum / double(samples.size()));
 }
 
-bool WaveFile::write(const QString &path, const PcmAudio &audio, QString *error)
+namespace {
+
+// libsndfile writing into memory: the header's sizes are patched by seeking, which a device or a
+// FIFO could not do, so the whole file is made first and then handed to OutputFile.
+struct MemoryFile
 {
-    const QString temporary = path + QStringLiteral(".part");
+    QByteArray bytes;
+    sf_count_t position = 0;
+};
+
+sf_count_t memoryLength(void *user)
+{
+    return sf_count_t(static_cast<MemoryFile *>(user)->bytes.size());
+}
+
+sf_count_t memorySeek(sf_count_t offset, int whence, void *user)
+{
+    auto *file = static_cast<MemoryFile *>(user);
+    const sf_count_t base = whence == SEEK_CUR ? file->position
+        : whence == SEEK_END                   ? sf_count_t(file->bytes.size())
+                                               : 0;
+    file->position = qMax<sf_count_t>(0, base + offset);
+    return file->position;
+}
+
+sf_count_t memoryRead(void *to, sf_count_t count, void *user)
+{
+    auto *file = static_cast<MemoryFile *>(user);
+    const sf_count_t available = qMax<sf_count_t>(0, sf_count_t(file->bytes.size()) - file->position);
+    const sf_count_t n = qMin(count, available);
+    std::memcpy(to, file->bytes.constData() + file->position, size_t(n));
+    file->position += n;
+    return n;
+}
+
+sf_count_t memoryWrite(const void *from, sf_count_t count, void *user)
+{
+    auto *file = static_cast<MemoryFile *>(user);
+    const sf_count_t end = file->position + count;
+    if (end > sf_count_t(file->bytes.size())) {
+        file->bytes.resize(qsizetype(end));
+    }
+    std::memcpy(file->bytes.data() + file->position, from, size_t(count));
+    file->position = end;
+    return count;
+}
+
+sf_count_t memoryTell(void *user)
+{
+    return static_cast<MemoryFile *>(user)->position;
+}
+
+} // namespace
+
+std::optional<QByteArray> WaveFile::encode(const PcmAudio &audio, QString *error)
+{
     SF_INFO info {};
     info.samplerate = audio.sampleRate;
     info.channels = 1;
     info.format = SF_FORMAT_WAV | SF_FORMAT_PCM_16;
-    SNDFILE *file = sf_open(QFile::encodeName(temporary).constData(), SFM_WRITE, &info);
+    SF_VIRTUAL_IO io {memoryLength, memorySeek, memoryRead, memoryWrite, memoryTell};
+    MemoryFile memory;
+    SNDFILE *file = sf_open_virtual(&io, SFM_WRITE, &info, &memory);
     if (!file) {
         if (error) {
             *error
-                = QStringLiteral("cannot create %1: %2").arg(path, QString::fromUtf8(sf_strerror(nullptr)));
+                = QStringLiteral("cannot encode the sound: %1").arg(QString::fromUtf8(sf_strerror(nullptr)));
         }
-        return false;
+        return std::nullopt;
     }
     const sf_count_t written = sf_write_short(file, audio.samples.data(), sf_count_t(audio.samples.size()));
     const int closed = sf_close(file);
     if (written != sf_count_t(audio.samples.size()) || closed != 0) {
-        QFile::remove(temporary);
         if (error) {
-            *error = QStringLiteral("cannot write %1").arg(path);
+            *error = QStringLiteral("cannot encode the sound");
         }
+        return std::nullopt;
+    }
+    return memory.bytes;
+}
+
+bool WaveFile::write(const QString &path, const PcmAudio &audio, QString *error)
+{
+    // Refuse a folder or the like before the work of encoding.
+    if (OutputFile::kindOf(path, error) == OutputFile::Kind::Refused) {
         return false;
     }
-    QFile::remove(path);
-    if (!QFile::rename(temporary, path)) {
-        QFile::remove(temporary);
-        if (error) {
-            *error = QStringLiteral("cannot move the sound into %1").arg(path);
-        }
-        return false;
-    }
-    return true;
+    const auto bytes = encode(audio, error);
+    return bytes && OutputFile::write(path, *bytes, error);
 }
 
 std::optional<PcmAudio> WaveFile::read(const QString &path, QString *error)

@@ -3,6 +3,7 @@
 
 #include "cadenzacore_export.h"
 
+#include <QByteArray>
 #include <QString>
 
 #include <optional>
@@ -28,7 +29,10 @@ struct CADENZACORE_EXPORT PcmAudio
 class CADENZACORE_EXPORT WaveFile
 {
 public:
-    /// Writes @p audio as a 16-bit PCM WAV file, replacing @p path only when the whole file was written.
+    /// @p audio as the bytes of a 16-bit PCM WAV file.
+    [[nodiscard]] static std::optional<QByteArray> encode(const PcmAudio &audio, QString *error);
+    /// Writes @p audio as a 16-bit PCM WAV file through OutputFile: a regular file is replaced only when
+    /// the whole file was written, a device or FIFO is written in place, a folder is refused.
     [[nodiscard]] static bool write(const QString &path, const PcmAudio &audio, QString *error);
     /// Reads a WAV file, mixing channels down to mono.
     [[nodiscard]] static std::optional<PcmAudio> read(const QString &path, QString *error);

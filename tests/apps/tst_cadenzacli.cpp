@@ -2,6 +2,7 @@
 
 #include "platform/FilePreferencesStore.h"
 #include "platform/Paths.h"
+#include "platform/PropertyList.h"
 #include "platform/WaveFile.h"
 
 #include <QDir>
@@ -11,8 +12,12 @@
 #include <QJsonArray>
 #include <QJsonDocument>
 #include <QJsonObject>
+#include <QLocalServer>
 #include <QProcess>
 #include <QTest>
+#include <qplatformdefs.h>
+
+#include <sys/stat.h>
 
 using Cadenza::Testing::TestEnvironment;
 
@@ -238,6 +243,178 @@ private Q_SLOTS:
         QVERIFY(r.out.isEmpty());
         QVERIFY(r.err.contains(QStringLiteral("No voices")));
         QCOMPARE(cadenza({QStringLiteral("say"), QStringLiteral("Hi")}).exitCode, 1);
+    }
+
+    void badCommandLinesAreRefusedByName_data()
+    {
+        QTest::addColumn<QStringList>("arguments");
+        QTest::addColumn<int>("exitCode");
+        QTest::addColumn<QString>("message");
+        const QString longTag = QStringLiteral("VOICEID:") + QString(1100, QLatin1Char('x'));
+        QTest::newRow("languages operand") << QStringList {QStringLiteral("languages"),
+            QStringLiteral("extra")} << 2 << QStringLiteral("unexpected argument 'extra'");
+        QTest::newRow("status operand") << QStringList {QStringLiteral("status"), QStringLiteral("now")} << 2
+                                        << QStringLiteral("unexpected argument 'now'");
+        QTest::newRow("downloadables operand") << QStringList {QStringLiteral("downloadables"),
+            QStringLiteral("all")} << 2 << QStringLiteral("unexpected argument 'all'");
+        QTest::newRow("power operand") << QStringList {QStringLiteral("power"), QStringLiteral("on")} << 2
+                                       << QStringLiteral("unexpected argument 'on'");
+        QTest::newRow("voices operand") << QStringList {QStringLiteral("voices"), QStringLiteral("x")} << 2
+                                        << QStringLiteral("unexpected argument 'x'");
+        QTest::newRow("cancel operand") << QStringList {QStringLiteral("cancel"), QStringLiteral("SOMETHING")}
+                                        << 2 << QStringLiteral("unexpected argument 'SOMETHING'");
+        QTest::newRow("install two tags") << QStringList {QStringLiteral("install"), QStringLiteral("a"),
+            QStringLiteral("b")} << 2 << QStringLiteral("unexpected argument 'b'");
+        QTest::newRow("empty tag") << QStringList {QStringLiteral("install"), QString()} << 2
+                                   << QStringLiteral("the tag is empty");
+        QTest::newRow("long tag") << QStringList {QStringLiteral("install"), longTag} << 2
+                                  << QStringLiteral("the tag is longer than 1024 characters");
+        QTest::newRow("unknown option") << QStringList {QStringLiteral("voices"), QStringLiteral("--bogus")}
+                                        << 2 << QStringLiteral("unknown option '--bogus'");
+        QTest::newRow("missing value")
+            << QStringList {QStringLiteral("say"), QStringLiteral("--rate")} << 2 << QStringLiteral("rate");
+        for (const QString &rate : {QStringLiteral("nan"), QStringLiteral("inf"), QStringLiteral("-inf"),
+                 QStringLiteral("-100"), QStringLiteral("0"), QStringLiteral("1e9")}) {
+            QTest::addRow("rate %s", qPrintable(rate))
+                << QStringList {QStringLiteral("say"), QStringLiteral("--rate"), rate, QStringLiteral("Hi")}
+                << 2 << QStringLiteral("not '%1'").arg(rate);
+        }
+    }
+    void badCommandLinesAreRefusedByName()
+    {
+        QFETCH(QStringList, arguments);
+        QFETCH(int, exitCode);
+        QFETCH(QString, message);
+        const Result r = cadenza(arguments);
+        QCOMPARE(r.exitCode, exitCode);
+        QVERIFY2(r.err.contains(message), qPrintable(r.err));
+        QVERIFY(r.out.isEmpty());
+    }
+
+    void withoutADaemonTheExitStatusIsThree()
+    {
+        for (const QStringList &arguments :
+            {QStringList {QStringLiteral("status")}, QStringList {QStringLiteral("cancel")},
+                QStringList {QStringLiteral("install"), QStringLiteral("SRCLANGID:de_DE")}}) {
+            const Result r = cadenza(arguments);
+            QCOMPARE(r.exitCode, 3);
+            QVERIFY2(r.err.contains(QStringLiteral("installer daemon")), qPrintable(r.err));
+        }
+        // A socket left by a daemon that died is no daemon.
+        QDir().mkpath(Cadenza::Platform::Paths::runtimeFolder());
+        QLocalServer dead;
+        QVERIFY(dead.listen(
+            Cadenza::Platform::Paths::runtimeFolder() + QStringLiteral("/com.vendra.speech.quillond")));
+        const QString path = dead.fullServerName();
+        dead.close();
+        QFile stale(path);
+        QVERIFY(stale.open(QIODevice::WriteOnly)); // a file where the socket was
+        stale.close();
+        QCOMPARE(cadenza({QStringLiteral("status")}).exitCode, 3);
+        QVERIFY(cadenza({QStringLiteral("--help")}).out.contains(QStringLiteral("3 the installer daemon")));
+    }
+
+    void outputGoesIntoDevicesAndFifosAndRefusesFolders()
+    {
+        // A character device is written, never replaced.
+        Result r = cadenza({QStringLiteral("say"), QStringLiteral("--output"), QStringLiteral("/dev/null"),
+            QStringLiteral("Hello")});
+        QVERIFY2(r.exitCode == 0, qPrintable(r.err));
+        QT_STATBUF st;
+        QCOMPARE(QT_STAT("/dev/null", &st), 0);
+        QVERIFY(S_ISCHR(st.st_mode));
+
+        // A FIFO is written in place: its reader gets a whole WAV file, and it stays a FIFO.
+        const QString fifo = m_environment->path(QStringLiteral("speech.fifo"));
+        QCOMPARE(::mkfifo(QFile::encodeName(fifo).constData(), 0600), 0);
+        QProcess reader;
+        reader.start(QStringLiteral("cat"), {fifo});
+        QVERIFY(reader.waitForStarted());
+        // Until the reader is there, a FIFO nobody reads is refused rather than waited on.
+        for (int attempt = 0; attempt < 50; ++attempt) {
+            r = cadenza({QStringLiteral("say"), QStringLiteral("--output"), fifo, QStringLiteral("Hello")});
+            if (r.exitCode == 0 || !r.err.contains(QStringLiteral("nobody reads"))) {
+                break;
+            }
+            QTest::qWait(100);
+        }
+        QVERIFY2(r.exitCode == 0, qPrintable(r.err));
+        QVERIFY(reader.waitForFinished(10000));
+        const QByteArray wav = reader.readAllStandardOutput();
+        QVERIFY(wav.startsWith("RIFF"));
+        QVERIFY(wav.size() > 10000);
+        QVERIFY(QFileInfo(fifo).exists() && !QFileInfo(fifo).isFile());
+        QCOMPARE(QT_STAT(QFile::encodeName(fifo).constData(), &st), 0);
+        QVERIFY(S_ISFIFO(st.st_mode));
+
+        // A folder is refused by name, and left as it was.
+        const QString folder = m_environment->path(QStringLiteral("folder"));
+        QVERIFY(QDir().mkpath(folder + QStringLiteral("/inside")));
+        r = cadenza({QStringLiteral("say"), QStringLiteral("--output"), folder, QStringLiteral("Hello")});
+        QCOMPARE(r.exitCode, 2);
+        QVERIFY2(r.err.contains(folder + QStringLiteral(" is a folder")), qPrintable(r.err));
+        QVERIFY(QFileInfo(folder + QStringLiteral("/inside")).isDir());
+
+        // A regular file is replaced whole; a symbolic link to one stays a link to the new file.
+        const QString file = m_environment->path(QStringLiteral("old.wav"));
+        QFile old(file);
+        QVERIFY(old.open(QIODevice::WriteOnly));
+        old.write("old");
+        old.close();
+        const QString link = m_environment->path(QStringLiteral("link.wav"));
+        QVERIFY(QFile::link(file, link));
+        r = cadenza({QStringLiteral("say"), QStringLiteral("--output"), link, QStringLiteral("Hello")});
+        QVERIFY2(r.exitCode == 0, qPrintable(r.err));
+        QVERIFY(QFileInfo(link).isSymLink());
+        QVERIFY(QFileInfo(file).size() > 10000);
+        QVERIFY(QDir(m_environment->root())
+                    .entryList({QStringLiteral("*.wav*")}, QDir::Files | QDir::Hidden | QDir::System)
+                    .size()
+            == 2); // no temporary file left beside them
+    }
+
+    void languagesListsAnInstalledLanguageOnce()
+    {
+        const QString bundle
+            = Cadenza::Platform::Paths::userRecognizersFolder() + QStringLiteral("/de_DE.SpeechRecognition");
+        QVERIFY(QDir().mkpath(bundle));
+        QFile info(bundle + QStringLiteral("/Info.plist"));
+        QVERIFY(info.open(QIODevice::WriteOnly));
+        info.write(Cadenza::Platform::PropertyList::serialize(
+            QVariantMap {{QStringLiteral("LocaleIdentifier"), QStringLiteral("de_DE")}}));
+        info.close();
+        const Result r = cadenza({QStringLiteral("languages"), QStringLiteral("--json")});
+        QCOMPARE(r.exitCode, 0);
+        int germanLines = 0;
+        QString kind;
+        for (const auto &value : QJsonDocument::fromJson(r.out.toUtf8()).array()) {
+            if (value.toObject().value(QStringLiteral("locale")).toString() == u"de_DE") {
+                ++germanLines;
+                kind = value.toObject().value(QStringLiteral("kind")).toString();
+            }
+        }
+        QCOMPARE(germanLines, 1);
+        QCOMPARE(kind, QStringLiteral("installed"));
+    }
+
+    void messagesFollowTheUsersLanguage()
+    {
+        const QHash<QString, QString> german {{QStringLiteral("LANGUAGE"), QStringLiteral("de_DE")}};
+        Result r = cadenza({QStringLiteral("frobnicate")}, german);
+        QCOMPARE(r.exitCode, 2);
+        QVERIFY2(r.err.contains(QStringLiteral("unbekannter Befehl „frobnicate“")), qPrintable(r.err));
+        QVERIFY(r.err.contains(QStringLiteral("Befehle:")));
+        r = cadenza({QStringLiteral("status")}, german);
+        QCOMPARE(r.exitCode, 3);
+        QVERIFY2(r.err.contains(QStringLiteral("Der Installationsdienst läuft nicht.")), qPrintable(r.err));
+        r = cadenza({QStringLiteral("cancel"), QStringLiteral("alles")}, german);
+        QVERIFY2(r.err.contains(QStringLiteral("unerwartetes Argument „alles“")), qPrintable(r.err));
+        r = cadenza({QStringLiteral("voices"), QStringLiteral("--help")}, german);
+        QVERIFY2(r.out.contains(QStringLiteral("Listet die installierten Stimmen auf")), qPrintable(r.out));
+        QVERIFY2(
+            r.out.startsWith(QStringLiteral("Aufruf: cadenza voices")), qPrintable(r.out)); // Qt's words too
+        r = cadenza({QStringLiteral("languages")}, german);
+        QVERIFY2(r.out.contains(QStringLiteral("ladbar")), qPrintable(r.out));
     }
 
 private:

@@ -23,14 +23,26 @@ TestHttpServer::TestHttpServer(QString root, QObject *parent)
     });
 }
 
-bool TestHttpServer::listen()
+bool TestHttpServer::listen(quint16 port)
 {
-    return m_server.listen(QHostAddress::LocalHost, 0);
+    if (!m_server.listen(QHostAddress::LocalHost, port ? port : m_port)) {
+        return false;
+    }
+    m_port = m_server.serverPort();
+    return true;
+}
+
+void TestHttpServer::close()
+{
+    m_server.close();
+    for (QTcpSocket *socket : m_server.findChildren<QTcpSocket *>()) {
+        socket->abort();
+    }
 }
 
 QUrl TestHttpServer::baseUrl() const
 {
-    return QUrl(QStringLiteral("http://127.0.0.1:%1/").arg(m_server.serverPort()));
+    return QUrl(QStringLiteral("http://127.0.0.1:%1/").arg(m_port));
 }
 
 void TestHttpServer::serve(QTcpSocket *socket)

@@ -18,7 +18,10 @@ class TestHttpServer : public QObject
 public:
     explicit TestHttpServer(QString root, QObject *parent = nullptr);
 
-    [[nodiscard]] bool listen();
+    /// Listens on 127.0.0.1, on @p port or, for 0, on the port it had before (a new one the first time).
+    [[nodiscard]] bool listen(quint16 port = 0);
+    /// Stops listening and cuts every connection, as a server that goes down does.
+    void close();
     [[nodiscard]] QUrl baseUrl() const;
 
     /// Sends at most @p bytes per second (0: as fast as possible).
@@ -34,6 +37,7 @@ private:
 
     QString m_root;
     QTcpServer m_server;
+    quint16 m_port = 0;
     qint64 m_bytesPerSecond = 0;
     qint64 m_dropAfter = -1;
     int m_requests = 0;

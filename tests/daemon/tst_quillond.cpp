@@ -4,6 +4,7 @@
 
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/InstallerProtocol.h"
+#include "installation/SecureArchiving.h"
 #include "platform/DistributedNotificationCenter.h"
 #include "platform/Paths.h"
 #include "platform/PropertyList.h"
@@ -19,6 +20,7 @@
 #include <QProcess>
 #include <QRandomGenerator>
 #include <QSignalSpy>
+#include <QStandardPaths>
 #include <QTest>
 
 #include <csignal>
@@ -291,6 +293,136 @@ private Q_SLOTS:
         QVERIFY(waitForCompletion(InstalledCompletion));
     }
 
+    void anOutageIsWaitedOut()
+    {
+        // The server goes down at 40 % and is back a second later: the download waits, resumes from
+        // the bytes it has, and the voice is installed.
+        m_http->setBytesPerSecond(2 * 1024 * 1024);
+        startDaemon({QStringLiteral("--catalogue"), m_catalogue, QStringLiteral("--repository"),
+            m_http->baseUrl().toString(), QStringLiteral("--retry-window"), QStringLiteral("20")});
+        QVERIFY(request(BigTag));
+        QVERIFY(QTest::qWaitFor([&] { return downloadedBytes(BigTag) >= m_bigSize * 4 / 10; }, 20000));
+        const int rangesBefore = m_http->rangeRequestCount();
+        m_http->close();
+        QTest::qWait(1000);
+        QVERIFY(m_http->listen());
+        QVERIFY(waitForCompletion(InstalledCompletion, 40000));
+        QVERIFY(m_http->rangeRequestCount() > rangesBefore); // resumed, not fetched again from the start
+        QCOMPARE(QFileInfo(voicesFolder() + QStringLiteral("/Big.SpeechVoice/Resources/data.bin")).size(),
+            m_payloadSize);
+        QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
+    }
+
+    void anotherRepositoryServesWhenOneIsDown()
+    {
+        TestHttpServer second(m_environment->path(QStringLiteral("repository")));
+        QVERIFY(second.listen());
+        const QUrl down = m_http->baseUrl();
+        m_http->close();
+        startDaemon({QStringLiteral("--catalogue"), m_catalogue, QStringLiteral("--repository"),
+            down.toString(), QStringLiteral("--repository"), second.baseUrl().toString()});
+        QVERIFY(request(SmallTag));
+        QVERIFY(waitForCompletion(InstalledCompletion, 20000));
+        QVERIFY(second.requestCount() >= 1);
+    }
+
+    void aLongOutageFailsWithAReadableReason()
+    {
+        m_http->close();
+        startDaemon({QStringLiteral("--catalogue"), m_catalogue, QStringLiteral("--repository"),
+            m_http->baseUrl().toString(), QStringLiteral("--retry-window"), QStringLiteral("3")});
+        QElapsedTimer clock;
+        clock.start();
+        QVERIFY(request(SmallTag));
+        QVERIFY(waitForCompletion(FailedCompletion, 20000));
+        QVERIFY2(clock.elapsed() >= 2500, "the window was not waited out");
+        const QString reason = m_finished->last().at(2).toMap().value(FailureReasonKey).toString();
+        QVERIFY2(reason.startsWith(QStringLiteral("network: no source answered for")), qPrintable(reason));
+        QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
+    }
+
+    void everyMalformedRequestIsAnswered_data()
+    {
+        QTest::addColumn<QVariantMap>("changes");
+        QTest::addColumn<QString>("named");
+        QTest::newRow("tag too long") << QVariantMap {{TagNameKey, QString(1025, QLatin1Char('x'))}}
+                                      << QStringLiteral("QLNDTagName is longer than 1024");
+        QTest::newRow("empty tag") << QVariantMap {{TagNameKey, QString()}}
+                                   << QStringLiteral("QLNDTagName is empty");
+        QTest::newRow("tag not a string")
+            << QVariantMap {{TagNameKey, qint64(7)}} << QStringLiteral("QLNDTagName is not a string");
+        QTest::newRow("nested mode") << QVariantMap {{UserInteractionModeKey, nested(30)}}
+                                     << QStringLiteral("QLNDUserInteractionMode is not an integer");
+        QTest::newRow("size a string") << QVariantMap {{ItemByteSizeKey, QStringLiteral("big")}}
+                                       << QStringLiteral("QLNDItemByteSize is not an integer");
+        QTest::newRow("object a list") << QVariantMap {{ObjectIDKey, QVariantList {1, 2}}}
+                                       << QStringLiteral("QLNDObjectID is not a string");
+    }
+    void everyMalformedRequestIsAnswered()
+    {
+        QFETCH(QVariantMap, changes);
+        QFETCH(QString, named);
+        startTestDaemon();
+        // A job that runs meanwhile stays visible to every client.
+        m_http->setBytesPerSecond(256 * 1024);
+        QVERIFY(request(BigTag));
+        QVERIFY(QTest::qWaitFor([&] { return downloadedBytes(BigTag) > 0; }, 10000));
+
+        Platform::LocalMessagePort *port = m_manager->_createLocalPort();
+        QVERIFY(port);
+        QVariantMap record {{TagNameKey, SmallTag}, {ItemNameKey, QStringLiteral("Small")},
+            {ItemByteSizeKey, qint64(1)}, {ClientPortNameKey, port->name()},
+            {ClientProcessIDKey, qint64(QCoreApplication::applicationPid())},
+            {ObjectIDKey, QStringLiteral("com.vendra.test.small.premium")},
+            {UserInteractionModeKey, qint64(0)}, {ItemDownloadStatusKey, qint64(WaitingStatus)}};
+        for (auto it = changes.cbegin(); it != changes.cend(); ++it) {
+            record.insert(it.key(), it.value());
+        }
+        const QByteArray archived = CZEncodeSecureObject(record);
+        QVERIFY(!archived.isEmpty());
+        (void)m_manager->_sendMessage(StartInstallingMessage, archived, false);
+        QVERIFY2(waitForCompletion(FailedCompletion), "the malformed request got no answer");
+        const QString reason = m_finished->last().at(2).toMap().value(FailureReasonKey).toString();
+        QVERIFY2(reason.contains(named), qPrintable(reason));
+        QVERIFY(isDownloading(BigTag));
+        QCOMPARE(m_manager->activeInstallations().size(), 1);
+    }
+
+    void aSocketActivatedDaemonIsReachedAndItsSocketKept()
+    {
+        const QString activator = QStandardPaths::findExecutable(QStringLiteral("systemd-socket-activate"));
+        if (activator.isEmpty()) {
+            QFAIL("systemd-socket-activate is missing (Debian package systemd)");
+        }
+        QVERIFY(Platform::UnixMessagePortService::ensureRuntimeFolder());
+        const QString socket = Platform::UnixMessagePortService::socketPath(ServicePortName);
+        QProcess manager;
+        manager.setProcessChannelMode(QProcess::ForwardedChannels);
+        // The activator passes on only the variables it is told to.
+        QStringList arguments {QStringLiteral("-l"), socket};
+        for (const char *name : {"HOME", "XDG_RUNTIME_DIR", "XDG_DATA_HOME", "XDG_CACHE_HOME",
+                 "XDG_CONFIG_HOME", "CADENZA_ROOT", "DBUS_SESSION_BUS_ADDRESS"}) {
+            arguments << QStringLiteral("-E") << QString::fromLatin1(name);
+        }
+        manager.start(activator,
+            arguments
+                + QStringList {QStringLiteral(QUILLOND_PATH), QStringLiteral("--idle-exit"),
+                    QStringLiteral("2"), QStringLiteral("--catalogue"), m_catalogue,
+                    QStringLiteral("--repository"), m_http->baseUrl().toString()});
+        QVERIFY(manager.waitForStarted(5000));
+        QVERIFY(QTest::qWaitFor([&] { return QFileInfo::exists(socket); }, 5000));
+        // The service manager holds the request port; the daemon itself is not there yet.
+        QVERIFY(!m_manager->_serverIsRunning());
+        QVERIFY(m_manager->_serverIsReachable());
+        QVERIFY(request(SmallTag));
+        QVERIFY(waitForCompletion(InstalledCompletion, 20000));
+        // After its idle time it exits, and leaves the socket it was given where it was.
+        QVERIFY(manager.waitForFinished(15000));
+        QCOMPARE(manager.exitCode(), 0);
+        QVERIFY(QFileInfo::exists(socket));
+        QVERIFY(!m_manager->_serverIsRunning());
+    }
+
 private:
     void makeRepository()
     {
@@ -364,6 +496,23 @@ private:
     bool request(const QString &tag)
     {
         return m_manager->_requestInstallation(tag, tag.section(QLatin1Char('.'), -2, -2), 1, tag.mid(8), 0);
+    }
+    static QVariant nested(int depth)
+    {
+        QVariant value = qint64(1);
+        for (int i = 0; i < depth; ++i) {
+            value = QVariantMap {{QStringLiteral("k"), value}};
+        }
+        return value;
+    }
+    quint64 downloadedBytes(const QString &tag)
+    {
+        for (const QVariant &r : m_manager->activeInstallations()) {
+            if (r.toMap().value(TagNameKey) == tag) {
+                return r.toMap().value(ItemDownloadByteCountKey).toULongLong();
+            }
+        }
+        return 0;
     }
     bool isDownloading(const QString &tag)
     {

@@ -5,9 +5,11 @@
 #include "installation/InstallerProtocol.h"
 #include "installation/SecureArchiving.h"
 #include "platform/FakeMessagePortService.h"
+#include "platform/KeyedArchive.h"
 #include "platform/Services.h"
 
 #include <QRegularExpression>
+#include <QSignalSpy>
 #include <QTest>
 
 using namespace Cadenza;
@@ -152,6 +154,48 @@ private Q_SLOTS:
         daemon.setAnswer(std::nullopt);
         QTest::ignoreMessage(QtWarningMsg, "client got NULL return data\n");
         QVERIFY(m_manager->activeInstallations().isEmpty());
+    }
+
+    void oneBadRecordDoesNotHideTheOthers()
+    {
+        Testing::FakeInstallerDaemon daemon(*m_ports);
+        const QVariantMap good {{TagNameKey, QStringLiteral("VOICEID:good")}, {ItemPercentCompleteKey, 40.0}};
+        QVariant deep = qint64(1);
+        for (int i = 0; i < 40; ++i) {
+            deep = QVariantMap {{QStringLiteral("k"), deep}};
+        }
+        const QVariantMap bad {{TagNameKey, QStringLiteral("VOICEID:bad")}, {UserInteractionModeKey, deep}};
+        daemon.setAnswer(Platform::KeyedArchive::encodeArray({*Platform::KeyedArchive::encodeItem(bad),
+            *Platform::KeyedArchive::encodeItem(good), *Platform::KeyedArchive::encodeItem(good)}));
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("nested deeper")));
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral("Left out 1 records")));
+        const QVariantList records = m_manager->activeInstallations();
+        QCOMPARE(records.size(), 2);
+        QCOMPARE(records.first().toMap(), good);
+        // A damaged archive still gives nothing rather than a guess.
+        QByteArray cut = Platform::KeyedArchive::encodeArray(
+            {*Platform::KeyedArchive::encodeItem(good), *Platform::KeyedArchive::encodeItem(good)});
+        cut.chop(5);
+        daemon.setAnswer(cut);
+        QTest::ignoreMessage(QtWarningMsg, QRegularExpression(QStringLiteral(".")));
+        QVERIFY(m_manager->activeInstallations().isEmpty());
+    }
+
+    void aRequestNobodyReceivesIsReported()
+    {
+        QSignalSpy failed(m_manager.get(), &CZSpeechInstallationManager::installationRequestFailed);
+        QVERIFY(!m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1, QStringLiteral("v.premium"), 0));
+        QCOMPARE(failed.size(), 1);
+        QCOMPARE(failed.first().at(0).toString(), QStringLiteral("VOICEID:v.premium"));
+        QCOMPARE(failed.first().at(1).toString(), QStringLiteral("V"));
+        QCOMPARE(failed.first().at(2).toLongLong(), 0);
+        QVERIFY(m_manager->pendingLocalPortNames().isEmpty()); // nobody would ever answer it
+
+        Testing::FakeInstallerDaemon daemon(*m_ports);
+        QVERIFY(m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1, QStringLiteral("v.premium"), 0));
+        QCOMPARE(failed.size(), 1);
     }
 
     void failedSendsAreLogged()
