@@ -1,5 +1,6 @@
 #include "VoiceDescription.h"
 
+#include "Locale.h"
 #include "SpeechSynthesisService.h"
 
 #include <algorithm>
@@ -75,6 +76,18 @@ std::optional<VoiceDescription> VoiceDescription::fromInfo(const QVariantMap &in
     }
     if (stringValue(voice.attributes, VoiceAttribute::Name).isEmpty()) {
         *error = QStringLiteral("no voice name");
+        return std::nullopt;
+    }
+    // Every voice list is grouped and titled by the voice's language; a bundle whose locale names
+    // none is left out here rather than stopping a list later.
+    const QVariant locale = voice.attributes.value(VoiceAttribute::LocaleIdentifier);
+    if (locale.typeId() != QMetaType::QString) {
+        *error = QStringLiteral("no VoiceLocaleIdentifier string");
+        return std::nullopt;
+    }
+    if (!Locale::namesALanguage(locale.toString())) {
+        *error
+            = QStringLiteral("VoiceLocaleIdentifier '%1' names no language").arg(locale.toString().left(40));
         return std::nullopt;
     }
     voice.attributes.insert(VoiceAttribute::Identifier, voice.identifier);
