@@ -1,5 +1,6 @@
 // Info.plist of an installed voice bundle, as the voice list reads it: any bytes may sit in a bundle
 // somebody copied into a voice folder.
+#include "platform/Locale.h"
 #include "platform/PropertyList.h"
 #include "platform/VoiceDescription.h"
 
@@ -25,6 +26,14 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
         || voice->enginePitch < 0 || voice->enginePitch > 100 || voice->engineRate < 80
         || voice->engineRate > 450
         || voice->attributes.value(VoiceAttribute::Identifier).toString() != voice->identifier) {
+        __builtin_trap();
+    }
+    // Every voice list is titled by the voice's language: it must have one, with a name.
+    const QString language = Locale::componentsFromLocaleIdentifier(
+        voice->attributes.value(VoiceAttribute::LocaleIdentifier).toString())
+                                 .languageCode;
+    if (language.isEmpty()
+        || Locale(QStringLiteral("en")).displayNameForKey(Locale::LanguageCodeKey, language).isEmpty()) {
         __builtin_trap();
     }
     (void)VoiceDescription::qualityOf(voice->identifier);
