@@ -28,10 +28,19 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
         || voice->attributes.value(VoiceAttribute::Identifier).toString() != voice->identifier) {
         __builtin_trap();
     }
-    // Every voice list is titled by the voice's language: it must have one, with a name.
-    const QString language = Locale::componentsFromLocaleIdentifier(
-        voice->attributes.value(VoiceAttribute::LocaleIdentifier).toString())
-                                 .languageCode;
+    // Every voice list is titled by the voice's language (its locale, else its language, else
+    // en_US): it must have one, with a name.
+    QString locale = voice->attributes.value(VoiceAttribute::LocaleIdentifier).toString();
+    if (voice->attributes.value(VoiceAttribute::LocaleIdentifier).typeId() != QMetaType::QString
+        || locale.isEmpty()) {
+        locale = voice->attributes.value(VoiceAttribute::Language).typeId() == QMetaType::QString
+            ? voice->attributes.value(VoiceAttribute::Language).toString()
+            : QString();
+    }
+    if (locale.isEmpty()) {
+        locale = QStringLiteral("en_US");
+    }
+    const QString language = Locale::componentsFromLocaleIdentifier(locale).languageCode;
     if (language.isEmpty()
         || Locale(QStringLiteral("en")).displayNameForKey(Locale::LanguageCodeKey, language).isEmpty()) {
         __builtin_trap();
