@@ -1,5 +1,6 @@
 // Info.plist of an installed voice bundle, as the voice list reads it: any bytes may sit in a bundle
 // somebody copied into a voice folder.
+#include "platform/Locale.h"
 #include "platform/PropertyList.h"
 #include "platform/VoiceDescription.h"
 
@@ -25,6 +26,23 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
         || voice->enginePitch < 0 || voice->enginePitch > 100 || voice->engineRate < 80
         || voice->engineRate > 450
         || voice->attributes.value(VoiceAttribute::Identifier).toString() != voice->identifier) {
+        __builtin_trap();
+    }
+    // Every voice list is titled by the voice's language (its locale, else its language, else
+    // en_US): it must have one, with a name.
+    QString locale = voice->attributes.value(VoiceAttribute::LocaleIdentifier).toString();
+    if (voice->attributes.value(VoiceAttribute::LocaleIdentifier).typeId() != QMetaType::QString
+        || locale.isEmpty()) {
+        locale = voice->attributes.value(VoiceAttribute::Language).typeId() == QMetaType::QString
+            ? voice->attributes.value(VoiceAttribute::Language).toString()
+            : QString();
+    }
+    if (locale.isEmpty()) {
+        locale = QStringLiteral("en_US");
+    }
+    const QString language = Locale::componentsFromLocaleIdentifier(locale).languageCode;
+    if (language.isEmpty()
+        || Locale(QStringLiteral("en")).displayNameForKey(Locale::LanguageCodeKey, language).isEmpty()) {
         __builtin_trap();
     }
     (void)VoiceDescription::qualityOf(voice->identifier);

@@ -5,9 +5,11 @@
 
 #include "cadenza-config.h"
 
+#include <QDir>
 #include <QFileInfo>
 #include <QProcess>
 
+#include <dlfcn.h>
 #include <unistd.h>
 
 namespace Cadenza::Platform {
@@ -17,8 +19,24 @@ AdministratorService::~AdministratorService() = default;
 QString PolkitAdministratorService::helperPath()
 {
     const QString fromEnvironment = qEnvironmentVariable("CADENZA_REMOVE_HELPER");
-    return fromEnvironment.isEmpty() ? QStringLiteral(CADENZA_LIBEXECDIR "/cadenza-remove-bundle")
-                                     : fromEnvironment;
+    if (!fromEnvironment.isEmpty()) {
+        return fromEnvironment;
+    }
+    const QString configured = QStringLiteral(CADENZA_LIBEXECDIR "/cadenza-remove-bundle");
+    if (QFileInfo::exists(configured)) {
+        return configured;
+    }
+    // Installed with another prefix than the configured one: the helper sits beside this library.
+    Dl_info library {};
+    if (dladdr(reinterpret_cast<const void *>(&PolkitAdministratorService::helperPath), &library) != 0
+        && library.dli_fname) {
+        const QString moved = QFileInfo(QString::fromLocal8Bit(library.dli_fname)).absolutePath()
+            + QStringLiteral("/" CADENZA_LIBEXECDIR_FROM_LIBDIR "/cadenza-remove-bundle");
+        if (QFileInfo::exists(moved)) {
+            return QDir::cleanPath(moved);
+        }
+    }
+    return configured;
 }
 
 bool PolkitAdministratorService::obtainRight(const QString &, int)

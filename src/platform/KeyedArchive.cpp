@@ -8,6 +8,7 @@
 #include <QTimeZone>
 #include <QVarLengthArray>
 #include <algorithm>
+#include <cmath>
 #include <cstring>
 
 namespace Cadenza::Platform {
@@ -17,6 +18,24 @@ const QString KeyedArchive::RootKey = QStringLiteral("root");
 namespace {
 
 constexpr quint64 EpochDateTag = 1;
+
+// Dates travel as seconds since the epoch in a double, and are kept as whole milliseconds. The
+// nearest millisecond, not the truncated one: seconds * 1000 of a date that was archived once lies
+// a hair below or above its millisecond, and truncating moved it by one on every relay. Rounding
+// is exact for every millisecond of the range below, so a date survives any number of trips.
+// The range is the years 1 to 9999, which every property list can write down as well.
+constexpr qint64 EarliestDate = -62135596800000; // 0001-01-01T00:00:00.000Z
+constexpr qint64 LatestDate = 253402300799999; // 9999-12-31T23:59:59.999Z
+
+std::optional<qint64> dateMilliseconds(double seconds)
+{
+    const double milliseconds = std::round(seconds * 1000.0);
+    // Also false for NaN.
+    if (!(milliseconds >= double(EarliestDate) && milliseconds <= double(LatestDate))) {
+        return std::nullopt;
+    }
+    return qint64(milliseconds);
+}
 
 class Writer
 {
@@ -57,10 +76,17 @@ public:
         case QMetaType::QByteArray:
             m_cbor.append(value.toByteArray());
             return true;
-        case QMetaType::QDateTime:
+        case QMetaType::QDateTime: {
+            const QDateTime date = value.toDateTime();
+            const qint64 milliseconds = date.toMSecsSinceEpoch();
+            if (!date.isValid() || milliseconds < EarliestDate || milliseconds > LatestDate) {
+                *error = QStringLiteral("a date outside the years 1 to 9999 cannot be archived");
+                return false;
+            }
             m_cbor.append(QCborTag(EpochDateTag));
-            m_cbor.append(double(value.toDateTime().toMSecsSinceEpoch()) / 1000.0);
+            m_cbor.append(double(milliseconds) / 1000.0);
             return true;
+        }
         case QMetaType::QStringList:
         case QMetaType::QVariantList: {
             const QVariantList list = value.toList();
@@ -368,10 +394,11 @@ private:
                 return fail(error, QStringLiteral("a date is not a number of seconds"));
             }
             m_cbor.next();
-            if (!(seconds > -1e12 && seconds < 1e12)) {
+            const auto milliseconds = dateMilliseconds(seconds);
+            if (!milliseconds) {
                 return fail(error, QStringLiteral("a date is out of range"));
             }
-            return QDateTime::fromMSecsSinceEpoch(qint64(seconds * 1000.0), Qt::UTC);
+            return QDateTime::fromMSecsSinceEpoch(*milliseconds, QTimeZone::utc());
         }
         case QCborStreamReader::Array: {
             if (!allowed(ArchiveClass::Array, "array", error)) {

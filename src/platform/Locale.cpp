@@ -1,5 +1,7 @@
 #include "Locale.h"
 
+#include <algorithm>
+
 #include <unicode/uldnames.h>
 #include <unicode/uloc.h>
 
@@ -108,6 +110,14 @@ LocaleComponents Locale::componentsFromLocaleIdentifier(const QString &identifie
         return LocaleComponents {component(id, uloc_getLanguage), component(id, uloc_getScript),
             component(id, uloc_getCountry), component(id, uloc_getVariant)};
     });
+}
+
+bool Locale::namesALanguage(const QString &identifier)
+{
+    const QString language = componentsFromLocaleIdentifier(identifier).languageCode;
+    return language.size() >= 2 && language.size() <= 8
+        && std::all_of(language.cbegin(), language.cend(),
+            [](QChar c) { return (c >= u'a' && c <= u'z') || (c >= u'A' && c <= u'Z'); });
 }
 
 QString Locale::localeIdentifierFromComponents(const LocaleComponents &components)

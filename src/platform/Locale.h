@@ -50,6 +50,9 @@ public:
     [[nodiscard]] static QString canonicalLocaleIdentifier(const QString &identifier);
     [[nodiscard]] static LocaleComponents componentsFromLocaleIdentifier(const QString &identifier);
     [[nodiscard]] static QString localeIdentifierFromComponents(const LocaleComponents &components);
+    /// True when @p identifier parses and names a language (a code of two to eight letters): what a
+    /// bundle's locale must do before any list shows it, since every row is titled by its language.
+    [[nodiscard]] static bool namesALanguage(const QString &identifier);
 
 private:
     static QString canonicalLocaleIdentifierUncached(const QString &identifier);

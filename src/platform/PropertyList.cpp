@@ -6,6 +6,8 @@
 #include <QXmlStreamReader>
 #include <QXmlStreamWriter>
 
+#include <cmath>
+
 namespace Cadenza::Platform {
 
 namespace {
@@ -167,12 +169,14 @@ private:
         }
         if (name == u"date") {
             const QString t = text().trimmed();
-            QDateTime d = QDateTime::fromString(t, Qt::ISODate);
-            if (!d.isValid()) {
+            const QDateTime d = QDateTime::fromString(t, Qt::ISODate).toUTC();
+            // Fractions of a second are rounded to the millisecond, which can carry the last second
+            // of 9999 (or "24:00") into a year no property list can write down.
+            if (!d.isValid() || d.date().year() < 1 || d.date().year() > 9999) {
                 fail(QStringLiteral("bad date '%1'").arg(t.left(40)));
                 return {};
             }
-            return d.toUTC();
+            return d;
         }
         if (name == u"data") {
             QString t = text();
@@ -234,6 +238,52 @@ private:
     QString m_error;
 };
 
+// XML 1.0 cannot carry most control characters, U+FFFE, U+FFFF or half a surrogate pair: the writer
+// would drop the text, or break the whole document. Those become U+FFFD, once; a carriage return is
+// written as a character reference, since a reader turns a literal one into a line feed.
+void writeText(QXmlStreamWriter &xml, const QString &element, const QString &text)
+{
+    xml.writeStartElement(element);
+    QString run;
+    run.reserve(text.size());
+    for (qsizetype i = 0; i < text.size(); ++i) {
+        const QChar c = text.at(i);
+        if (c == u'\r') {
+            xml.writeCharacters(run);
+            run.clear();
+            xml.writeEntityReference(QStringLiteral("#13"));
+        } else if (c.isHighSurrogate() && i + 1 < text.size() && text.at(i + 1).isLowSurrogate()) {
+            run.append(c).append(text.at(++i));
+        } else if ((c.unicode() < 0x20 && c != u'\t' && c != u'\n') || c.isSurrogate()
+            || c.unicode() >= 0xFFFE) {
+            run.append(QChar::ReplacementCharacter);
+        } else {
+            run.append(c);
+        }
+    }
+    xml.writeCharacters(run);
+    xml.writeEndElement();
+}
+
+QString realText(double v)
+{
+    // 17 significant digits give the same double back; the sign of zero is kept as well.
+    if (v == 0.0 && std::signbit(v)) {
+        return QStringLiteral("-0");
+    }
+    return QString::number(v, 'g', 17);
+}
+
+QString dateText(const QDateTime &date)
+{
+    // Whole seconds as every reader expects them; milliseconds only when there are some.
+    const QDateTime utc = date.toUTC();
+    if (utc.time().msec() != 0) {
+        return utc.toString(Qt::ISODateWithMs);
+    }
+    return utc.toString(Qt::ISODate);
+}
+
 void writeValue(QXmlStreamWriter &xml, const QVariant &value)
 {
     switch (value.typeId()) {
@@ -257,10 +307,10 @@ void writeValue(QXmlStreamWriter &xml, const QVariant &value)
         break;
     case QMetaType::Double:
     case QMetaType::Float:
-        xml.writeTextElement(QStringLiteral("real"), QString::number(value.toDouble(), 'g', 17));
+        xml.writeTextElement(QStringLiteral("real"), realText(value.toDouble()));
         break;
     case QMetaType::QDateTime:
-        xml.writeTextElement(QStringLiteral("date"), value.toDateTime().toUTC().toString(Qt::ISODate));
+        xml.writeTextElement(QStringLiteral("date"), dateText(value.toDateTime()));
         break;
     case QMetaType::QByteArray:
         xml.writeTextElement(QStringLiteral("data"), QString::fromLatin1(value.toByteArray().toBase64()));
@@ -280,14 +330,14 @@ void writeValue(QXmlStreamWriter &xml, const QVariant &value)
         xml.writeStartElement(QStringLiteral("dict"));
         const auto map = value.toMap(); // sorted keys keep files stable under version control
         for (auto it = map.cbegin(); it != map.cend(); ++it) {
-            xml.writeTextElement(QStringLiteral("key"), it.key());
+            writeText(xml, QStringLiteral("key"), it.key());
             writeValue(xml, it.value());
         }
         xml.writeEndElement();
         break;
     }
     default:
-        xml.writeTextElement(QStringLiteral("string"), value.toString());
+        writeText(xml, QStringLiteral("string"), value.toString());
         break;
     }
 }

@@ -2,7 +2,7 @@
 
 #include "Logging.h"
 #include "Paths.h"
-#include "PropertyList.h"
+#include "RecognizerBundleInfo.h"
 
 #include <QDir>
 #include <QFileInfo>
@@ -21,18 +21,14 @@ std::optional<QStringList> BundleRecognitionService::installedLanguages()
             {QStringLiteral("*.SpeechRecognition")}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Name);
         for (const QString &bundle : bundles) {
             QString error;
-            const auto info
-                = PropertyList::readFile(dir.filePath(bundle) + QStringLiteral("/Info.plist"), &error);
-            const QVariant locale
-                = info ? info->toMap().value(QStringLiteral("LocaleIdentifier")) : QVariant();
-            if (locale.typeId() != QMetaType::QString || locale.toString().isEmpty()) {
+            const auto info = RecognizerBundleInfo::fromBundle(dir.filePath(bundle), &error);
+            if (!info) {
                 qCWarning(lcInstallation, "Skipping recognizer bundle %s: %s",
-                    qPrintable(dir.filePath(bundle)),
-                    qPrintable(info ? QStringLiteral("no LocaleIdentifier") : error));
+                    qPrintable(dir.filePath(bundle)), qPrintable(error));
                 continue;
             }
-            if (!languages.contains(locale.toString())) {
-                languages.append(locale.toString());
+            if (!languages.contains(info->localeIdentifier)) {
+                languages.append(info->localeIdentifier);
             }
         }
     }
@@ -49,9 +45,10 @@ QString BundleRecognitionService::bundlePathForIdentifier(const QString &bundleI
         const QStringList bundles = dir.entryList(
             {QStringLiteral("*.SpeechRecognition")}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Name);
         for (const QString &bundle : bundles) {
-            const auto info = PropertyList::readFile(dir.filePath(bundle) + QStringLiteral("/Info.plist"));
-            if (info
-                && info->toMap().value(QStringLiteral("BundleIdentifier")).toString() == bundleIdentifier) {
+            // Only bundles the language lists accept, so that both agree on what is installed.
+            QString error;
+            const auto info = RecognizerBundleInfo::fromBundle(dir.filePath(bundle), &error);
+            if (info && info->bundleIdentifier == bundleIdentifier) {
                 return dir.filePath(bundle);
             }
         }

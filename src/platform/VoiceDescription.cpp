@@ -1,5 +1,6 @@
 #include "VoiceDescription.h"
 
+#include "Locale.h"
 #include "SpeechSynthesisService.h"
 
 #include <algorithm>
@@ -93,6 +94,20 @@ std::optional<VoiceDescription> VoiceDescription::fromInfo(const QVariantMap &in
     if (stringValue(voice.attributes, VoiceAttribute::Name).isEmpty()) {
         *error = QStringLiteral("no voice name");
         return std::nullopt;
+    }
+    // Every voice list is grouped and titled by the voice's language: its locale, else its language,
+    // else en_US (values of the wrong type count as absent). A bundle whose locale or language names
+    // no language is left out here rather than stopping a list later.
+    for (const QString &key : {VoiceAttribute::LocaleIdentifier, VoiceAttribute::Language}) {
+        const QString locale = stringValue(voice.attributes, key);
+        if (locale.isEmpty()) {
+            continue;
+        }
+        if (!Locale::namesALanguage(locale)) {
+            *error = QStringLiteral("%1 '%2' names no language").arg(key, locale.left(40));
+            return std::nullopt;
+        }
+        break;
     }
     voice.attributes.insert(VoiceAttribute::Identifier, voice.identifier);
     voice.version = stringValue(info, QStringLiteral("BundleVersion"));

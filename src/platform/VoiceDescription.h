@@ -70,7 +70,8 @@ struct CADENZACORE_EXPORT VoiceDescription
 
     /**
      * Builds a description from an Info.plist dictionary. Returns nothing, with @p error set, when the
-     * dictionary lacks an identifier or a name; values of the wrong type are treated as absent.
+     * dictionary lacks an identifier or a name, or when its locale identifier (or, without one, its
+     * language) names no language; values of the wrong type are treated as absent.
      */
     [[nodiscard]] static std::optional<VoiceDescription> fromInfo(const QVariantMap &info, QString *error);
 };

@@ -15,7 +15,9 @@
 #include <QHash>
 #include <QLocale>
 
+#include <cmath>
 #include <cstdlib>
+#include <limits>
 
 #include <unicode/unum.h>
 
@@ -287,8 +289,19 @@ QString CZSpeechItem::displayStringForPercent(qint64 percent)
 
 QString CZSpeechItem::displayStringForTimeRemaining(double seconds)
 {
+    // The estimate keeps NaN samples on purpose and a daemon's record can carry any number: a time
+    // that is no number, or minus infinity, reads as no time at all; one beyond a century (plus
+    // infinity included) as the formatter's infinity. Whole hours are then always exact.
+    constexpr double Century = 100.0 * 365.25 * 24 * 3600;
+    if (std::isnan(seconds) || seconds == -std::numeric_limits<double>::infinity()) {
+        return QString();
+    }
     const QLocale numbers(Platform::Services::userLocale().currentLocaleIdentifier());
     const LocalizationTable &table = LocalizationTable::shared();
+    if (seconds >= Century) {
+        return table.format(
+            QStringLiteral("DownloadingProgressTimeRemainingNHours"), {QStringLiteral("\u221E")});
+    }
     if (seconds < 120) {
         return table.text(QStringLiteral("DownloadingProgressTimeRemainingLessThanAMinute"));
     }

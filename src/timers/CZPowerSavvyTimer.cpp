@@ -39,13 +39,13 @@ CZPowerSavvyTimer *CZPowerSavvyTimer::scheduledTimerWithTimeInterval(
 void CZPowerSavvyTimer::requestTarget(
     QObject *target, const char *performSelector, const QVariant &withObject, double afterDelay)
 {
-    CZPowerSavvyTimer *timer
-        = scheduledTimerWithTimeInterval(afterDelay, target, performSelector, withObject, false);
-    timer->m_deleteAfterFiring = true; // nobody else holds it
+    (void)scheduledTimerWithTimeInterval(afterDelay, target, performSelector, withObject, false);
 }
 
 void CZPowerSavvyTimer::_target_(Platform::RunLoopTimer *firing)
 {
+    // The action may invalidate the timer or destroy its target, and with it this wrapper.
+    const QPointer<CZPowerSavvyTimer> self(this);
     if (!_repeats) {
         // The action already sees a one-shot timer gone from the registry.
         CZSystemBehaviorManager::sharedCZSystemBehaviorManager().removeTimer(this);
@@ -57,7 +57,17 @@ void CZPowerSavvyTimer::_target_(Platform::RunLoopTimer *firing)
                 _target->metaObject()->className(), _selector.constData());
         }
     }
-    if (m_deleteAfterFiring && !_repeats) {
+    if (self && !_repeats) {
+        release();
+    }
+}
+
+void CZPowerSavvyTimer::release()
+{
+    // A stopped timer never runs again: keeping it until its target goes made a long-lived target
+    // grow by every timer it ever scheduled. Later, so that whoever stopped it may still ask it.
+    if (!m_released) {
+        m_released = true;
         deleteLater();
     }
 }
@@ -96,6 +106,7 @@ void CZPowerSavvyTimer::invalidate()
 {
     _timer->invalidate();
     CZSystemBehaviorManager::sharedCZSystemBehaviorManager().removeTimer(this);
+    release();
 }
 
 } // namespace Cadenza

@@ -25,8 +25,9 @@ class CADENZACORE_EXPORT CZPowerSavvyTimer : public QObject
 public:
     ~CZPowerSavvyTimer() override;
 
-    /// A new timer, already counting on the current thread's event loop. It belongs to @p target
-    /// and goes when the target goes.
+    /// A new timer, already counting on the current thread's event loop. It is deleted (later, by
+    /// the event loop) once it stops: when a one-shot timer has fired or any timer is invalidated,
+    /// and at the latest with @p target. Keep it in a QPointer to ask it afterwards.
     static CZPowerSavvyTimer *scheduledTimerWithTimeInterval(
         double interval, QObject *target, const char *selector, const QVariant &userInfo, bool repeats);
     /// Calls @p selector on @p target once, after @p delay seconds, with the timer (whose user
@@ -50,12 +51,13 @@ public:
 private:
     explicit CZPowerSavvyTimer(QObject *parent);
     void _target_(Platform::RunLoopTimer *firing);
+    void release();
 
     Platform::RunLoopTimer *_timer = nullptr;
     bool _repeats = false;
     QPointer<QObject> _target;
     QByteArray _selector;
-    bool m_deleteAfterFiring = false;
+    bool m_released = false;
 };
 
 } // namespace Cadenza

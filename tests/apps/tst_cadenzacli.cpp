@@ -172,6 +172,40 @@ private Q_SLOTS:
         QCOMPARE(first.value(QStringLiteral("tag")).toString(), QStringLiteral("SRCLANGID:de_DE"));
     }
 
+    void bundlesThatNameNoLanguageAreLeftOut()
+    {
+        // A recognizer and a voice whose locale is "_": listing languages or voices used to stop the
+        // whole process for want of a language name.
+        const QString recognizer
+            = Cadenza::Platform::Paths::userRecognizersFolder() + QStringLiteral("/_.SpeechRecognition");
+        QVERIFY(QDir().mkpath(recognizer));
+        QFile info(recognizer + QStringLiteral("/Info.plist"));
+        QVERIFY(info.open(QIODevice::WriteOnly));
+        info.write(
+            "<plist version=\"1.0\"><dict><key>LocaleIdentifier</key><string>_</string></dict></plist>");
+        info.close();
+        TestEnvironment::writeVoiceBundle(Cadenza::Platform::Paths::userVoicesFolder(),
+            QStringLiteral("Nobody"),
+            TestEnvironment::voiceAttributes(
+                QStringLiteral("com.example.voice.nobody"), QStringLiteral("Nobody"), QStringLiteral("_")));
+
+        Result r = cadenza({QStringLiteral("languages"), QStringLiteral("--json")});
+        QVERIFY2(r.exitCode == 0, qPrintable(r.err));
+        QVERIFY2(r.err.contains(QStringLiteral("_.SpeechRecognition")), qPrintable(r.err));
+        const QJsonArray languages = QJsonDocument::fromJson(r.out.toUtf8()).array();
+        QCOMPARE(languages.size(), 6);
+        for (const QJsonValue &language : languages) {
+            QVERIFY(
+                !language.toObject().value(QStringLiteral("locale")).toString().startsWith(QLatin1Char('_')));
+        }
+
+        r = cadenza({QStringLiteral("voices")});
+        QVERIFY2(r.exitCode == 0, qPrintable(r.err));
+        QVERIFY2(r.err.contains(QStringLiteral("Nobody")), qPrintable(r.err));
+        QVERIFY(!r.out.contains(QStringLiteral("nobody")));
+        QCOMPARE(r.out.split(QLatin1Char('\n'), Qt::SkipEmptyParts).size(), 14);
+    }
+
     void downloadablesRemoveAndUpgrade()
     {
         // Jonas is installed compact: its premium quality is an upgrade. Orin 1.2 is older than the

@@ -1,6 +1,8 @@
 #!/usr/bin/env bash
-# Installs the build into a temporary prefix, validates the desktop entry and the AppStream metadata,
-# and builds and runs the example host application against the installed CMake package.
+# Installs the build into a temporary prefix (and staged into a DESTDIR), checks that nothing lands
+# outside it and that the units and the policy name the programs there, validates the desktop entry
+# and the AppStream metadata, and builds and runs the example host application against the installed
+# CMake package.
 # Usage: check-install.sh BUILD_DIR SOURCE_DIR
 set -euo pipefail
 build=$1
@@ -9,13 +11,44 @@ work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 prefix="$work/prefix"
 
+# Every installed file must land below the prefix given when installing (not the configured one),
+# and the files that name programs must name them there.
+check_staged() { # ROOT PREFIX: files were installed into ROOT and will run from PREFIX
+  local root=$1 run_prefix=$2 outside
+  # The manifest names files as they will run, without DESTDIR.
+  outside=$(grep -v "^$run_prefix/" "$build/install_manifest.txt" || true)
+  if [ -n "$outside" ]; then
+    echo "installed outside $run_prefix:" >&2
+    echo "$outside" >&2
+    exit 1
+  fi
+  for f in lib/cmake/Cadenza/CadenzaConfig.cmake include/cadenza/voice-popup/CZVoicePopUpButton.h \
+           include/cadenza/cadenza_export.h bin/quillond bin/cadenza bin/cadenza-settings \
+           lib/systemd/user/quillond.service lib/systemd/user/quillond.socket \
+           share/applications/org.cadenza.Settings.desktop share/metainfo/org.cadenza.Settings.metainfo.xml \
+           share/polkit-1/actions/org.cadenza.remove-speech-bundle.policy share/cadenza/SpeechDataDefaults.plist; do
+    [ -e "$root/$f" ] || { echo "not installed: $f" >&2; exit 1; }
+  done
+  local exec_start helper
+  exec_start=$(sed -n 's/^ExecStart=\([^ ]*\).*/\1/p' "$root/lib/systemd/user/quillond.service")
+  [ "$exec_start" = "$run_prefix/bin/quillond" ] || { echo "quillond.service starts '$exec_start'" >&2; exit 1; }
+  [ -x "$root${exec_start#"$run_prefix"}" ] || { echo "no daemon at $exec_start" >&2; exit 1; }
+  helper=$(sed -n 's/.*policykit.exec.path">\([^<]*\)<.*/\1/p' \
+    "$root/share/polkit-1/actions/org.cadenza.remove-speech-bundle.policy")
+  case $helper in
+    "$run_prefix"/*) [ -x "$root${helper#"$run_prefix"}" ] || { echo "no helper at $helper" >&2; exit 1; } ;;
+    *) echo "the policy names '$helper', outside $run_prefix" >&2; exit 1 ;;
+  esac
+}
+
+# Staged for packaging: DESTDIR holds what will run from another prefix.
+DESTDIR="$work/stage" cmake --install "$build" --prefix /opt/cadenza-staged >/dev/null
+check_staged "$work/stage/opt/cadenza-staged" /opt/cadenza-staged
+outside=$(find "$work/stage" -mindepth 1 -not -path "$work/stage/opt" -not -path "$work/stage/opt/cadenza-staged*")
+[ -z "$outside" ] || { echo "staged outside the prefix: $outside" >&2; exit 1; }
+
 cmake --install "$build" --prefix "$prefix" >/dev/null
-for f in lib/cmake/Cadenza/CadenzaConfig.cmake include/cadenza/voice-popup/CZVoicePopUpButton.h \
-         include/cadenza/cadenza_export.h bin/quillond bin/cadenza bin/cadenza-settings \
-         share/applications/org.cadenza.Settings.desktop share/metainfo/org.cadenza.Settings.metainfo.xml \
-         share/polkit-1/actions/org.cadenza.remove-speech-bundle.policy share/cadenza/SpeechDataDefaults.plist; do
-  [ -e "$prefix/$f" ] || { echo "not installed: $f" >&2; exit 1; }
-done
+check_staged "$prefix" "$prefix"
 if find "$prefix/include" -name '*_p.h' | grep -q .; then
   echo "private headers were installed" >&2
   exit 1
@@ -31,3 +64,30 @@ fi
 cmake -S "$source/examples/minimal-host" -B "$work/example" "${example_args[@]}" >/dev/null
 cmake --build "$work/example" --parallel "$(nproc)" >/dev/null
 LD_LIBRARY_PATH="$prefix/lib" QT_QPA_PLATFORM=offscreen "$work/example/minimal-host" --check
+
+# The library of an installation whose prefix differs from the configured one finds the removal
+# helper of that installation, the one its policy names.
+mkdir -p "$work/helper-path"
+cat >"$work/helper-path/CMakeLists.txt" <<'CMAKE'
+cmake_minimum_required(VERSION 3.25)
+project(HelperPath LANGUAGES CXX)
+set(CMAKE_CXX_STANDARD 20)
+find_package(Cadenza 0.1 REQUIRED)
+add_executable(helper-path main.cpp)
+target_link_libraries(helper-path PRIVATE Cadenza::Core)
+CMAKE
+cat >"$work/helper-path/main.cpp" <<'CPP'
+#include <platform/AdministratorService.h>
+#include <cstdio>
+int main() { std::puts(qPrintable(Cadenza::Platform::PolkitAdministratorService::helperPath())); }
+CPP
+cmake -S "$work/helper-path" -B "$work/helper-path/build" "${example_args[@]}" >/dev/null
+cmake --build "$work/helper-path/build" >/dev/null
+helper=$(env -u CADENZA_REMOVE_HELPER LD_LIBRARY_PATH="$prefix/lib" "$work/helper-path/build/helper-path")
+configured=$(sed -n 's/^CMAKE_INSTALL_PREFIX:PATH=//p' "$build/CMakeCache.txt")
+if [ -x "$configured/libexec/cadenza-remove-bundle" ]; then
+  echo "skipping the moved helper check: an installation at $configured has a helper"
+elif [ "$helper" != "$prefix/libexec/cadenza-remove-bundle" ]; then
+  echo "the library looks for the removal helper at '$helper'" >&2
+  exit 1
+fi

@@ -4,6 +4,10 @@
 #include <QCborStreamWriter>
 #include <QDateTime>
 #include <QTest>
+#include <QTimeZone>
+
+#include <cmath>
+#include <limits>
 
 using namespace Cadenza::Platform;
 
@@ -118,6 +122,155 @@ private Q_SLOTS:
         QString error;
         QVERIFY(!KeyedArchive::decode(bytes, Everything, &error));
         QVERIFY2(!error.isEmpty(), "a refusal must say why");
+    }
+
+    void aRelayedDateKeepsItsValue()
+    {
+        // An installation request as a fuzzer found it: its "t" is 1.0012207031... seconds, which
+        // decoded to 1001 ms; archived again as 1.001 s, that came back as 1000 ms when truncated.
+        const QByteArray found = QByteArray::fromHex(
+            "a164726f6f7482a87251544e44436c69656e74506f72744e616d65781c636f6d2e76656e6472612e737065656368"
+            "2e7175696c6c6f6e642d3173514c4e44436c69656e7450726f6365737349440570514c4e444974656d4279746553"
+            "697a650c76514c4e444974656d446f776e6c6f6164537461747573046c514c4e444974656d4e616d6561586c514c"
+            "4e444f626a656374494461786b514c4e445461674e616d6569564f49434549443a7877514c4e4455736572496e74"
+            "6572616374696f6e4d6f642c00a361644261626170fb40040000000000006174c1fb3ff0050000000000");
+        QString error;
+        const auto decoded = KeyedArchive::decode(found, Everything, &error);
+        QVERIFY2(decoded, qPrintable(error));
+        const QVariantMap interaction = decoded->toList().at(1).toMap();
+        QCOMPARE(interaction.value(QStringLiteral("t")).toDateTime().toMSecsSinceEpoch(), 1001);
+        QByteArray archive = *KeyedArchive::encode(*decoded);
+        for (int relay = 0; relay < 5; ++relay) {
+            const auto again = KeyedArchive::decode(archive, Everything, &error);
+            QVERIFY2(again, qPrintable(error));
+            QCOMPARE(
+                again->toList().at(1).toMap().value(QStringLiteral("t")).toDateTime().toMSecsSinceEpoch(),
+                1001);
+            const QByteArray next = *KeyedArchive::encode(*again);
+            QCOMPARE(next, archive);
+            archive = next;
+        }
+    }
+
+    void datesSurviveEveryTrip_data()
+    {
+        QTest::addColumn<qint64>("milliseconds");
+        QTest::newRow("epoch") << qint64(0);
+        QTest::newRow("1 ms") << qint64(1);
+        QTest::newRow("-1 ms") << qint64(-1);
+        QTest::newRow("1.001 s") << qint64(1001);
+        QTest::newRow("-1.001 s") << qint64(-1001);
+        QTest::newRow("-0.999 s") << qint64(-999);
+        QTest::newRow("now-ish") << qint64(1763800000123);
+        QTest::newRow("before the epoch") << qint64(-1234567890987);
+        QTest::newRow("first of year 1") << qint64(-62135596800000);
+        QTest::newRow("last of year 9999") << qint64(253402300799999);
+    }
+    void datesSurviveEveryTrip()
+    {
+        QFETCH(qint64, milliseconds);
+        QVariant value = QDateTime::fromMSecsSinceEpoch(milliseconds, QTimeZone::utc());
+        QString error;
+        for (int trip = 0; trip < 10; ++trip) {
+            const auto bytes = KeyedArchive::encode(value, &error);
+            QVERIFY2(bytes, qPrintable(error));
+            const auto back = KeyedArchive::decode(*bytes, Everything, &error);
+            QVERIFY2(back, qPrintable(error));
+            QCOMPARE(back->toDateTime().toMSecsSinceEpoch(), milliseconds);
+            value = *back;
+        }
+    }
+
+    void datesRoundToTheNearestMillisecond_data()
+    {
+        QTest::addColumn<double>("seconds");
+        QTest::addColumn<qint64>("milliseconds");
+        QTest::newRow("just below 1.001 s") << 1.0009999 << qint64(1001);
+        QTest::newRow("just above 1.001 s") << 1.0010001 << qint64(1001);
+        QTest::newRow("just below -1.001 s") << -1.0010001 << qint64(-1001);
+        QTest::newRow("just above -1.001 s") << -1.0009999 << qint64(-1001);
+        QTest::newRow("a hair below zero") << -0.0001 << qint64(0);
+        QTest::newRow("integer seconds") << 2.0 << qint64(2000);
+        QTest::newRow("rounds onto the last date") << 253402300799.9994 << qint64(253402300799999);
+        QTest::newRow("rounds onto the first date") << -62135596800.0004 << qint64(-62135596800000);
+    }
+    void datesRoundToTheNearestMillisecond()
+    {
+        QFETCH(double, seconds);
+        QFETCH(qint64, milliseconds);
+        const QByteArray bytes = rawArchive([&](QCborStreamWriter &cbor) {
+            cbor.append(QCborTag(1));
+            cbor.append(seconds);
+        });
+        QString error;
+        const auto back = KeyedArchive::decode(bytes, Everything, &error);
+        QVERIFY2(back, qPrintable(error));
+        QCOMPARE(back->toDateTime().toMSecsSinceEpoch(), milliseconds);
+    }
+
+    void datesOutsideTheYearsAreRefused_data()
+    {
+        QTest::addColumn<double>("seconds");
+        QTest::newRow("rounds past 9999") << 253402300799.9996;
+        QTest::newRow("rounds before year 1") << -62135596800.0006;
+        QTest::newRow("huge") << 1e300;
+        QTest::newRow("infinity") << std::numeric_limits<double>::infinity();
+        QTest::newRow("minus infinity") << -std::numeric_limits<double>::infinity();
+        QTest::newRow("NaN") << std::numeric_limits<double>::quiet_NaN();
+    }
+    void datesOutsideTheYearsAreRefused()
+    {
+        QFETCH(double, seconds);
+        const QByteArray bytes = rawArchive([&](QCborStreamWriter &cbor) {
+            cbor.append(QCborTag(1));
+            cbor.append(seconds);
+        });
+        QString error;
+        QVERIFY(!KeyedArchive::decode(bytes, Everything, &error));
+        QVERIFY(error.contains(QStringLiteral("out of range")));
+        // Nor is such a date archived: no reader could take it back.
+        error.clear();
+        QVERIFY(!KeyedArchive::encode(QDateTime(QDate(10000, 1, 1), QTime(0, 0), QTimeZone::utc()), &error));
+        QVERIFY(!error.isEmpty());
+    }
+
+    void otherValuesSurviveEveryTrip()
+    {
+        const QVariantList values {QVariant::fromValue(std::numeric_limits<qint64>::min()),
+            QVariant::fromValue(std::numeric_limits<qint64>::max()),
+            QVariant::fromValue(std::numeric_limits<quint64>::max()),
+            QVariant::fromValue(quint64(std::numeric_limits<qint64>::max()) + 1), 0.1, -0.0, 1e-310,
+            std::numeric_limits<double>::max(), std::numeric_limits<double>::infinity(),
+            -std::numeric_limits<double>::infinity(),
+            QString(QString(QChar(0)) + QStringLiteral("\r\n\t\u0001\uFFFE\uFEFF\u202E") + QChar(0xDBFF)
+                + QChar(0xDFFF))};
+        QVariant value = values;
+        QString error;
+        QByteArray first;
+        for (int trip = 0; trip < 5; ++trip) {
+            const auto bytes = KeyedArchive::encode(value, &error);
+            QVERIFY2(bytes, qPrintable(error));
+            if (trip == 0) {
+                first = *bytes;
+            }
+            QCOMPARE(*bytes, first);
+            const auto back = KeyedArchive::decode(*bytes, Everything, &error);
+            QVERIFY2(back, qPrintable(error));
+            value = *back;
+        }
+        const QVariantList back = value.toList();
+        QCOMPARE(back.size(), values.size());
+        QCOMPARE(back.at(0).toLongLong(), std::numeric_limits<qint64>::min());
+        QCOMPARE(back.at(1).toLongLong(), std::numeric_limits<qint64>::max());
+        QCOMPARE(back.at(2).toULongLong(), std::numeric_limits<quint64>::max());
+        QCOMPARE(back.at(3).toULongLong(), quint64(std::numeric_limits<qint64>::max()) + 1);
+        QCOMPARE(back.at(4).toDouble(), 0.1);
+        QVERIFY(std::signbit(back.at(5).toDouble()));
+        QCOMPARE(back.at(6).toDouble(), 1e-310);
+        QCOMPARE(back.at(7).toDouble(), std::numeric_limits<double>::max());
+        QCOMPARE(back.at(8).toDouble(), std::numeric_limits<double>::infinity());
+        QCOMPARE(back.at(9).toDouble(), -std::numeric_limits<double>::infinity());
+        QCOMPARE(back.at(10).toString(), values.at(10).toString());
     }
 
     void stringsKeepEveryCharacter()

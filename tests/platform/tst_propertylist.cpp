@@ -2,6 +2,10 @@
 
 #include <QDateTime>
 #include <QTest>
+#include <QTimeZone>
+
+#include <cmath>
+#include <limits>
 
 using Cadenza::Platform::PropertyList;
 
@@ -41,6 +45,102 @@ private Q_SLOTS:
         QCOMPARE(list.size(), 3);
         QCOMPARE(list.at(1).toString(), QStringLiteral("two"));
         QCOMPARE(list.at(2).toMap().value(QStringLiteral("k")).toDouble(), 3.0);
+    }
+
+    void valuesSurviveEveryTrip()
+    {
+        const QVariantMap original {
+            {QStringLiteral("milliseconds"), QDateTime::fromMSecsSinceEpoch(1763800000123, QTimeZone::utc())},
+            {QStringLiteral("before the epoch"), QDateTime::fromMSecsSinceEpoch(-1001, QTimeZone::utc())},
+            {QStringLiteral("first date"), QDateTime::fromMSecsSinceEpoch(-62135596800000, QTimeZone::utc())},
+            {QStringLiteral("last date"), QDateTime::fromMSecsSinceEpoch(253402300799999, QTimeZone::utc())},
+            {QStringLiteral("smallest"), QVariant::fromValue(std::numeric_limits<qint64>::min())},
+            {QStringLiteral("largest"), QVariant::fromValue(std::numeric_limits<qint64>::max())},
+            {QStringLiteral("beyond signed"),
+                QVariant::fromValue(quint64(std::numeric_limits<qint64>::max()) + 1)},
+            {QStringLiteral("tenth"), 0.1},
+            {QStringLiteral("negative zero"), -0.0},
+            {QStringLiteral("subnormal"), 1e-310},
+            {QStringLiteral("largest real"), std::numeric_limits<double>::max()},
+            {QStringLiteral("infinity"), std::numeric_limits<double>::infinity()},
+            {QStringLiteral("returns"), QStringLiteral("\r\nline\rline\r")},
+            {QStringLiteral("spaces"), QStringLiteral("  \t padded \n ")},
+            {QStringLiteral("markup"), QStringLiteral("]]> <!-- &amp; <key>")},
+            {QStringLiteral("\rkey with a return"), QStringLiteral("\U0001F600 \u202E\uFEFF")},
+        };
+        QVariant value = original;
+        QByteArray first;
+        for (int trip = 0; trip < 5; ++trip) {
+            const QByteArray bytes = PropertyList::serialize(value);
+            if (trip == 0) {
+                first = bytes;
+            }
+            QCOMPARE(bytes, first);
+            QString error;
+            const auto parsed = PropertyList::parse(bytes, &error);
+            QVERIFY2(parsed, qPrintable(error));
+            value = *parsed;
+        }
+        const QVariantMap back = value.toMap();
+        QCOMPARE(back.keys(), original.keys());
+        for (auto it = original.cbegin(); it != original.cend(); ++it) {
+            const QVariant &got = back.value(it.key());
+            QCOMPARE(got.typeId() == QMetaType::QDateTime, it->typeId() == QMetaType::QDateTime);
+            if (it->typeId() == QMetaType::QDateTime) {
+                QCOMPARE(got.toDateTime().toMSecsSinceEpoch(), it->toDateTime().toMSecsSinceEpoch());
+            } else if (it->typeId() == QMetaType::Double) {
+                QCOMPARE(got.toDouble(), it->toDouble());
+                QCOMPARE(std::signbit(got.toDouble()), std::signbit(it->toDouble()));
+            } else {
+                QCOMPARE(got.toString(), it->toString());
+            }
+        }
+        // Whole seconds stay written as whole seconds.
+        QVERIFY(PropertyList::serialize(QDateTime(QDate(2026, 11, 21), QTime(12, 30, 5), QTimeZone::utc()))
+                    .contains("<date>2026-11-21T12:30:05Z</date>"));
+    }
+
+    void charactersXmlCannotCarryBecomeReplacements()
+    {
+        // Once replaced, the text stays as it is; the document around it stays readable.
+        const QString text
+            = QStringLiteral("a") + QChar(1) + QChar(0xFFFE) + QChar(0xD800) + QStringLiteral("b");
+        const QString replaced = QStringLiteral("a\uFFFD\uFFFD\uFFFDb");
+        const auto parsed = PropertyList::parse(PropertyList::serialize(QVariantMap {{text, text}}));
+        QVERIFY(parsed);
+        QCOMPARE(parsed->toMap(), (QVariantMap {{replaced, replaced}}));
+        QCOMPARE(PropertyList::serialize(*parsed), PropertyList::serialize(QVariantMap {{text, text}}));
+    }
+
+    void datesRoundToTheMillisecondAndStayInTheYears_data()
+    {
+        QTest::addColumn<QString>("text");
+        QTest::addColumn<qint64>("milliseconds"); // 0: refused
+        QTest::newRow("fraction") << "2020-01-01T00:00:00.1234Z" << qint64(1577836800123);
+        QTest::newRow("fraction rounds up") << "2020-01-01T00:00:00.9996Z" << qint64(1577836801000);
+        QTest::newRow("last date") << "9999-12-31T23:59:59.999Z" << qint64(253402300799999);
+        QTest::newRow("rounds into 10000") << "9999-12-31T23:59:59.9999Z" << qint64(0);
+        QTest::newRow("24:00 of the last day") << "9999-12-31T24:00:00Z" << qint64(0);
+        QTest::newRow("year 0") << "0000-01-01T00:00:00Z" << qint64(0);
+        QTest::newRow("first date") << "0001-01-01T00:00:00Z" << qint64(-62135596800000);
+    }
+    void datesRoundToTheMillisecondAndStayInTheYears()
+    {
+        QFETCH(QString, text);
+        QFETCH(qint64, milliseconds);
+        const QByteArray document = "<plist version=\"1.0\"><date>" + text.toUtf8() + "</date></plist>";
+        QString error;
+        const auto parsed = PropertyList::parse(document, &error);
+        if (milliseconds == 0) {
+            QVERIFY(!parsed);
+            QVERIFY(error.contains(QStringLiteral("bad date")));
+            return;
+        }
+        QVERIFY2(parsed, qPrintable(error));
+        QCOMPARE(parsed->toDateTime().toMSecsSinceEpoch(), milliseconds);
+        const auto again = PropertyList::parse(PropertyList::serialize(*parsed));
+        QVERIFY(again);
+        QCOMPARE(again->toDateTime().toMSecsSinceEpoch(), milliseconds);
     }
 
     void refusesDamagedDocuments_data()

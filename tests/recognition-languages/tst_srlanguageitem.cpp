@@ -224,12 +224,29 @@ private Q_SLOTS:
         bundle(Paths::systemRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"),
             QStringLiteral("de_DE"));
         bundle(Paths::systemRecognizersFolder(), QStringLiteral("odd.SpeechRecognition"), 5);
+        // Locales that name no language are left out, each with one line naming its bundle.
+        const QStringList nameless {QStringLiteral("_"), QStringLiteral("__"), QStringLiteral("_DE"),
+            QStringLiteral("1234"), QStringLiteral("@calendar=x"), QStringLiteral("x"),
+            QStringLiteral("\u00e9\u00e9")};
+        for (int i = 0; i < nameless.size(); ++i) {
+            bundle(Paths::userRecognizersFolder(), QStringLiteral("nameless%1.SpeechRecognition").arg(i),
+                nameless.at(i));
+        }
         QTest::ignoreMessage(
             QtWarningMsg, QRegularExpression(QStringLiteral("Skipping recognizer bundle .*odd")));
+        for (int i = 0; i < nameless.size(); ++i) {
+            QTest::ignoreMessage(QtWarningMsg,
+                QRegularExpression(
+                    QStringLiteral("Skipping recognizer bundle .*nameless%1.*names no language").arg(i)));
+        }
         QCOMPARE(Services::recognition().installedLanguages().value_or(QStringList()),
             QStringList({QStringLiteral("de_DE"), QStringLiteral("en-US")}));
         QCOMPARE(locales(CZSRLanguageItem::availableLocalRecognizerLanguageItems()),
             QStringList({QStringLiteral("de_DE"), QStringLiteral("en_US"), QStringLiteral("en_IN")}));
+        // Every listed language has a title.
+        for (const auto &item : CZSRLanguageItem::availableLocalRecognizerLanguageItems()) {
+            QVERIFY(!item->displayTitle().isEmpty());
+        }
     }
 
 private:

@@ -11,6 +11,8 @@
 #include <QProcess>
 #include <QTest>
 
+#include <limits>
+
 using namespace Cadenza;
 using namespace Cadenza::Platform;
 
@@ -174,6 +176,16 @@ private Q_SLOTS:
         QTest::newRow("7200") << 7200.0 << "About 2 hours remaining";
         QTest::newRow("10799") << 10799.0 << "About 2 hours remaining";
         QTest::newRow("negative") << -5.0 << "Less than a minute remaining";
+        // Times that are no number or absurd: no time, or the formatter's infinity; never garbage.
+        QTest::newRow("NaN") << std::numeric_limits<double>::quiet_NaN() << "";
+        QTest::newRow("-inf") << -std::numeric_limits<double>::infinity() << "";
+        QTest::newRow("-huge") << -1e300 << "Less than a minute remaining";
+        QTest::newRow("+inf") << std::numeric_limits<double>::infinity() << "About \u221E hours remaining";
+        QTest::newRow("huge") << 1e300 << "About \u221E hours remaining";
+        QTest::newRow("beyond qint64 hours") << 3.4e22 << "About \u221E hours remaining";
+        QTest::newRow("a century") << 100.0 * 365.25 * 24 * 3600 << "About \u221E hours remaining";
+        QTest::newRow("just under a century")
+            << 100.0 * 365.25 * 24 * 3600 - 1 << "About 876,599 hours remaining";
     }
     void timesRemaining()
     {

@@ -1,7 +1,9 @@
 #include "timers/CZPowerSavvyTimer.h"
 #include "timers/CZSystemBehaviorManager.h"
 
+#include <QCoreApplication>
 #include <QElapsedTimer>
+#include <QPointer>
 #include <QTest>
 
 using namespace Cadenza;
@@ -26,14 +28,24 @@ public:
         QVariant userInfo;
         bool registeredWhenCalled;
         qint64 elapsed;
+        bool validWhenCalled;
     };
+    enum class Stop { No, Invalidate, DestroyTarget };
     QList<Call> calls;
     const CZPowerSavvyTimer *watched = nullptr;
     QElapsedTimer clock;
+    Stop stopOnCall = Stop::No;
+    QPointer<CZPowerSavvyTimer> stopping;
 
     Q_INVOKABLE void tick(Cadenza::Platform::RunLoopTimer *timer)
     {
-        calls.append({timer, timer->userInfo(), watched && registered(watched), clock.elapsed()});
+        calls.append(
+            {timer, timer->userInfo(), watched && registered(watched), clock.elapsed(), timer->isValid()});
+        if (stopOnCall == Stop::Invalidate && stopping) {
+            stopping->invalidate();
+        } else if (stopOnCall == Stop::DestroyTarget) {
+            delete this; // takes its timers with it, the firing one included
+        }
     }
 };
 
@@ -71,13 +83,64 @@ private Q_SLOTS:
             0.05, &receiver, "tick", QStringLiteral("info"), false);
         receiver.watched = timer;
         QVERIFY(registered(timer));
+        Platform::RunLoopTimer *const inner = timer->timer();
         QTRY_COMPARE(receiver.calls.size(), 1);
         QVERIFY(!receiver.calls.first().registeredWhenCalled);
-        QCOMPARE(receiver.calls.first().timer, timer->timer()); // the inner timer, not the wrapper
+        QCOMPARE(receiver.calls.first().timer, inner); // the inner timer, not the wrapper
         QCOMPARE(receiver.calls.first().userInfo, QVariant(QStringLiteral("info")));
-        QVERIFY(!timer->isValid());
+        QVERIFY(!receiver.calls.first().validWhenCalled);
         QTest::qWait(150);
         QCOMPARE(receiver.calls.size(), 1);
+    }
+
+    void stoppedTimersAreFreedBeforeTheirTarget()
+    {
+        Receiver receiver;
+        // A one-shot timer that fired, by its clock or by hand.
+        QPointer<CZPowerSavvyTimer> fired
+            = CZPowerSavvyTimer::scheduledTimerWithTimeInterval(0.01, &receiver, "tick", QVariant(), false);
+        QPointer<CZPowerSavvyTimer> firedByHand
+            = CZPowerSavvyTimer::scheduledTimerWithTimeInterval(100.0, &receiver, "tick", QVariant(), false);
+        firedByHand->fire();
+        QVERIFY(firedByHand); // still there for whoever fired it, until the event loop runs
+        QVERIFY(!firedByHand->isValid());
+        // Repeating and one-shot timers that were invalidated.
+        QPointer<CZPowerSavvyTimer> repeating
+            = CZPowerSavvyTimer::scheduledTimerWithTimeInterval(0.01, &receiver, "tick", QVariant(), true);
+        QPointer<CZPowerSavvyTimer> oneShot
+            = CZPowerSavvyTimer::scheduledTimerWithTimeInterval(100.0, &receiver, "tick", QVariant(), false);
+        oneShot->invalidate();
+        QTRY_VERIFY(receiver.calls.size() >= 3);
+        repeating->invalidate();
+        // A delayed request.
+        CZPowerSavvyTimer::requestTarget(&receiver, "tick", QVariant(), 0.01);
+        const qsizetype before = receiver.calls.size();
+        QTRY_COMPARE(receiver.calls.size(), before + 1);
+        // A repeating timer that runs on stays.
+        QPointer<CZPowerSavvyTimer> running
+            = CZPowerSavvyTimer::scheduledTimerWithTimeInterval(100.0, &receiver, "tick", QVariant(), true);
+        QTRY_VERIFY(!fired && !firedByHand && !repeating && !oneShot);
+        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+        QVERIFY(running);
+        QCOMPARE(receiver.findChildren<CZPowerSavvyTimer *>(), QList<CZPowerSavvyTimer *>({running.data()}));
+        QCOMPARE(CZSystemBehaviorManager::sharedCZSystemBehaviorManager().registeredTimers().size(), 0);
+    }
+
+    void aTimerInvalidatedOrItsTargetDestroyedByItsActionIsFreedOnce()
+    {
+        auto *receiver = new Receiver;
+        receiver->stopOnCall = Receiver::Stop::Invalidate;
+        QPointer<CZPowerSavvyTimer> repeating
+            = CZPowerSavvyTimer::scheduledTimerWithTimeInterval(0.01, receiver, "tick", QVariant(), true);
+        receiver->stopping = repeating;
+        QTRY_VERIFY(!repeating);
+        QCOMPARE(receiver->calls.size(), 1);
+        receiver->stopOnCall = Receiver::Stop::DestroyTarget;
+        QPointer<Receiver> target(receiver);
+        QPointer<CZPowerSavvyTimer> oneShot
+            = CZPowerSavvyTimer::scheduledTimerWithTimeInterval(0.01, receiver, "tick", QVariant(), false);
+        QTRY_VERIFY(!target);
+        QVERIFY(!oneShot);
     }
 
     void aRepeatingTimerStaysUntilInvalidated()
