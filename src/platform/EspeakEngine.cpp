@@ -34,6 +34,32 @@ int collectSamples(short *wav, int count, espeak_EVENT *)
     return 0;
 }
 
+/// Chooses the voice as espeak-ng's own tool does: by name first, else by language; then applies the
+/// variant to the voice found. espeak-ng knows many languages ("fr-fr", "en-gb") only as languages.
+bool selectVoice(const QString &engineVoice, const QString &variant, const QString &gender)
+{
+    const QByteArray suffix
+        = variant.isEmpty() ? QByteArray() : QByteArray(QByteArray("+") + variant.toUtf8());
+    const QByteArray name = engineVoice.toUtf8();
+    if (espeak_SetVoiceByName(QByteArray(name + suffix).constData()) == EE_OK) {
+        return true;
+    }
+    espeak_VOICE wanted {};
+    wanted.languages = name.constData();
+    wanted.gender = gender == VoiceGender::Male ? 1 : gender == VoiceGender::Female ? 2 : 0;
+    if (espeak_SetVoiceByProperties(&wanted) != EE_OK) {
+        return false;
+    }
+    const espeak_VOICE *found = espeak_GetCurrentVoice();
+    if (suffix.isEmpty() || !found || !found->identifier) {
+        return true;
+    }
+    // The identifier names the voice file ("roa/fr"), which takes a variant by name.
+    QByteArray identifier(found->identifier);
+    identifier.truncate(identifier.indexOf('+') < 0 ? identifier.size() : identifier.indexOf('+'));
+    return espeak_SetVoiceByName(QByteArray(identifier + suffix).constData()) == EE_OK;
+}
+
 } // namespace
 
 EspeakEngine &EspeakEngine::instance()
@@ -71,13 +97,10 @@ std::optional<PcmAudio> EspeakEngine::render(
     }
     m_cancelled = false;
 
-    QByteArray name = voice.engineVoice.toUtf8();
-    if (!voice.engineVariant.isEmpty()) {
-        name += '+' + voice.engineVariant.toUtf8();
-    }
-    if (espeak_SetVoiceByName(name.constData()) != EE_OK) {
+    if (!selectVoice(voice.engineVoice, voice.engineVariant,
+            voice.attributes.value(VoiceAttribute::Gender).toString())) {
         if (error) {
-            *error = QStringLiteral("espeak-ng has no voice '%1'").arg(QString::fromUtf8(name));
+            *error = QStringLiteral("espeak-ng has no voice or language '%1'").arg(voice.engineVoice);
         }
         return std::nullopt;
     }
