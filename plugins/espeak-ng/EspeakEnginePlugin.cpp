@@ -1,27 +1,22 @@
-#include "EspeakEngine.h"
-
-#include "Logging.h"
-
-#include <QMutex>
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "EspeakEnginePlugin.h"
 
 #include <espeak-ng/speak_lib.h>
 
-namespace Cadenza::Platform {
+namespace Cadenza::Engines {
+
+using Platform::PcmAudio;
+using Platform::SynthesisParameters;
+using Platform::VoiceDescription;
 
 namespace {
-
-QMutex &engineMutex()
-{
-    static QMutex mutex;
-    return mutex;
-}
 
 struct RenderTarget
 {
     std::vector<qint16> *samples = nullptr;
     std::atomic<bool> *cancelled = nullptr;
 };
-RenderTarget currentTarget; // guarded by engineMutex()
+RenderTarget currentTarget; // guarded by the plugin's mutex: espeak-ng has one synthesiser
 
 int collectSamples(short *wav, int count, espeak_EVENT *)
 {
@@ -46,7 +41,9 @@ bool selectVoice(const QString &engineVoice, const QString &variant, const QStri
     }
     espeak_VOICE wanted {};
     wanted.languages = name.constData();
-    wanted.gender = gender == VoiceGender::Male ? 1 : gender == VoiceGender::Female ? 2 : 0;
+    wanted.gender = gender == Platform::VoiceGender::Male ? 1
+        : gender == Platform::VoiceGender::Female         ? 2
+                                                          : 0;
     if (espeak_SetVoiceByProperties(&wanted) != EE_OK) {
         return false;
     }
@@ -62,13 +59,7 @@ bool selectVoice(const QString &engineVoice, const QString &variant, const QStri
 
 } // namespace
 
-EspeakEngine &EspeakEngine::instance()
-{
-    static EspeakEngine engine;
-    return engine;
-}
-
-bool EspeakEngine::initialise(QString *error)
+bool EspeakEnginePlugin::initialise(QString *error)
 {
     if (m_initialised) {
         return m_sampleRate > 0;
@@ -85,10 +76,10 @@ bool EspeakEngine::initialise(QString *error)
     return true;
 }
 
-std::optional<PcmAudio> EspeakEngine::render(
-    const VoiceDescription &voice, const SpeechRequest &request, QString *error)
+std::optional<PcmAudio> EspeakEnginePlugin::render(
+    const VoiceDescription &voice, const QString &text, const SynthesisParameters &parameters, QString *error)
 {
-    QMutexLocker locker(&engineMutex());
+    QMutexLocker locker(&m_mutex);
     if (!initialise(error)) {
         if (error && error->isEmpty()) {
             *error = QStringLiteral("the espeak-ng engine could not start");
@@ -98,25 +89,24 @@ std::optional<PcmAudio> EspeakEngine::render(
     m_cancelled = false;
 
     if (!selectVoice(voice.engineVoice, voice.engineVariant,
-            voice.attributes.value(VoiceAttribute::Gender).toString())) {
+            voice.attributes.value(Platform::VoiceAttribute::Gender).toString())) {
         if (error) {
             *error = QStringLiteral("espeak-ng has no voice or language '%1'").arg(voice.engineVoice);
         }
         return std::nullopt;
     }
-    const double rate = request.wordsPerMinute > 0 ? request.wordsPerMinute : voice.engineRate;
-    const double pitch = request.pitch > 0 ? request.pitch : voice.enginePitch;
-    espeak_SetParameter(espeakRATE, int(qBound(80.0, rate, 450.0)), 0);
-    espeak_SetParameter(espeakPITCH, int(qBound(0.0, pitch, 100.0)), 0);
+    // espeak-ng speaks in words per minute and takes its pitch base on the same 0..100 scale.
+    espeak_SetParameter(espeakRATE, qRound(parameters.wordsPerMinute), 0);
+    espeak_SetParameter(espeakPITCH, qRound(parameters.pitch), 0);
     // espeak-ng's volume runs 0..200 with 100 as normal loudness.
-    espeak_SetParameter(espeakVOLUME, int(qBound(0.0, request.volume, 1.0) * 100.0), 0);
+    espeak_SetParameter(espeakVOLUME, qRound(parameters.volume * 100.0), 0);
 
     PcmAudio audio;
     audio.sampleRate = m_sampleRate;
     currentTarget = {&audio.samples, &m_cancelled};
-    const QByteArray text = request.text.toUtf8();
+    const QByteArray utf8 = text.toUtf8();
     const espeak_ERROR result = espeak_Synth(
-        text.constData(), size_t(text.size()) + 1, 0, POS_CHARACTER, 0, espeakCHARS_UTF8, nullptr, nullptr);
+        utf8.constData(), size_t(utf8.size()) + 1, 0, POS_CHARACTER, 0, espeakCHARS_UTF8, nullptr, nullptr);
     espeak_Synchronize();
     currentTarget = {};
     if (result != EE_OK) {
@@ -128,9 +118,4 @@ std::optional<PcmAudio> EspeakEngine::render(
     return audio;
 }
 
-void EspeakEngine::cancel()
-{
-    m_cancelled = true;
-}
-
-} // namespace Cadenza::Platform
+} // namespace Cadenza::Engines
