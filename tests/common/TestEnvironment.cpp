@@ -116,7 +116,7 @@ QString TestEnvironment::writeFliteVoiceBundle(
 
 void TestEnvironment::installSampleVoices() const
 {
-    const QString source = QStringLiteral(CADENZA_SOURCE_DIR "/data/sample-voices");
+    const QString source = QStringLiteral(CADENZA_SAMPLE_VOICES); // completed at build time
     const QString target = Platform::Paths::systemVoicesFolder();
     QDirIterator it(source, QDir::Files, QDirIterator::Subdirectories);
     while (it.hasNext()) {

@@ -37,7 +37,7 @@ public:
     static QVariantMap voiceAttributes(const QString &identifier, const QString &name, const QString &locale,
         const QString &gender = QStringLiteral("VoiceGenderFemale"));
 
-    /// Copies the shipped sample voices into the system voice folder of this world.
+    /// Copies the sample voices, as the build completed them, into the system voice folder of this world.
     void installSampleVoices() const;
 
 private:

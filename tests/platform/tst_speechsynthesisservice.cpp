@@ -361,8 +361,8 @@ private Q_SLOTS:
     {
         QTest::addColumn<QString>("folder");
         QTest::addColumn<QString>("bundle");
-        for (const QString &folder : {QStringLiteral(CADENZA_SOURCE_DIR "/data/sample-voices"),
-                 QStringLiteral(CADENZA_SOURCE_DIR "/data/sample-repository/voices")}) {
+        for (const QString &folder : {QStringLiteral(CADENZA_SAMPLE_VOICES),
+                 QStringLiteral(CADENZA_SAMPLE_REPOSITORY_BUNDLES "/voices")}) {
             const QStringList bundles = QDir(folder).entryList(
                 {QStringLiteral("*.SpeechVoice")}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Name);
             QVERIFY(!bundles.isEmpty());
