@@ -23,6 +23,8 @@ public:
 
     /// Sends at most @p bytes per second (0: as fast as possible).
     void setBytesPerSecond(qint64 bytes) { m_bytesPerSecond = bytes; }
+    /// Makes every transfer last about @p seconds, whatever the file's size (0: off).
+    void setSecondsPerTransfer(double seconds) { m_secondsPerTransfer = seconds; }
     /// Drops the next transfer after @p bytes of its body.
     void dropNextTransferAfter(qint64 bytes) { m_dropAfter = bytes; }
 
@@ -35,6 +37,7 @@ private:
     QString m_root;
     QTcpServer m_server;
     qint64 m_bytesPerSecond = 0;
+    double m_secondsPerTransfer = 0;
     qint64 m_dropAfter = -1;
     int m_requests = 0;
     int m_rangeRequests = 0;
