@@ -16,6 +16,22 @@ for f in lib/cmake/Cadenza/CadenzaConfig.cmake include/cadenza/voice-popup/CZVoi
          share/polkit-1/actions/org.cadenza.remove-speech-bundle.policy share/cadenza/SpeechDataDefaults.plist; do
   [ -e "$prefix/$f" ] || { echo "not installed: $f" >&2; exit 1; }
 done
+# The installed library finds its installed engine plugins: a flite voice and an espeak-ng voice speak
+# through the installed cadenza.
+libdir=$(dirname "$(find "$prefix" -name 'libcadenzacore.so.*' -type f | head -1)")
+for plugin in cadenza_espeak_ng.so cadenza_flite.so; do
+  [ -e "$libdir/cadenza/speech-engines/$plugin" ] || { echo "not installed: $plugin" >&2; exit 1; }
+done
+mkdir -p "$work/data/cadenza/voices" "$work/config"
+cp -R "$build/data/sample-voices/MarenPremium.SpeechVoice" "$build/data/sample-voices/MarenCompact.SpeechVoice" \
+  "$work/data/cadenza/voices/"
+for quality in premium compact; do
+  env -u CADENZA_PLUGIN_PATH LD_LIBRARY_PATH="$libdir" XDG_DATA_HOME="$work/data" XDG_CONFIG_HOME="$work/config" \
+    CADENZA_ROOT="$work/root" "$prefix/bin/cadenza" say --voice "com.vendra.speech.synthesis.voice.maren.$quality" \
+    --output "$work/$quality.wav" "Hello from the installed engines."
+  [ -s "$work/$quality.wav" ] || { echo "the installed cadenza did not speak with maren.$quality" >&2; exit 1; }
+done
+
 if find "$prefix/include" -name '*_p.h' | grep -q .; then
   echo "private headers were installed" >&2
   exit 1
