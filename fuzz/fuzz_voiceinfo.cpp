@@ -22,9 +22,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
         return 0;
     }
     // What the voice list and the speech engine rely on for every accepted voice.
-    if (voice->identifier.isEmpty() || voice->groups.isEmpty() || voice->engineVoice.isEmpty()
-        || voice->enginePitch < 0 || voice->enginePitch > 100 || voice->engineRate < 80
-        || voice->engineRate > 450
+    if (voice->identifier.isEmpty() || voice->groups.isEmpty() || voice->engineName.isEmpty()
+        || (voice->engineName == u"espeak-ng" && voice->engineVoice.isEmpty()) || voice->enginePitch < 0
+        || voice->enginePitch > 100 || voice->engineRate < 80 || voice->engineRate > 450
         || voice->attributes.value(VoiceAttribute::Identifier).toString() != voice->identifier) {
         __builtin_trap();
     }

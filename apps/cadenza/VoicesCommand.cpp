@@ -6,6 +6,7 @@
 #include "platform/Locale.h"
 #include "platform/LocalizationTable.h"
 #include "platform/Services.h"
+#include "platform/SpeechEngines.h"
 #include "platform/SpeechSynthesisService.h"
 #include "voices/SpeechSynthesizer.h"
 
@@ -24,6 +25,8 @@ namespace {
 struct VoiceLine
 {
     QString identifier, name, locale, language, country, gender;
+    QString engine; ///< the speech engine the voice's bundle names
+    bool engineInstalled = true;
     bool isDefault = false;
 };
 
@@ -88,6 +91,10 @@ int VoicesCommand::run(const QStringList &arguments)
         line.country = displayName(displayLocale, Platform::Locale::CountryCodeKey, parts.countryCode);
         line.gender = genderText(attributes.value(VoiceAttribute::Gender).toString(), table);
         line.isDefault = identifier == defaultVoice;
+        if (const auto voice = service.voice(identifier)) {
+            line.engine = voice->engineName;
+            line.engineInstalled = SpeechEngines::isAvailable(line.engine);
+        }
         lines.append(line);
     }
 
@@ -97,7 +104,9 @@ int VoicesCommand::run(const QStringList &arguments)
             array.append(QJsonObject {{QStringLiteral("identifier"), line.identifier},
                 {QStringLiteral("name"), line.name}, {QStringLiteral("locale"), line.locale},
                 {QStringLiteral("language"), line.language}, {QStringLiteral("country"), line.country},
-                {QStringLiteral("gender"), line.gender}, {QStringLiteral("default"), line.isDefault}});
+                {QStringLiteral("gender"), line.gender}, {QStringLiteral("default"), line.isDefault},
+                {QStringLiteral("engine"), line.engine},
+                {QStringLiteral("engineInstalled"), line.engineInstalled}});
         }
         std::fputs(QJsonDocument(array).toJson(QJsonDocument::Indented).constData(), stdout);
         return 0;

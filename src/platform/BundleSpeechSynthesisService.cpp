@@ -1,12 +1,13 @@
 #include "BundleSpeechSynthesisService.h"
 
-#include "EspeakEngine.h"
 #include "Locale.h"
 #include "Logging.h"
 #include "Paths.h"
 #include "PreferencesStore.h"
 #include "PropertyList.h"
 #include "Services.h"
+#include "SpeechEngine.h"
+#include "SpeechEngines.h"
 
 #include <QAudioDevice>
 #include <QAudioFormat>
@@ -35,6 +36,66 @@ QString stampKey(const QString &folder, qint64 modifiedNs, quint64 inode)
         + QString::number(inode);
 }
 
+/// The request's figures resolved against the voice, the same for every engine.
+SynthesisParameters parametersFor(const VoiceDescription &voice, const SpeechRequest &request)
+{
+    SynthesisParameters parameters;
+    parameters.normalWordsPerMinute = voice.engineRate;
+    parameters.wordsPerMinute
+        = qBound(80.0, request.wordsPerMinute > 0 ? request.wordsPerMinute : double(voice.engineRate), 450.0);
+    parameters.normalPitch = voice.enginePitch;
+    parameters.pitch = qBound(0.0, request.pitch > 0 ? request.pitch : double(voice.enginePitch), 100.0);
+    parameters.volume = qBound(0.0, request.volume, 1.0);
+    return parameters;
+}
+
+/// Renders with the engine the voice names; a missing engine or a voice it refuses is a readable error.
+std::optional<PcmAudio> render(const VoiceDescription &voice, const SpeechRequest &request, QString *error)
+{
+    QString reason;
+    std::optional<PcmAudio> audio;
+    if (SpeechEngine *engine = SpeechEngines::engine(voice.engineName, &reason)) {
+        audio = engine->render(voice, request.text, parametersFor(voice, request), &reason);
+    }
+    if (!audio && error) {
+        *error = QStringLiteral("the voice '%1' cannot speak: %2")
+                     .arg(voice.attributes.value(VoiceAttribute::Name).toString(), reason);
+    }
+    return audio;
+}
+
+void cancelEngine(const QString &name)
+{
+    if (SpeechEngines::isAvailable(name)) {
+        if (SpeechEngine *engine = SpeechEngines::engine(name, nullptr)) {
+            engine->cancel();
+        }
+    }
+}
+
+/// Says once per process and engine that voices are listed which cannot speak.
+void reportMissingEngines(const QList<VoiceDescription> &voices)
+{
+    static QMutex mutex;
+    static QSet<QString> reported;
+    QHash<QString, QStringList> missing;
+    for (const auto &voice : voices) {
+        if (!SpeechEngines::isAvailable(voice.engineName)) {
+            missing[voice.engineName].append(voice.attributes.value(VoiceAttribute::Name).toString());
+        }
+    }
+    QMutexLocker locker(&mutex);
+    for (auto it = missing.cbegin(); it != missing.cend(); ++it) {
+        if (!reported.contains(it.key())) {
+            reported.insert(it.key());
+            QString reason;
+            (void)SpeechEngines::isAvailable(it.key(), &reason);
+            qCWarning(lcVoices, "Listing %s, which cannot speak: %s",
+                qPrintable(it.value().join(QStringLiteral(", "))), qPrintable(reason));
+        }
+    }
+}
+
 } // namespace
 
 BundleSpeechSynthesisService::BundleSpeechSynthesisService(QObject *parent)
@@ -44,7 +105,7 @@ BundleSpeechSynthesisService::BundleSpeechSynthesisService(QObject *parent)
 BundleSpeechSynthesisService::~BundleSpeechSynthesisService()
 {
     if (m_currentRequest) {
-        EspeakEngine::instance().cancel();
+        cancelEngine(m_currentEngine);
     }
     delete m_sink;
     delete m_buffer;
@@ -123,6 +184,7 @@ QList<VoiceDescription> BundleSpeechSynthesisService::installedVoices()
     }
     std::sort(merged.begin(), merged.end(),
         [](const VoiceDescription &a, const VoiceDescription &b) { return a.identifier < b.identifier; });
+    reportMissingEngines(merged);
     m_merged = merged;
     m_mergedKey = key;
     ++m_generation;
@@ -170,7 +232,7 @@ bool BundleSpeechSynthesisService::renderToFile(
         }
         return false;
     }
-    const auto audio = EspeakEngine::instance().render(*voice, request, error);
+    const auto audio = render(*voice, request, error);
     return audio && WaveFile::write(wavPath, *audio, error);
 }
 
@@ -183,11 +245,12 @@ quint64 BundleSpeechSynthesisService::startSpeaking(const SpeechRequest &request
     stopSpeaking();
     const quint64 requestId = m_nextRequest++;
     m_currentRequest = requestId;
+    m_currentEngine = voice->engineName;
     m_renderedVolume = request.volume;
     QPointer<BundleSpeechSynthesisService> self(this);
     QThreadPool::globalInstance()->start([self, requestId, voice = *voice, request] {
         QString error;
-        auto audio = EspeakEngine::instance().render(voice, request, &error);
+        auto audio = render(voice, request, &error);
         if (!self) {
             return;
         }
@@ -278,7 +341,7 @@ void BundleSpeechSynthesisService::setSpeakingVolume(double volume)
 void BundleSpeechSynthesisService::stopSpeaking()
 {
     if (m_currentRequest) {
-        EspeakEngine::instance().cancel();
+        cancelEngine(m_currentEngine);
         finishCurrent(false);
     }
 }

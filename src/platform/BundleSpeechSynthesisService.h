@@ -15,7 +15,8 @@ namespace Cadenza::Platform {
 
 /**
  * The Linux speech synthesis service: voices are the ".SpeechVoice" bundles of the voice folders
- * (user, local, system; the first folder holding an identifier wins), spoken by espeak-ng.
+ * (user, local, system; the first folder holding an identifier wins), each spoken by the engine
+ * plugin its bundle names (see SpeechEngines).
  *
  * A folder is scanned again only when its modification time changes, which an installation's final
  * rename always does. Speech is rendered on a worker thread and played on the default audio output;
@@ -61,6 +62,7 @@ private:
 
     quint64 m_nextRequest = 1;
     quint64 m_currentRequest = 0;
+    QString m_currentEngine; ///< the engine rendering the current request
     QPointer<QAudioSink> m_sink;
     QBuffer *m_buffer = nullptr;
     double m_renderedVolume = 1.0; ///< the loudness the playing samples were rendered at

@@ -20,7 +20,7 @@ struct CADENZACORE_EXPORT SpeechRequest
     QString text;
     QString voiceIdentifier; ///< empty: the ordinary default voice
     double wordsPerMinute = 0; ///< 0: the voice's normal rate
-    double pitch = 0; ///< espeak-ng base pitch 1..100; 0: the voice's own
+    double pitch = 0; ///< pitch on the 0..100 pitch scale (see SynthesisParameters); 0: the voice's own
     double volume = 1.0; ///< 0..1
 };
 

@@ -132,13 +132,18 @@ std::optional<VoiceDescription> VoiceDescription::fromInfo(const QVariantMap &in
 
     const QVariant engine = info.value(QStringLiteral("Engine"));
     const QVariantMap engineMap = engine.typeId() == QMetaType::QVariantMap ? engine.toMap() : QVariantMap();
+    voice.engineSettings = engineMap;
+    voice.engineName = stringValue(engineMap, QStringLiteral("Name"));
+    if (voice.engineName.isEmpty()) {
+        voice.engineName = QStringLiteral("espeak-ng");
+    }
     voice.engineVoice = stringValue(engineMap, QStringLiteral("Voice"));
     voice.engineVariant = stringValue(engineMap, QStringLiteral("Variant"));
     voice.enginePitch
         = int(std::clamp<qint64>(integerValue(engineMap, QStringLiteral("Pitch")).value_or(50), 0, 100));
     voice.engineRate
         = int(std::clamp<qint64>(integerValue(engineMap, QStringLiteral("Rate")).value_or(175), 80, 450));
-    if (voice.engineVoice.isEmpty()) {
+    if (voice.engineVoice.isEmpty() && voice.engineName == QLatin1String("espeak-ng")) {
         voice.engineVoice = QStringLiteral("en");
     }
     return voice;

@@ -48,10 +48,12 @@ struct CADENZACORE_EXPORT VoiceDescription
     QVariantMap attributes; ///< always holds VoiceAttribute::Identifier
     QStringList groups;
     std::optional<std::pair<qint32, qint32>> spec; ///< (creator, id)
-    QString engineVoice; ///< espeak-ng voice name, such as "en-us"
+    QString engineName; ///< the engine that speaks the voice, such as "espeak-ng" or "flite"
+    QString engineVoice; ///< the engine's voice: an espeak-ng voice or language ("en-us"), a flite voice file
     QString engineVariant; ///< espeak-ng variant, such as "f2"; may be empty
-    int enginePitch = 50; ///< espeak-ng base pitch, 0..100
+    int enginePitch = 50; ///< the voice's own pitch on the 0..100 pitch scale
     int engineRate = 175; ///< words per minute at normal speed
+    QVariantMap engineSettings; ///< the bundle's whole "Engine" dictionary, for keys of the engine's own
 
     [[nodiscard]] static VoiceQuality qualityOf(const QString &identifier);
     /// The identifier without ".premium" or ".compact".

@@ -105,6 +105,64 @@ private Q_SLOTS:
         QVERIFY(languages.size() >= 6);
     }
 
+    /// Each voice says which engine speaks it, and every listed voice speaks through "say".
+    void everyListedVoiceSaysItsEngineAndSpeaks()
+    {
+        const Result r
+            = cadenza({QStringLiteral("voices"), QStringLiteral("--all"), QStringLiteral("--json")});
+        QCOMPARE(r.exitCode, 0);
+        const QJsonArray voices = QJsonDocument::fromJson(r.out.toUtf8()).array();
+        QVERIFY(!voices.isEmpty());
+        QSet<QString> engines;
+        for (const auto &value : voices) {
+            const QJsonObject voice = value.toObject();
+            const QString identifier = voice.value(QStringLiteral("identifier")).toString();
+            const QString engine = voice.value(QStringLiteral("engine")).toString();
+            engines.insert(engine);
+            QVERIFY2(voice.value(QStringLiteral("engineInstalled")).toBool(), qPrintable(identifier));
+            if (identifier.endsWith(QStringLiteral("maren.premium"))
+                || identifier.endsWith(QStringLiteral("tobias.premium"))) {
+                QCOMPARE(engine, QStringLiteral("flite"));
+            } else {
+                QCOMPARE(engine, QStringLiteral("espeak-ng"));
+            }
+            const QString path = m_environment->path(QStringLiteral("voice.wav"));
+            QFile::remove(path);
+            const Result said = cadenza({QStringLiteral("say"), QStringLiteral("--voice"), identifier,
+                QStringLiteral("--output"), path, QStringLiteral("One, two, three.")});
+            QVERIFY2(said.exitCode == 0, qPrintable(identifier + QLatin1Char(' ') + said.err));
+            QString error;
+            const auto audio = Cadenza::Platform::WaveFile::read(path, &error);
+            QVERIFY2(
+                audio && audio->rootMeanSquare() > 300.0, qPrintable(identifier + QLatin1Char(' ') + error));
+        }
+        QCOMPARE(engines, (QSet<QString> {QStringLiteral("espeak-ng"), QStringLiteral("flite")}));
+    }
+
+    /// An upgrade must be heard: the premium quality is the flite voice, not its compact twin again.
+    void premiumAndCompactQualitiesDiffer()
+    {
+        const QString text = QStringLiteral("Hello, my name is Maren.");
+        QByteArray rendered[2];
+        int index = 0;
+        for (const QString &quality : {QStringLiteral("compact"), QStringLiteral("premium")}) {
+            const QString path = m_environment->path(quality + QStringLiteral(".wav"));
+            const Result said = cadenza({QStringLiteral("say"), QStringLiteral("--voice"),
+                QStringLiteral("com.vendra.speech.synthesis.voice.maren.") + quality,
+                QStringLiteral("--output"), path, text});
+            QVERIFY2(said.exitCode == 0, qPrintable(said.err));
+            QFile file(path);
+            QVERIFY(file.open(QIODevice::ReadOnly));
+            rendered[index++] = file.readAll();
+            QString error;
+            const auto audio = Cadenza::Platform::WaveFile::read(path, &error);
+            QVERIFY2(audio, qPrintable(error));
+            // espeak-ng renders at 22050 Hz, the flite voices at 16000 Hz.
+            QCOMPARE(audio->sampleRate, quality == u"premium" ? 16000 : 22050);
+        }
+        QVERIFY(rendered[0] != rendered[1]);
+    }
+
     void sayWritesAudibleSpeech()
     {
         const QString path = m_environment->path(QStringLiteral("x.wav"));

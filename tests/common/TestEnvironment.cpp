@@ -6,6 +6,7 @@
 #include "platform/PropertyList.h"
 #include "platform/Services.h"
 
+#include <QCryptographicHash>
 #include <QDir>
 #include <QDirIterator>
 #include <QFile>
@@ -81,9 +82,41 @@ QString TestEnvironment::writeVoiceBundle(
     return bundle;
 }
 
+QString TestEnvironment::writeFliteVoiceBundle(
+    const QString &folder, const QString &name, const QVariantMap &attributes, const QString &fliteVoice)
+{
+    const QString bundle = folder + QLatin1Char('/') + name + QStringLiteral(".SpeechVoice");
+    const QString fileName = QStringLiteral("cmu_us_%1.flitevox").arg(fliteVoice);
+    QDir().mkpath(bundle + QStringLiteral("/Resources"));
+    QFile source(QStringLiteral(CADENZA_FLITE_VOICES_DIR "/") + fileName);
+    if (!source.open(QIODevice::ReadOnly)) {
+        qFatal("cannot read %s", qPrintable(source.fileName()));
+    }
+    const QByteArray data = source.readAll();
+    QFile copy(bundle + QStringLiteral("/Resources/") + fileName);
+    if (!copy.open(QIODevice::WriteOnly) || copy.write(data) != data.size()) {
+        qFatal("cannot write %s", qPrintable(copy.fileName()));
+    }
+    const QVariantMap info {
+        {QStringLiteral("BundleIdentifier"), attributes.value(QStringLiteral("VoiceIdentifier"))},
+        {QStringLiteral("BundleVersion"), QStringLiteral("1.0")},
+        {QStringLiteral("Engine"),
+            QVariantMap {{QStringLiteral("Name"), QStringLiteral("flite")},
+                {QStringLiteral("Voice"), fileName}, {QStringLiteral("VoiceFileSize"), qint64(data.size())},
+                {QStringLiteral("VoiceFileSHA256"),
+                    QString::fromLatin1(
+                        QCryptographicHash::hash(data, QCryptographicHash::Sha256).toHex())}}},
+        {QStringLiteral("VoiceAttributes"), attributes}};
+    QFile file(bundle + QStringLiteral("/Info.plist"));
+    if (!file.open(QIODevice::WriteOnly) || file.write(Platform::PropertyList::serialize(info)) < 0) {
+        qFatal("cannot write %s", qPrintable(file.fileName()));
+    }
+    return bundle;
+}
+
 void TestEnvironment::installSampleVoices() const
 {
-    const QString source = QStringLiteral(CADENZA_SOURCE_DIR "/data/sample-voices");
+    const QString source = QStringLiteral(CADENZA_SAMPLE_VOICES); // completed at build time
     const QString target = Platform::Paths::systemVoicesFolder();
     QDirIterator it(source, QDir::Files, QDirIterator::Subdirectories);
     while (it.hasNext()) {

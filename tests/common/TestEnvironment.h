@@ -28,11 +28,16 @@ public:
     static QString writeVoiceBundle(const QString &folder, const QString &name, const QVariantMap &attributes,
         const QString &engineVoice = QStringLiteral("en-us"));
 
+    /// Writes a flite voice bundle "<folder>/<name>.SpeechVoice" carrying the flite voice @p fliteVoice
+    /// ("slt", "rms", "awb", written out at build time) in its Resources, described by size and SHA-256.
+    static QString writeFliteVoiceBundle(const QString &folder, const QString &name,
+        const QVariantMap &attributes, const QString &fliteVoice = QStringLiteral("slt"));
+
     /// Attributes of a test voice.
     static QVariantMap voiceAttributes(const QString &identifier, const QString &name, const QString &locale,
         const QString &gender = QStringLiteral("VoiceGenderFemale"));
 
-    /// Copies the shipped sample voices into the system voice folder of this world.
+    /// Copies the sample voices, as the build completed them, into the system voice folder of this world.
     void installSampleVoices() const;
 
 private:

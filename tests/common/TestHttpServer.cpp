@@ -92,9 +92,12 @@ void TestHttpServer::serve(QTcpSocket *socket)
 
     const qint64 dropAfter = std::exchange(m_dropAfter, -1);
     // Throttled: a tenth of a second's bytes every tenth of a second, so small files trickle too.
-    const qint64 chunk
-        = m_bytesPerSecond > 0 ? std::clamp<qint64>(m_bytesPerSecond / 10, 1, 64 * 1024) : 64 * 1024;
-    const int interval = m_bytesPerSecond > 0 ? 100 : 0;
+    // With a transfer time, each file's rate follows from its size, so large and small files last alike.
+    const qint64 rate = m_secondsPerTransfer > 0
+        ? qMax<qint64>(1, qint64((size - from) / m_secondsPerTransfer))
+        : m_bytesPerSecond;
+    const qint64 chunk = rate > 0 ? std::clamp<qint64>(rate / 10, 1, 64 * 1024) : 64 * 1024;
+    const int interval = rate > 0 ? 100 : 0;
     auto *timer = new QTimer(socket);
     timer->setInterval(interval);
     auto sent = std::make_shared<qint64>(0);

@@ -26,6 +26,8 @@ public:
 
     /// Sends at most @p bytes per second (0: as fast as possible).
     void setBytesPerSecond(qint64 bytes) { m_bytesPerSecond = bytes; }
+    /// Makes every transfer last about @p seconds, whatever the file's size (0: off).
+    void setSecondsPerTransfer(double seconds) { m_secondsPerTransfer = seconds; }
     /// Drops the next transfer after @p bytes of its body.
     void dropNextTransferAfter(qint64 bytes) { m_dropAfter = bytes; }
 
@@ -39,6 +41,7 @@ private:
     QTcpServer m_server;
     quint16 m_port = 0;
     qint64 m_bytesPerSecond = 0;
+    double m_secondsPerTransfer = 0;
     qint64 m_dropAfter = -1;
     int m_requests = 0;
     int m_rangeRequests = 0;

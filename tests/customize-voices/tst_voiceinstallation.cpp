@@ -47,10 +47,11 @@ private Q_SLOTS:
     {
         m_environment = std::make_unique<TestEnvironment>();
         m_environment->installSampleVoices();
-        // A slow server, so the download lasts long enough to be watched.
+        // A slow server, so each download lasts long enough to be watched: the upgrade of Orin is a
+        // flite voice of megabytes, Femke a few hundred bytes.
         m_http = std::make_unique<Testing::TestHttpServer>(QStringLiteral(CADENZA_SAMPLE_REPOSITORY));
         QVERIFY(m_http->listen());
-        m_http->setBytesPerSecond(120);
+        m_http->setSecondsPerTransfer(6);
         QVERIFY2(m_daemon.start({QStringLiteral("--repository"), m_http->baseUrl().toString()}),
             "quillond did not start");
     }

@@ -1,6 +1,8 @@
 #include "QuillondProcess.h"
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
+#include "platform/BundleSpeechSynthesisService.h"
+#include "platform/WaveFile.h"
 
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/InstallerProtocol.h"
@@ -210,6 +212,37 @@ private Q_SLOTS:
         QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/Big.SpeechVoice/Resources/data.bin")));
         QCOMPARE(QFileInfo(voicesFolder() + QStringLiteral("/Big.SpeechVoice/Resources/data.bin")).size(),
             m_payloadSize);
+    }
+
+    /// The upgrade of Orin carries a real flite voice of megabytes: it downloads over HTTP, survives a
+    /// dropped connection by resuming, installs, and then speaks as the flite voice.
+    void premiumFliteVoiceInstallsOverHttpResumesAndSpeaks()
+    {
+        TestHttpServer server(QStringLiteral(CADENZA_SAMPLE_REPOSITORY));
+        QVERIFY(server.listen());
+        server.dropNextTransferAfter(1024 * 1024 + 17);
+        startDaemon({QStringLiteral("--repository"), server.baseUrl().toString()});
+        const QString voice = QStringLiteral("com.vendra.speech.synthesis.voice.Orin");
+        QVERIFY(m_manager->_requestInstallation(
+            QStringLiteral("VOICEID:") + voice, QStringLiteral("Orin"), 1, voice, 0));
+        QVERIFY(waitForCompletion(InstalledCompletion, 30000));
+        QVERIFY(server.rangeRequestCount() >= 1);
+        const QString voiceFile
+            = voicesFolder() + QStringLiteral("/Orin.SpeechVoice/Resources/cmu_us_rms.flitevox");
+        QVERIFY(QFileInfo(voiceFile).size() > 2 * 1024 * 1024);
+
+        Platform::BundleSpeechSynthesisService service;
+        const auto installed = service.voice(voice);
+        QVERIFY(installed);
+        QCOMPARE(installed->engineName, QStringLiteral("flite"));
+        const QString wav = m_environment->path(QStringLiteral("orin.wav"));
+        QString error;
+        QVERIFY2(service.renderToFile({QStringLiteral("Hello, my name is Orin."), voice}, wav, &error),
+            qPrintable(error));
+        const auto audio = Platform::WaveFile::read(wav, &error);
+        QVERIFY2(audio, qPrintable(error));
+        QCOMPARE(audio->sampleRate, 16000);
+        QVERIFY(audio->rootMeanSquare() > 1000.0);
     }
 
     void aKilledDaemonLeavesNoHalfBundle()

@@ -50,7 +50,7 @@ wait_for() { # seconds, command...
   return 1
 }
 
-"$source/scripts/install-sample-voices" --root "$CADENZA_ROOT" >/dev/null
+CADENZA_BUILD_DIR="$build" "$source/scripts/install-sample-voices" --root "$CADENZA_ROOT" >/dev/null
 "$build/daemon/quillond" --repository "file://$build/data/repository" 2>"$world/quillond.log" &
 pids+=($!)
 wait_for 10 "$cli" status || fail "quillond did not start"

@@ -49,6 +49,22 @@ outside=$(find "$work/stage" -mindepth 1 -not -path "$work/stage/opt" -not -path
 
 cmake --install "$build" --prefix "$prefix" >/dev/null
 check_staged "$prefix" "$prefix"
+# The installed library finds its installed engine plugins: a flite voice and an espeak-ng voice speak
+# through the installed cadenza.
+libdir=$(dirname "$(find "$prefix" -name 'libcadenzacore.so.*' -type f | head -1)")
+for plugin in cadenza_espeak_ng.so cadenza_flite.so; do
+  [ -e "$libdir/cadenza/speech-engines/$plugin" ] || { echo "not installed: $plugin" >&2; exit 1; }
+done
+mkdir -p "$work/data/cadenza/voices" "$work/config"
+cp -R "$build/data/sample-voices/MarenPremium.SpeechVoice" "$build/data/sample-voices/MarenCompact.SpeechVoice" \
+  "$work/data/cadenza/voices/"
+for quality in premium compact; do
+  env -u CADENZA_PLUGIN_PATH LD_LIBRARY_PATH="$libdir" XDG_DATA_HOME="$work/data" XDG_CONFIG_HOME="$work/config" \
+    CADENZA_ROOT="$work/root" "$prefix/bin/cadenza" say --voice "com.vendra.speech.synthesis.voice.maren.$quality" \
+    --output "$work/$quality.wav" "Hello from the installed engines."
+  [ -s "$work/$quality.wav" ] || { echo "the installed cadenza did not speak with maren.$quality" >&2; exit 1; }
+done
+
 if find "$prefix/include" -name '*_p.h' | grep -q .; then
   echo "private headers were installed" >&2
   exit 1

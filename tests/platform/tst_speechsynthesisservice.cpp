@@ -5,10 +5,12 @@
 #include "platform/FakeUserLocaleService.h"
 #include "platform/Paths.h"
 #include "platform/PreferencesStore.h"
+#include "platform/PropertyList.h"
 #include "platform/Services.h"
 #include "platform/WaveFile.h"
 
 #include <QDir>
+#include <QDirIterator>
 #include <QFile>
 #include <QSignalSpy>
 #include <QTest>
@@ -254,6 +256,19 @@ private:
     std::shared_ptr<SpeechSynthesisService> m_service;
 };
 
+bool copyFolder(const QString &source, const QString &target)
+{
+    QDirIterator it(source, QDir::Files, QDirIterator::Subdirectories);
+    while (it.hasNext()) {
+        const QString file = it.next();
+        const QString destination = target + file.mid(source.size());
+        if (!QDir().mkpath(QFileInfo(destination).absolutePath()) || !QFile::copy(file, destination)) {
+            return false;
+        }
+    }
+    return true;
+}
+
 /// What only the bundle service can show: folders and bundles on disk.
 class BundleServiceTest : public QObject
 {
@@ -338,6 +353,82 @@ private Q_SLOTS:
         const auto voices = service.installedVoices();
         QCOMPARE(voices.size(), 1);
         QCOMPARE(voices.first().identifier, P + QStringLiteral("two"));
+    }
+
+    /// Every sample voice, installed or downloadable, must be heard: a voice that renders silence or
+    /// nothing is as broken as a missing one.
+    void everySampleVoiceSpeaksAudibly_data()
+    {
+        QTest::addColumn<QString>("folder");
+        QTest::addColumn<QString>("bundle");
+        for (const QString &folder : {QStringLiteral(CADENZA_SAMPLE_VOICES),
+                 QStringLiteral(CADENZA_SAMPLE_REPOSITORY_BUNDLES "/voices")}) {
+            const QStringList bundles = QDir(folder).entryList(
+                {QStringLiteral("*.SpeechVoice")}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Name);
+            QVERIFY(!bundles.isEmpty());
+            for (const QString &bundle : bundles) {
+                QTest::newRow(qPrintable(folder.section(QLatin1Char('/'), -1) + QLatin1Char('/') + bundle))
+                    << folder << bundle;
+            }
+        }
+    }
+
+    void everySampleVoiceSpeaksAudibly()
+    {
+        QFETCH(QString, folder);
+        QFETCH(QString, bundle);
+        TestEnvironment environment;
+        const auto voice = BundleSpeechSynthesisService::readBundle(folder + QLatin1Char('/') + bundle);
+        QVERIFY(voice);
+        QVERIFY(copyFolder(
+            folder + QLatin1Char('/') + bundle, Paths::userVoicesFolder() + QLatin1Char('/') + bundle));
+
+        BundleSpeechSynthesisService service;
+        const QString path = environment.path(QStringLiteral("voice.wav"));
+        QString error;
+        QVERIFY2(service.renderToFile(
+                     {voice->attributes.value(VoiceAttribute::DemoText).toString(), voice->identifier}, path,
+                     &error),
+            qPrintable(error));
+        const auto audio = WaveFile::read(path, &error);
+        QVERIFY2(audio, qPrintable(error));
+        QVERIFY2(audio->durationSeconds() > 0.5, qPrintable(QString::number(audio->durationSeconds())));
+        QVERIFY2(audio->rootMeanSquare() > 300.0, qPrintable(QString::number(audio->rootMeanSquare())));
+    }
+
+    /// espeak-ng knows "en-gb" only as a language; the variant must still reach the voice it finds.
+    void languageVoicesKeepTheirVariant()
+    {
+        TestEnvironment environment;
+        const QString folder = Paths::systemVoicesFolder();
+        for (const auto &[name, variant] : {std::pair {QStringLiteral("Plain"), QString()},
+                 std::pair {QStringLiteral("Whisper"), QStringLiteral("whisper")}}) {
+            const QString bundle = TestEnvironment::writeVoiceBundle(folder, name,
+                TestEnvironment::voiceAttributes(P + name.toLower(), name, QStringLiteral("en_GB")));
+            QVariantMap engine {{QStringLiteral("Voice"), QStringLiteral("en-gb")}};
+            if (!variant.isEmpty()) {
+                engine.insert(QStringLiteral("Variant"), variant);
+            }
+            QString error;
+            auto info = PropertyList::readFile(bundle + QStringLiteral("/Info.plist"), &error)->toMap();
+            info.insert(QStringLiteral("Engine"), engine);
+            QFile file(bundle + QStringLiteral("/Info.plist"));
+            QVERIFY(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
+            file.write(PropertyList::serialize(info));
+        }
+        BundleSpeechSynthesisService service;
+        std::vector<qint16> rendered[2];
+        int index = 0;
+        for (const QString &name : {QStringLiteral("plain"), QStringLiteral("whisper")}) {
+            const QString path = environment.path(name + QStringLiteral(".wav"));
+            QString error;
+            QVERIFY2(service.renderToFile({QStringLiteral("Good morning."), P + name}, path, &error),
+                qPrintable(error));
+            const auto audio = WaveFile::read(path, &error);
+            QVERIFY2(audio && audio->rootMeanSquare() > 300.0, qPrintable(error));
+            rendered[index++] = audio->samples;
+        }
+        QVERIFY(rendered[0] != rendered[1]);
     }
 
     void wrongTypesInInfoAreTreatedAsAbsent()
