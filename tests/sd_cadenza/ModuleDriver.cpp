@@ -5,6 +5,8 @@
 
 #include <QtEndian>
 
+#include <algorithm>
+
 ModuleDriver::~ModuleDriver()
 {
     if (m_process.state() != QProcess::NotRunning) {
@@ -117,4 +119,55 @@ QByteArrayList ModuleDriver::linesOf(const QList<Item> &items)
         lines.append(item.line);
     }
     return lines;
+}
+
+double ModuleDriver::medianPitchHz(const std::vector<qint16> &samples, int sampleRate)
+{
+    constexpr size_t Frame = 1024;
+    const int minLag = sampleRate / 500;
+    const int maxLag = sampleRate / 50;
+    std::vector<double> pitches;
+    for (size_t at = 0; at + Frame + size_t(maxLag) < samples.size(); at += Frame / 2) {
+        double energy = 0;
+        for (size_t i = 0; i < Frame; ++i) {
+            energy += double(samples[at + i]) * samples[at + i];
+        }
+        if (energy / Frame < 1000.0 * 1000.0) {
+            continue; // silence or a whisper: no pitch to find
+        }
+        int bestLag = 0;
+        double best = 0;
+        for (int lag = minLag; lag <= maxLag; ++lag) {
+            double sum = 0;
+            for (size_t i = 0; i < Frame; ++i) {
+                sum += double(samples[at + i]) * samples[at + i + size_t(lag)];
+            }
+            if (sum > best) {
+                best = sum;
+                bestLag = lag;
+            }
+        }
+        if (bestLag > 0 && best > 0.5 * energy) {
+            pitches.push_back(double(sampleRate) / bestLag);
+        }
+    }
+    if (pitches.empty()) {
+        return 0;
+    }
+    std::nth_element(pitches.begin(), pitches.begin() + long(pitches.size() / 2), pitches.end());
+    return pitches[pitches.size() / 2];
+}
+
+std::vector<qint16> ModuleDriver::samplesOfStream(const QByteArray &stream)
+{
+    std::vector<qint16> samples;
+    for (const QByteArray &line : stream.split('\n')) {
+        if (line.startsWith("705-AUDIO")) {
+            const QByteArray raw = SdCadenza::AudioSender::unescape(line.mid(10));
+            for (qsizetype i = 0; i + 1 < raw.size(); i += 2) {
+                samples.push_back(qFromLittleEndian<qint16>(raw.constData() + i));
+            }
+        }
+    }
+    return samples;
 }

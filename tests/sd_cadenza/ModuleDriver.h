@@ -37,6 +37,11 @@ public:
     /// The samples of @p items' audio blocks, in order.
     [[nodiscard]] static std::vector<qint16> samplesOf(const QList<Item> &items);
     [[nodiscard]] static QByteArrayList linesOf(const QList<Item> &items);
+    /// The samples of every audio event in @p stream, a capture of what a module wrote.
+    [[nodiscard]] static std::vector<qint16> samplesOfStream(const QByteArray &stream);
+    /// The median fundamental frequency of the voiced parts of @p samples, by autocorrelation; 0 when
+    /// nothing is voiced. Rises and falls with the pitch of a voice.
+    [[nodiscard]] static double medianPitchHz(const std::vector<qint16> &samples, int sampleRate);
     [[nodiscard]] QProcess &process() { return m_process; }
     [[nodiscard]] qint64 elapsedMs() const { return m_clock.elapsed(); }
 

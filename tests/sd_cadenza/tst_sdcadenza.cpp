@@ -40,44 +40,6 @@ QByteArray speak(const QByteArray &text)
     return "SPEAK\n" + text + "\n.\n";
 }
 
-/// The median fundamental frequency of the voiced frames, by autocorrelation.
-double medianPitchHz(const std::vector<qint16> &samples, int sampleRate)
-{
-    constexpr size_t Frame = 1024;
-    const int minLag = sampleRate / 500;
-    const int maxLag = sampleRate / 50;
-    std::vector<double> pitches;
-    for (size_t at = 0; at + Frame + size_t(maxLag) < samples.size(); at += Frame / 2) {
-        double energy = 0;
-        for (size_t i = 0; i < Frame; ++i) {
-            energy += double(samples[at + i]) * samples[at + i];
-        }
-        if (energy / Frame < 1000.0 * 1000.0) {
-            continue; // silence or a whisper: no pitch to find
-        }
-        int bestLag = 0;
-        double best = 0;
-        for (int lag = minLag; lag <= maxLag; ++lag) {
-            double sum = 0;
-            for (size_t i = 0; i < Frame; ++i) {
-                sum += double(samples[at + i]) * samples[at + i + size_t(lag)];
-            }
-            if (sum > best) {
-                best = sum;
-                bestLag = lag;
-            }
-        }
-        if (bestLag > 0 && best > 0.5 * energy) {
-            pitches.push_back(double(sampleRate) / bestLag);
-        }
-    }
-    if (pitches.empty()) {
-        return 0;
-    }
-    std::nth_element(pitches.begin(), pitches.begin() + long(pitches.size() / 2), pitches.end());
-    return pitches[pitches.size() / 2];
-}
-
 } // namespace
 
 class TestSdCadenza : public QObject
@@ -419,7 +381,7 @@ private Q_SLOTS:
         const QByteArray text = "<speak>Good morning, how are you today?</speak>";
         // Which voice spoke, told by its pitch: Ada's engine pitch is low, Bram's high.
         auto pitchOf = [&](const QByteArray &settings) {
-            return medianPitchHz(module.samplesOf(say(module, settings, text)), 22050);
+            return ModuleDriver::medianPitchHz(module.samplesOf(say(module, settings, text)), 22050);
         };
         const double ada = pitchOf("synthesis_voice=Ada\n");
         const double bram = pitchOf("synthesis_voice=Bram\n");
@@ -469,9 +431,9 @@ private Q_SLOTS:
         QVERIFY2(fastSamples.size() < normalSamples.size() * 0.7,
             qPrintable(QStringLiteral("%1 vs %2").arg(fastSamples.size()).arg(normalSamples.size())));
         const int rate = normal.first().sampleRate ? normal.first().sampleRate : 22050;
-        const double pitchNormal = medianPitchHz(normalSamples, rate);
-        const double pitchHigh = medianPitchHz(module.samplesOf(high), rate);
-        const double pitchLow = medianPitchHz(module.samplesOf(low), rate);
+        const double pitchNormal = ModuleDriver::medianPitchHz(normalSamples, rate);
+        const double pitchHigh = ModuleDriver::medianPitchHz(module.samplesOf(high), rate);
+        const double pitchLow = ModuleDriver::medianPitchHz(module.samplesOf(low), rate);
         QVERIFY2(pitchLow > 0 && pitchHigh > pitchNormal * 1.2 && pitchNormal > pitchLow * 1.2,
             qPrintable(QStringLiteral("%1 %2 %3").arg(pitchLow).arg(pitchNormal).arg(pitchHigh)));
     }
