@@ -4,12 +4,14 @@
 #include "platform/LocalizationTable.h"
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
+#include "platform/SpeechDispatcherModule.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-settings/SpeechSynthesizerVoiceSettings.h"
 #include "voices/SpeechSynthesizer.h"
 
 #include <QComboBox>
+#include <QCoreApplication>
 #include <QFormLayout>
 #include <QGroupBox>
 #include <QHBoxLayout>
@@ -38,6 +40,8 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     , m_languageStatus(new QLabel(this))
     , m_languageIndicator(new QProgressBar(this))
     , m_localeLists(new QComboBox(this))
+    , m_speechDispatcherButton(new QPushButton(this))
+    , m_speechDispatcherStatus(new QLabel(this))
 {
     setObjectName(QStringLiteral("settingsWindow"));
     setWindowTitle(text("SettingsSpeech"));
@@ -76,6 +80,18 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     voiceLayout->addLayout(form);
     voiceLayout->addLayout(buttons);
     voiceLayout->addWidget(m_voiceSettingsSummary);
+
+    // Other apps speak through speech-dispatcher; its per-user module folder offers them these voices.
+    m_speechDispatcherButton->setObjectName(QStringLiteral("speechDispatcherModuleButton"));
+    m_speechDispatcherStatus->setObjectName(QStringLiteral("speechDispatcherModuleStatus"));
+    m_speechDispatcherStatus->setWordWrap(true);
+    connect(
+        m_speechDispatcherButton, &QPushButton::clicked, this, &SettingsWindow::toggleSpeechDispatcherModule);
+    auto *otherApps = new QHBoxLayout;
+    otherApps->addWidget(m_speechDispatcherButton);
+    otherApps->addWidget(m_speechDispatcherStatus, 1);
+    voiceLayout->addLayout(otherApps);
+    showSpeechDispatcherModuleState();
 
     // Dictation: the language pop-up, its status, and which locale lists the recognition service offers.
     m_languagePopUp->setAccessibleName(text("SettingsDictationLanguageName"));
@@ -191,4 +207,28 @@ void SettingsWindow::showVoiceSettings()
                          .arg(qRound(m_voiceSettings.value(kVoiceSettingsCustomVolumeKey).toDouble() * 100)));
     }
     m_voiceSettingsSummary->setText(parts.join(QStringLiteral(", ")));
+}
+
+void SettingsWindow::showSpeechDispatcherModuleState()
+{
+    const bool installed = Platform::SpeechDispatcherModule::isInstalledForUser();
+    m_speechDispatcherButton->setText(
+        text(installed ? "SettingsSpeechDispatcherRemove" : "SettingsSpeechDispatcherInstall"));
+    m_speechDispatcherButton->setEnabled(installed
+        || !Platform::SpeechDispatcherModule::shippedModule(QCoreApplication::applicationDirPath())
+                .isEmpty());
+    m_speechDispatcherStatus->setText(installed ? text("SettingsSpeechDispatcherInstalled") : QString());
+}
+
+void SettingsWindow::toggleSpeechDispatcherModule()
+{
+    QString error;
+    const bool done = Platform::SpeechDispatcherModule::isInstalledForUser()
+        ? Platform::SpeechDispatcherModule::removeForUser(&error)
+        : Platform::SpeechDispatcherModule::installForUser(
+            Platform::SpeechDispatcherModule::shippedModule(QCoreApplication::applicationDirPath()), &error);
+    showSpeechDispatcherModuleState();
+    if (!done) {
+        m_speechDispatcherStatus->setText(error);
+    }
 }
