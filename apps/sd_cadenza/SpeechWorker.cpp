@@ -107,6 +107,16 @@ QStringList SpeechWorker::chunks(const QString &text, qsizetype maximum)
     }
     sentences.append(text.mid(from));
 
+    // The first sentence is cut at its first clause end: the listener hears the message begin as soon as
+    // that clause is rendered. The engine ends a clause at a comma anyway, so the cut is not heard.
+    static const QRegularExpression clauseEnd(QStringLiteral("[,;:、，]\\s+"));
+    if (const auto match = clauseEnd.match(sentences.first());
+        match.hasMatch() && match.capturedStart() >= 12) {
+        const QString first = sentences.takeFirst();
+        sentences.prepend(first.mid(match.capturedEnd()));
+        sentences.prepend(first.left(match.capturedEnd()));
+    }
+
     QStringList result;
     for (const QString &sentence : std::as_const(sentences)) {
         qsizetype at = 0;

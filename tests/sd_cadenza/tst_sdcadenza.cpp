@@ -219,6 +219,11 @@ private Q_SLOTS:
         QCOMPARE(SpeechWorker::chunks(QStringLiteral("Hello there. How are you? Fine!")),
             QStringList(
                 {QStringLiteral("Hello there."), QStringLiteral("How are you?"), QStringLiteral("Fine!")}));
+        // The first sentence is cut once more at its first clause end, so speech starts sooner.
+        QCOMPARE(
+            SpeechWorker::chunks(QStringLiteral("When the day is done, we go home, all of us. Then, sleep.")),
+            QStringList({QStringLiteral("When the day is done,"), QStringLiteral("we go home, all of us."),
+                QStringLiteral("Then, sleep.")}));
         const QString words = QStringLiteral("word ").repeated(500);
         const QStringList pieces = SpeechWorker::chunks(words, 100);
         QVERIFY(pieces.size() >= 25);
