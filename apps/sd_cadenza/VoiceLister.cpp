@@ -107,6 +107,18 @@ QList<VoiceLister::Voice> VoiceLister::voices()
             {name, field(bcp47(voice.attributes.value(VoiceAttribute::LocaleIdentifier).toString())),
                 genderOf(voice), voice.identifier});
     }
+    // Two different voices of one name (and quality): the language tells them apart, else the identifier.
+    for (const bool byLanguage : {true, false}) {
+        QHash<QString, int> count;
+        for (const Voice &voice : std::as_const(result)) {
+            ++count[voice.name];
+        }
+        for (Voice &voice : result) {
+            if (count.value(voice.name) > 1) {
+                voice.name += QStringLiteral(" (%1)").arg(byLanguage ? voice.language : voice.identifier);
+            }
+        }
+    }
     std::sort(result.begin(), result.end(), [](const Voice &a, const Voice &b) {
         return a.name == b.name ? a.identifier < b.identifier : a.name < b.name;
     });

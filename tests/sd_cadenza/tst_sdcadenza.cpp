@@ -379,6 +379,24 @@ private Q_SLOTS:
         QVERIFY(lines.contains("200-Ada (Compact)\ten-US\tfemale1"));
     }
 
+    void twoVoicesOfOneNameGetTwoNames()
+    {
+        TestEnvironment::writeVoiceBundle(Paths::systemVoicesFolder(), QStringLiteral("AdaGB"),
+            TestEnvironment::voiceAttributes(
+                QStringLiteral("org.example.voice.ada-gb"), QStringLiteral("Ada"), QStringLiteral("en_GB")));
+        TestEnvironment::writeVoiceBundle(Paths::systemVoicesFolder(), QStringLiteral("AdaGB2"),
+            TestEnvironment::voiceAttributes(
+                QStringLiteral("org.example.voice.ada-gb2"), QStringLiteral("Ada"), QStringLiteral("en_GB")));
+        ModuleDriver module;
+        startModule(module);
+        module.send("LIST VOICES\n");
+        QVERIFY(module.waitForLine("200 OK VOICE LIST SENT"));
+        const QByteArrayList lines = module.linesOf(module.takeItems());
+        QVERIFY2(lines.contains("200-Ada (en-US)\ten-US\tfemale1"), lines.join('|'));
+        QVERIFY(lines.contains("200-Ada (en-GB) (org.example.voice.ada-gb)\ten-GB\tfemale1"));
+        QVERIFY(lines.contains("200-Ada (en-GB) (org.example.voice.ada-gb2)\ten-GB\tfemale1"));
+    }
+
     void languageDefaultFollowsTheSelectedVoice()
     {
         ModuleDriver module;
