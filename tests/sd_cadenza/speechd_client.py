@@ -5,6 +5,7 @@
 #   speechd_client.py SOCKET list
 #   speechd_client.py SOCKET speak VOICE RATE PITCH TEXT
 #   speechd_client.py SOCKET stop VOICE TEXT        (speaks, cancels after the first BEGIN)
+# A TEXT of "-" is read from standard input.
 import json
 import sys
 import threading
@@ -35,7 +36,7 @@ elif command in ('speak', 'stop'):
     if command == 'speak':
         client.set_rate(int(sys.argv[4]))
         client.set_pitch(int(sys.argv[5]))
-    text = sys.argv[-1]
+    text = sys.stdin.read() if sys.argv[-1] == '-' else sys.argv[-1]
     client.speak(text, callback=callback, event_types=(speechd.CallbackType.BEGIN, speechd.CallbackType.END,
                                                      speechd.CallbackType.CANCEL))
     if command == 'stop':

@@ -35,13 +35,16 @@ private:
     QString m_capture;
 
     /// Runs the client with @p arguments and returns what it printed.
-    QJsonObject client(const QStringList &arguments)
+    /// A text argument of "-" is read from @p input.
+    QJsonObject client(const QStringList &arguments, const QByteArray &input = {})
     {
         QProcess process;
         process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
         process.start(QStringLiteral("/usr/bin/python3"),
             QStringList {QStringLiteral(CADENZA_SOURCE_DIR "/tests/sd_cadenza/speechd_client.py"), m_socket}
                 + arguments);
+        process.write(input);
+        process.closeWriteChannel();
         if (!process.waitForFinished(120000) || process.exitCode() != 0) {
             qWarning("the client failed: %s", qPrintable(arguments.join(QLatin1Char(' '))));
             return {};
@@ -195,8 +198,10 @@ private Q_SLOTS:
 
     void stopInterruptsALongText()
     {
-        const QString text = QStringLiteral("This long text would take hours to say. ").repeated(2000);
-        const QJsonObject result = client({QStringLiteral("stop"), QStringLiteral("Bram"), text});
+        // A megabyte: hours of speech.
+        const QByteArray text = QByteArray("This long text would take hours to say. ").repeated(25000);
+        const QJsonObject result
+            = client({QStringLiteral("stop"), QStringLiteral("Bram"), QStringLiteral("-")}, text);
         QVERIFY(result.value(QStringLiteral("begun")).toBool());
         QVERIFY(result.value(QStringLiteral("finished")).toBool());
         const QJsonArray events = result.value(QStringLiteral("events")).toArray();
