@@ -18,7 +18,7 @@ struct SpeechSettings
 {
     int rate = 0;
     int pitch = 0;
-    int volume = 100;
+    int volume = 0;
     QString language;
     QString voiceType; ///< "male1", "female1", ...
     QString synthesisVoice; ///< a voice name from LIST VOICES

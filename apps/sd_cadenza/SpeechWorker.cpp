@@ -153,7 +153,9 @@ std::optional<PcmAudio> SpeechWorker::render(
         pitch += 20;
     }
     synthesizer->setSpeechPitch(float(qBound(1.0, pitch, 100.0)));
-    const double volume = (qBound(-100, job.volume, 100) + 100) / 200.0;
+    // speech-dispatcher's 0 is the voice's normal loudness (its clients' usual setting); the samples
+    // cannot go louder than full scale without clipping, so only values below 0 make a difference.
+    const double volume = qMin(0, qBound(-100, job.volume, 100)) / 100.0 + 1.0;
     synthesizer->setObject(QVariant(qint64(volume * 65536)), SpeechSynthesizer::VolumeProperty, 4);
     if (!synthesizer->startSpeakingStringToFile(text, wavPath, error)) {
         return std::nullopt;

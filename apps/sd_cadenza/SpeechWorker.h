@@ -29,7 +29,7 @@ struct SpeechJob
     QString voiceIdentifier;
     int rate = 0; ///< -100..100, 0 the voice's normal rate
     int pitch = 0; ///< -100..100, 0 the voice's own pitch
-    int volume = 100; ///< -100..100
+    int volume = 0; ///< -100..100; 0 and above the voice's full loudness
     bool raisePitch = false; ///< a capital letter said on its own
 };
 

@@ -476,6 +476,9 @@ private Q_SLOTS:
         const double loud = rms(module.samplesOf(say(module, "synthesis_voice=Ada\nvolume=100\n", text)));
         const double soft = rms(module.samplesOf(say(module, "volume=-60\n", text)));
         QVERIFY2(loud > 0 && soft < loud * 0.5, qPrintable(QStringLiteral("%1 %2").arg(loud).arg(soft)));
+        // 0, what clients send unless told otherwise, is the voice's normal loudness, not half of it.
+        const double normal = rms(module.samplesOf(say(module, "volume=0\n", text)));
+        QVERIFY2(normal > loud * 0.8, qPrintable(QStringLiteral("%1 %2").arg(normal).arg(loud)));
     }
 
     void marksAndBreaksArriveInOrder()
