@@ -4,6 +4,7 @@
 #include "platform/LocalizationTable.h"
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
+#include "platform/SpeechDispatcherModule.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "speech-items/CZSpeechItem.h"
 #include "voice-popup/CZVoicePopUpButton.h"
@@ -12,6 +13,7 @@
 #include "voices/SpeechSynthesizer.h"
 
 #include <QComboBox>
+#include <QCoreApplication>
 #include <QFormLayout>
 #include <QGroupBox>
 #include <QHBoxLayout>
@@ -40,6 +42,8 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     , m_languageStatus(new QLabel(this))
     , m_languageIndicator(new QProgressBar(this))
     , m_localeLists(new QComboBox(this))
+    , m_speechDispatcherButton(new QPushButton(this))
+    , m_speechDispatcherStatus(new QLabel(this))
 {
     setObjectName(QStringLiteral("settingsWindow"));
     setWindowTitle(text("SettingsSpeech"));
@@ -78,6 +82,18 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     voiceLayout->addLayout(form);
     voiceLayout->addLayout(buttons);
     voiceLayout->addWidget(m_voiceSettingsSummary);
+
+    // Other apps speak through speech-dispatcher; its per-user module folder offers them these voices.
+    m_speechDispatcherButton->setObjectName(QStringLiteral("speechDispatcherModuleButton"));
+    m_speechDispatcherStatus->setObjectName(QStringLiteral("speechDispatcherModuleStatus"));
+    m_speechDispatcherStatus->setWordWrap(true);
+    connect(
+        m_speechDispatcherButton, &QPushButton::clicked, this, &SettingsWindow::toggleSpeechDispatcherModule);
+    auto *otherApps = new QHBoxLayout;
+    otherApps->addWidget(m_speechDispatcherButton);
+    otherApps->addWidget(m_speechDispatcherStatus, 1);
+    voiceLayout->addLayout(otherApps);
+    showSpeechDispatcherModuleState();
 
     // Dictation: the language pop-up, its status, and which locale lists the recognition service offers.
     m_languagePopUp->setAccessibleName(text("SettingsDictationLanguageName"));
@@ -199,4 +215,28 @@ void SettingsWindow::showVoiceSettings()
                              m_voiceSettings.value(kVoiceSettingsCustomVolumeKey).toDouble() * 100))));
     }
     m_voiceSettingsSummary->setText(parts.join(QStringLiteral(", ")));
+}
+
+void SettingsWindow::showSpeechDispatcherModuleState()
+{
+    const bool installed = Platform::SpeechDispatcherModule::isInstalledForUser();
+    m_speechDispatcherButton->setText(
+        text(installed ? "SettingsSpeechDispatcherRemove" : "SettingsSpeechDispatcherInstall"));
+    m_speechDispatcherButton->setEnabled(installed
+        || !Platform::SpeechDispatcherModule::shippedModule(QCoreApplication::applicationDirPath())
+                .isEmpty());
+    m_speechDispatcherStatus->setText(installed ? text("SettingsSpeechDispatcherInstalled") : QString());
+}
+
+void SettingsWindow::toggleSpeechDispatcherModule()
+{
+    QString error;
+    const bool done = Platform::SpeechDispatcherModule::isInstalledForUser()
+        ? Platform::SpeechDispatcherModule::removeForUser(&error)
+        : Platform::SpeechDispatcherModule::installForUser(
+            Platform::SpeechDispatcherModule::shippedModule(QCoreApplication::applicationDirPath()), &error);
+    showSpeechDispatcherModuleState();
+    if (!done) {
+        m_speechDispatcherStatus->setText(error);
+    }
 }

@@ -5,6 +5,7 @@
 #include <QWidget>
 
 class QLabel;
+class QPushButton;
 class QProgressBar;
 
 class QComboBox;
@@ -37,10 +38,13 @@ public:
     void systemVoiceChosen();
     void openVoiceSettingsWindow();
     void openVoiceSettingsSheet();
+    /// Installs speech-dispatcher's module for this user, or removes it when installed.
+    void toggleSpeechDispatcherModule();
 
 private:
     void showVoiceSettings();
     void rebuildLanguages();
+    void showSpeechDispatcherModuleState();
 
     Cadenza::CZVoicePopUpButton *m_voicePopUp;
     QLabel *m_downloadStatus;
@@ -51,6 +55,8 @@ private:
     QProgressBar *m_languageIndicator;
     QComboBox *m_localeLists;
     QVariantMap m_voiceSettings;
+    QPushButton *m_speechDispatcherButton;
+    QLabel *m_speechDispatcherStatus;
 };
 
 #endif

@@ -7,6 +7,7 @@
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
 #include "installation/InstallerProtocol.h"
+#include "platform/SpeechDispatcherModule.h"
 #include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "voice-settings/VoiceSettingsAlertController.h"
@@ -162,7 +163,31 @@ int main(int argc, char *argv[])
         QStringLiteral("Write screenshots of every window into <folder> and exit."),
         QStringLiteral("folder"));
     parser.addOption(screenshots);
+    const QCommandLineOption installModule(QStringLiteral("install-speech-dispatcher-module"),
+        QStringLiteral(
+            "Offer the Cadenza voices to other apps: install speech-dispatcher's module for this user "
+            "(~/.local/libexec/speech-dispatcher-modules/sd_cadenza) and exit."));
+    const QCommandLineOption removeModule(QStringLiteral("remove-speech-dispatcher-module"),
+        QStringLiteral("Remove the module that --install-speech-dispatcher-module installed and exit; other "
+                       "modules and speech-dispatcher's configuration stay as they are."));
+    parser.addOption(installModule);
+    parser.addOption(removeModule);
     parser.process(app);
+    if (parser.isSet(installModule) || parser.isSet(removeModule)) {
+        using Cadenza::Platform::SpeechDispatcherModule;
+        QString error;
+        const bool done = parser.isSet(installModule)
+            ? SpeechDispatcherModule::installForUser(
+                SpeechDispatcherModule::shippedModule(QCoreApplication::applicationDirPath()), &error)
+            : SpeechDispatcherModule::removeForUser(&error);
+        if (!done) {
+            std::fprintf(stderr, "cadenza-settings: %s\n", qPrintable(error));
+            return 1;
+        }
+        std::printf("%s %s\n", parser.isSet(installModule) ? "Installed" : "Removed",
+            qPrintable(SpeechDispatcherModule::userModulePath()));
+        return 0;
+    }
 
     // The main window is a plain widget; screen readers should meet it as a window.
     QAccessible::installFactory([](const QString &, QObject *object) -> QAccessibleInterface * {

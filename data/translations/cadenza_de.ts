@@ -575,6 +575,18 @@ Befehle:
         <source>Voice Settings as Sheet…</source>
         <translation>Stimmeinstellungen als Blatt …</translation>
     </message>
+    <message id="SettingsSpeechDispatcherInstall">
+        <source>Use Cadenza Voices in Other Apps</source>
+        <translation>Cadenza-Stimmen in anderen Apps verwenden</translation>
+    </message>
+    <message id="SettingsSpeechDispatcherRemove">
+        <source>Stop Using Cadenza Voices in Other Apps</source>
+        <translation>Cadenza-Stimmen nicht mehr in anderen Apps verwenden</translation>
+    </message>
+    <message id="SettingsSpeechDispatcherInstalled">
+        <source>Cadenza voices are offered to screen readers, browsers and other apps through speech-dispatcher.</source>
+        <translation>Cadenza-Stimmen stehen Bildschirmlesern, Browsern und anderen Apps über speech-dispatcher zur Verfügung.</translation>
+    </message>
     <message id="SettingsDictationLanguageName">
         <source>Dictation language</source>
         <translation>Diktiersprache</translation>

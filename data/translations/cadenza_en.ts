@@ -575,6 +575,18 @@ Run 'cadenza COMMAND --help' for the options of a command.</translation>
         <source>Voice Settings as Sheet…</source>
         <translation>Voice Settings as Sheet…</translation>
     </message>
+    <message id="SettingsSpeechDispatcherInstall">
+        <source>Use Cadenza Voices in Other Apps</source>
+        <translation>Use Cadenza Voices in Other Apps</translation>
+    </message>
+    <message id="SettingsSpeechDispatcherRemove">
+        <source>Stop Using Cadenza Voices in Other Apps</source>
+        <translation>Stop Using Cadenza Voices in Other Apps</translation>
+    </message>
+    <message id="SettingsSpeechDispatcherInstalled">
+        <source>Cadenza voices are offered to screen readers, browsers and other apps through speech-dispatcher.</source>
+        <translation>Cadenza voices are offered to screen readers, browsers and other apps through speech-dispatcher.</translation>
+    </message>
     <message id="SettingsDictationLanguageName">
         <source>Dictation language</source>
         <translation>Dictation language</translation>
