@@ -1,5 +1,6 @@
 // cadenza: Cadenza's command-line tool.
 
+#include "DictateCommand.h"
 #include "DownloadCommands.h"
 #include "InstallerCommands.h"
 #include "LanguagesCommand.h"
@@ -23,6 +24,7 @@ void printUsage(FILE *to)
         "  voices   list the installed voices\n"
         "  say      speak a text, or write it to a WAV file\n"
         "  languages list the installed and downloadable recognition languages\n"
+        "  dictate  print the words spoken in a WAV file\n"
         "  post     post a notification to every process of the session\n"
         "  notify   the same as post, e.g. cadenza notify DictationIMNotificationRecognizerDidPreHeat\n"
         "  status   show what the installer daemon is installing\n"
@@ -61,6 +63,9 @@ int main(int argc, char *argv[])
     }
     if (command == u"say") {
         return SayCommand::run(arguments);
+    }
+    if (command == u"dictate") {
+        return DictateCommand::run(arguments);
     }
     if (command == u"languages") {
         return LanguagesCommand::run(arguments);

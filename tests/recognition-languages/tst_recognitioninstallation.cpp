@@ -1,6 +1,7 @@
 // A dictation language from the pop-up's sheet to the menu, with the real daemon, the session bus and a
 // second process that plays the dictation engine.
 #include "QuillondProcess.h"
+#include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
 #include "installation/CZSpeechInstallationManager.h"
@@ -39,11 +40,10 @@ private Q_SLOTS:
         m_environment->installSampleVoices();
         // A German recognizer with a large model, packed into a repository of its own.
         const QString repository = m_environment->path(QStringLiteral("repository"));
-        const QString bundle = repository + QStringLiteral("/de_DE.SpeechRecognition");
-        QVERIFY(QDir().mkpath(bundle + QStringLiteral("/Resources")));
-        QVERIFY(QFile::copy(QStringLiteral(CADENZA_SOURCE_DIR
-                                "/data/sample-repository/recognizers/de_DE.SpeechRecognition/Info.plist"),
-            bundle + QStringLiteral("/Info.plist")));
+        // The test's own fixture: plausible pocketsphinx model files, so the language is listed once
+        // installed, plus a large file that makes the download take a while.
+        const QString bundle
+            = Testing::RecognizerFixture::writeTinyBundle(repository, QStringLiteral("de_DE"));
         QFile model(bundle + QStringLiteral("/Resources/model.bin"));
         QVERIFY(model.open(QIODevice::WriteOnly));
         QByteArray noise(ModelBytes, Qt::Uninitialized);

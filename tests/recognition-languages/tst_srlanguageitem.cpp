@@ -1,3 +1,4 @@
+#include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
 #include "platform/FakeSpeechSynthesisService.h"
@@ -211,19 +212,22 @@ private Q_SLOTS:
     void recognizerBundlesOnDisk()
     {
         Services::setRecognition(nullptr); // the bundle service, in this test's private world
-        auto bundle = [](const QString &folder, const QString &name, const QVariant &locale) {
-            QDir().mkpath(folder + QLatin1Char('/') + name);
-            QFile info(folder + QLatin1Char('/') + name + QStringLiteral("/Info.plist"));
-            QVERIFY(info.open(QIODevice::WriteOnly));
-            info.write(PropertyList::serialize(QVariantMap {{QStringLiteral("LocaleIdentifier"), locale}}));
-        };
-        bundle(Paths::userRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"),
-            QStringLiteral("de_DE"));
-        bundle(Paths::systemRecognizersFolder(), QStringLiteral("en_US.SpeechRecognition"),
-            QStringLiteral("en-US"));
-        bundle(Paths::systemRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"),
-            QStringLiteral("de_DE"));
-        bundle(Paths::systemRecognizersFolder(), QStringLiteral("odd.SpeechRecognition"), 5);
+        // Listed only with a model their engine accepts: the fixtures carry small plausible model files.
+        Testing::RecognizerFixture::writeTinyBundle(Paths::userRecognizersFolder(), QStringLiteral("de_DE"),
+            QStringLiteral("de_DE.SpeechRecognition"));
+        Testing::RecognizerFixture::writeTinyBundle(Paths::systemRecognizersFolder(), QStringLiteral("en-US"),
+            QStringLiteral("en_US.SpeechRecognition"));
+        Testing::RecognizerFixture::writeTinyBundle(Paths::systemRecognizersFolder(), QStringLiteral("de_DE"),
+            QStringLiteral("de_DE.SpeechRecognition"));
+        Testing::RecognizerFixture::writeBareBundle(Paths::systemRecognizersFolder(),
+            QStringLiteral("odd.SpeechRecognition"), {{QStringLiteral("LocaleIdentifier"), 5}});
+        // A bundle without a model is not a language.
+        Testing::RecognizerFixture::writeBareBundle(Paths::systemRecognizersFolder(),
+            QStringLiteral("fr_FR.SpeechRecognition"),
+            {{QStringLiteral("LocaleIdentifier"), QStringLiteral("fr_FR")}});
+        QTest::ignoreMessage(QtWarningMsg,
+            QRegularExpression(
+                QStringLiteral("Skipping recognizer bundle .*fr_FR.*names no recognition engine")));
         QTest::ignoreMessage(
             QtWarningMsg, QRegularExpression(QStringLiteral("Skipping recognizer bundle .*odd")));
         QCOMPARE(Services::recognition().installedLanguages().value_or(QStringList()),
