@@ -47,6 +47,8 @@ void silenceLog()
     static bool done = false;
     QMutexLocker locker(&mutex);
     if (!done) {
+        // Without a log file the configuration table is not printed; messages still reach the callback.
+        err_set_logfp(nullptr);
         err_set_callback(&logMessage, nullptr);
         done = true;
     }
