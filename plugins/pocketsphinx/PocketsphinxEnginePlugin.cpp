@@ -86,6 +86,9 @@ std::unique_ptr<Platform::RecognitionDecoder> PocketsphinxEnginePlugin::load(
     if (!decoder) {
         *error = QStringLiteral("pocketsphinx could not load the model of %1 (damaged files?)")
                      .arg(model.bundlePath);
+        if (!lastError.isEmpty()) {
+            *error += QStringLiteral(": ") + QString::fromUtf8(lastError);
+        }
         return nullptr;
     }
     return std::make_unique<PocketsphinxDecoder>(decoder);
