@@ -343,6 +343,45 @@ private Q_SLOTS:
         QVERIFY2(r.err.contains(QStringLiteral("grammar")), qPrintable(r.err));
     }
 
+    /// A stream longer than one utterance is cut at pauses and every part is kept, in order.
+    void aLongStreamIsCutIntoUtterancesAndJoined()
+    {
+        const QString wav
+            = speak(QStringLiteral("rms"), QStringLiteral("close the door"), QStringLiteral("one.wav"));
+        QString error;
+        const auto model = BundleRecognitionService().modelForLocale(QStringLiteral("en_US"), &error);
+        QVERIFY2(model, qPrintable(error));
+        const auto transcriber = Transcriber::load(*model, &error);
+        QVERIFY2(transcriber, qPrintable(error));
+        AudioFileReader reader(transcriber->sampleRate());
+        QVERIFY2(reader.open(wav, &error), qPrintable(error));
+        std::vector<qint16> samples;
+        while (true) {
+            const auto block = reader.read(4096, &error);
+            QVERIFY2(block, qPrintable(error));
+            if (block->empty()) {
+                break;
+            }
+            samples.insert(samples.end(), block->begin(), block->end());
+        }
+        QVERIFY(transcriber->begin(writeGrammar(), &error));
+        const std::vector<qint16> pause(size_t(transcriber->sampleRate()), 0);
+        const int times = 12;
+        for (int i = 0; i < times; ++i) {
+            QVERIFY2(transcriber->feed(samples.data(), qsizetype(samples.size()), &error), qPrintable(error));
+            QVERIFY2(transcriber->feed(pause.data(), qsizetype(pause.size()), &error), qPrintable(error));
+            // Finished utterances show in the partial result as soon as their pause ended.
+            QCOMPARE(transcriber->partialResult().count(QStringLiteral("close the door")), i + 1);
+        }
+        QStringList expected;
+        for (int i = 0; i < times; ++i) {
+            expected.append(QStringLiteral("close the door"));
+        }
+        const auto text = transcriber->finish(&error);
+        QVERIFY2(text, qPrintable(error));
+        QCOMPARE(*text, expected.join(QLatin1Char(' ')));
+    }
+
     /// A long recording is read in blocks and cut into utterances; the reader never holds the file.
     void longRecordingsStreamInBlocks()
     {
