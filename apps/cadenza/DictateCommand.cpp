@@ -5,12 +5,17 @@
 
 #include "dictation/Transcriber.h"
 #include "platform/AudioFileReader.h"
+#include "platform/Microphone.h"
 #include "platform/RecognitionService.h"
 #include "platform/Services.h"
 #include "recognition-languages/CZSRLanguageItem.h"
 
 #include <QCommandLineParser>
+#include <QCoreApplication>
 #include <QFileInfo>
+#include <QSocketNotifier>
+
+#include <unistd.h>
 
 #include <cstdio>
 
@@ -20,6 +25,56 @@ using namespace Cadenza::Platform;
 namespace {
 /// About a quarter of a second at the usual rates: small blocks keep memory flat.
 constexpr qsizetype BlockFrames = 4096;
+
+/// Listens until Enter (or the end of standard input): partial results on standard error as they
+/// change, the final text on standard output.
+int dictateFromMicrophone(const QString &program, Transcriber &transcriber)
+{
+    Microphone microphone;
+    QString error;
+    if (!microphone.start(transcriber.sampleRate(), &error)) {
+        std::fprintf(stderr, "%s: %s\n", qPrintable(program), qPrintable(error));
+        return 1;
+    }
+    std::fprintf(stderr, "Listening; press Enter to finish.\n");
+    int status = 0;
+    QString shown;
+    QObject::connect(&microphone, &Microphone::samplesAvailable, [&](const QVector<qint16> &samples) {
+        if (status != 0) {
+            return;
+        }
+        if (!transcriber.feed(samples.constData(), samples.size(), &error)) {
+            std::fprintf(stderr, "%s: %s\n", qPrintable(program), qPrintable(error));
+            status = 1;
+            QCoreApplication::quit();
+            return;
+        }
+        const QString partial = transcriber.partialResult();
+        if (partial != shown) {
+            shown = partial;
+            std::fprintf(stderr, "… %s\n", qPrintable(partial));
+        }
+    });
+    QSocketNotifier enter(STDIN_FILENO, QSocketNotifier::Read);
+    QObject::connect(&enter, &QSocketNotifier::activated, [&] {
+        char ignored[256];
+        (void)::read(STDIN_FILENO, ignored, sizeof ignored);
+        QCoreApplication::quit();
+    });
+    QCoreApplication::exec();
+    microphone.stop();
+    if (status != 0) {
+        return status;
+    }
+    const auto text = transcriber.finish(&error);
+    if (!text) {
+        std::fprintf(stderr, "%s: %s\n", qPrintable(program), qPrintable(error));
+        return 1;
+    }
+    std::printf("%s\n", text->toUtf8().constData());
+    return 0;
+}
+
 } // namespace
 
 int DictateCommand::run(const QStringList &arguments)
@@ -34,18 +89,23 @@ int DictateCommand::run(const QStringList &arguments)
     const QCommandLineOption grammar(QStringLiteral("grammar"),
         QStringLiteral("Recognise only the sentences of the JSGF grammar FILE.gram."),
         QStringLiteral("FILE.gram"));
-    parser.addOptions({language, grammar});
-    parser.addPositionalArgument(QStringLiteral("FILE.wav"), QStringLiteral("The recording to transcribe."));
+    const QCommandLineOption microphoneOption(QStringLiteral("microphone"),
+        QStringLiteral("Listen to the microphone instead of a file: partial results on standard error, the "
+                       "final text when Enter is pressed."));
+    parser.addOptions({language, grammar, microphoneOption});
+    parser.addPositionalArgument(QStringLiteral("FILE.wav"), QStringLiteral("The recording to transcribe."),
+        QStringLiteral("[FILE.wav]"));
     const QString program = arguments.first();
     if (const auto done = CommandLine::parse(parser, arguments)) {
         return *done;
     }
-    if (parser.positionalArguments().size() != 1) {
-        std::fprintf(stderr, "%s: give one sound file (see --help)\n", qPrintable(program));
+    const bool fromMicrophone = parser.isSet(microphoneOption);
+    if (parser.positionalArguments().size() != (fromMicrophone ? 0 : 1)) {
+        std::fprintf(stderr, "%s: give one sound file or --microphone (see --help)\n", qPrintable(program));
         return 2;
     }
-    const QString path = parser.positionalArguments().constFirst();
-    if (!QFileInfo(path).isFile()) {
+    const QString path = fromMicrophone ? QString() : parser.positionalArguments().constFirst();
+    if (!fromMicrophone && !QFileInfo(path).isFile()) {
         std::fprintf(stderr, "%s: no file %s\n", qPrintable(program), qPrintable(path));
         return 1;
     }
@@ -78,6 +138,13 @@ int DictateCommand::run(const QStringList &arguments)
     if (!transcriber) {
         std::fprintf(stderr, "%s: %s\n", qPrintable(program), qPrintable(error));
         return 1;
+    }
+    if (fromMicrophone) {
+        if (!transcriber->begin(grammarFile, &error)) {
+            std::fprintf(stderr, "%s: %s\n", qPrintable(program), qPrintable(error));
+            return 1;
+        }
+        return dictateFromMicrophone(program, *transcriber);
     }
     AudioFileReader reader(transcriber->sampleRate());
     if (!reader.open(path, &error) || !transcriber->begin(grammarFile, &error)) {

@@ -343,6 +343,17 @@ private Q_SLOTS:
         QVERIFY2(r.err.contains(QStringLiteral("grammar")), qPrintable(r.err));
     }
 
+    /// The test world has no sound server, so no microphone: dictating from it says so plainly.
+    void aMissingMicrophoneIsNamed()
+    {
+        Result r = cadenza({QStringLiteral("dictate"), QStringLiteral("--microphone")});
+        QCOMPARE(r.exitCode, 1);
+        QVERIFY2(r.err.contains(QStringLiteral("no microphone is connected")), qPrintable(r.err));
+        QCOMPARE(r.out, QString());
+        r = cadenza({QStringLiteral("dictate"), QStringLiteral("--microphone"), QStringLiteral("x.wav")});
+        QCOMPARE(r.exitCode, 2);
+    }
+
     /// A stream longer than one utterance is cut at pauses and every part is kept, in order.
     void aLongStreamIsCutIntoUtterancesAndJoined()
     {
