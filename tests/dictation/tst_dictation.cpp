@@ -4,6 +4,7 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
+#include "dictation/Recognizer.h"
 #include "dictation/Transcriber.h"
 #include "platform/AudioFileReader.h"
 #include "platform/Paths.h"
@@ -14,6 +15,7 @@
 #include <QFile>
 #include <QProcess>
 #include <QRegularExpression>
+#include <QSignalSpy>
 #include <QTest>
 
 #include <cmath>
@@ -352,6 +354,47 @@ private Q_SLOTS:
         QCOMPARE(r.out, QString());
         r = cadenza({QStringLiteral("dictate"), QStringLiteral("--microphone"), QStringLiteral("x.wav")});
         QCOMPARE(r.exitCode, 2);
+    }
+
+    /// The application interface: results as signals, a cancelled run says nothing more.
+    void theRecognizerSignalsItsResults()
+    {
+        const QString first
+            = speak(QStringLiteral("slt"), QStringLiteral("lock the door"), QStringLiteral("r1.wav"));
+        const QString second
+            = speak(QStringLiteral("rms"), QStringLiteral("call mother"), QStringLiteral("r2.wav"));
+        Recognizer recognizer;
+        recognizer.setGrammarFile(writeGrammar());
+        QSignalSpy partial(&recognizer, &Recognizer::partialResult);
+        QSignalSpy final(&recognizer, &Recognizer::finalResult);
+        QSignalSpy failed(&recognizer, &Recognizer::failed);
+        recognizer.startFromFile(first);
+        QVERIFY(recognizer.isRunning());
+        QTRY_COMPARE_WITH_TIMEOUT(final.count() + failed.count(), 1, 60000);
+        QCOMPARE(failed.count(), 0);
+        QCOMPARE(final.at(0).at(0).toString(), QStringLiteral("lock the door"));
+        QVERIFY(partial.count() >= 1);
+        QVERIFY(!recognizer.isRunning());
+
+        // Cancelled at once, then started on another file: only the second result arrives.
+        final.clear();
+        recognizer.startFromFile(first);
+        recognizer.cancel();
+        QVERIFY(!recognizer.isRunning());
+        recognizer.startFromFile(second);
+        QTRY_COMPARE_WITH_TIMEOUT(final.count() + failed.count(), 1, 60000);
+        QCOMPARE(final.at(0).at(0).toString(), QStringLiteral("call mother"));
+
+        recognizer.startFromFile(m_environment->path(QStringLiteral("absent.wav")));
+        QTRY_COMPARE_WITH_TIMEOUT(failed.count(), 1, 60000);
+        QVERIFY2(failed.at(0).at(0).toString().contains(QStringLiteral("is not a sound file")),
+            qPrintable(failed.at(0).at(0).toString()));
+        recognizer.startFromMicrophone();
+        QCOMPARE(failed.count(), 2);
+        QVERIFY2(failed.at(1).at(0).toString().contains(QStringLiteral("no microphone")),
+            qPrintable(failed.at(1).at(0).toString()));
+        QVERIFY(!recognizer.isRunning());
+        QCOMPARE(final.count(), 1);
     }
 
     /// A stream longer than one utterance is cut at pauses and every part is kept, in order.
