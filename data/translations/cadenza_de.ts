@@ -307,6 +307,30 @@
         <source>Dictation</source>
         <translation>Diktat</translation>
     </message>
+    <message id="SettingsTryDictation">
+        <source>Try dictation:</source>
+        <translation>Diktat ausprobieren:</translation>
+    </message>
+    <message id="SettingsTryDictationRecord">
+        <source>Record</source>
+        <translation>Aufnehmen</translation>
+    </message>
+    <message id="SettingsTryDictationStop">
+        <source>Stop</source>
+        <translation>Anhalten</translation>
+    </message>
+    <message id="SettingsTryDictationHint">
+        <source>Press Record, speak, then press Stop.</source>
+        <translation>Auf „Aufnehmen“ klicken, sprechen, dann „Anhalten“.</translation>
+    </message>
+    <message id="SettingsTryDictationListening">
+        <source>Listening…</source>
+        <translation>Hört zu …</translation>
+    </message>
+    <message id="SettingsTryDictationNothing">
+        <source>No words were recognised.</source>
+        <translation>Es wurden keine Wörter erkannt.</translation>
+    </message>
     <message id="SettingsOfferLabel">
         <source>&amp;Offer:</source>
         <translation>&amp;Angebot:</translation>

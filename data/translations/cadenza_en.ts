@@ -307,6 +307,30 @@
         <source>Dictation</source>
         <translation>Dictation</translation>
     </message>
+    <message id="SettingsTryDictation">
+        <source>Try dictation:</source>
+        <translation>Try dictation:</translation>
+    </message>
+    <message id="SettingsTryDictationRecord">
+        <source>Record</source>
+        <translation>Record</translation>
+    </message>
+    <message id="SettingsTryDictationStop">
+        <source>Stop</source>
+        <translation>Stop</translation>
+    </message>
+    <message id="SettingsTryDictationHint">
+        <source>Press Record, speak, then press Stop.</source>
+        <translation>Press Record, speak, then press Stop.</translation>
+    </message>
+    <message id="SettingsTryDictationListening">
+        <source>Listening…</source>
+        <translation>Listening…</translation>
+    </message>
+    <message id="SettingsTryDictationNothing">
+        <source>No words were recognised.</source>
+        <translation>No words were recognised.</translation>
+    </message>
     <message id="SettingsOfferLabel">
         <source>&amp;Offer:</source>
         <translation>&amp;Offer:</translation>
