@@ -1,10 +1,13 @@
 #include "SettingsWindow.h"
 
+#include "TryDictationArea.h"
+
 #include "platform/DistributedNotificationCenter.h"
 #include "platform/LocalizationTable.h"
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
 #include "platform/SpeechDispatcherModule.h"
+#include "recognition-languages/CZSRLanguageItem.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
 #include "speech-items/CZSpeechItem.h"
 #include "voice-popup/CZVoicePopUpButton.h"
@@ -119,6 +122,13 @@ SettingsWindow::SettingsWindow(QWidget *parent)
     dictationForm->addRow(languageLabel, m_languagePopUp);
     dictationForm->addRow(QString(), languageStatus);
     dictationForm->addRow(text("SettingsOfferLabel"), m_localeLists);
+    auto *tryArea = new TryDictationArea(
+        [this] {
+            const auto item = m_languagePopUp->selectedLanguageItem();
+            return item ? item->localeIdentifier() : QString();
+        },
+        this);
+    dictationForm->addRow(text("SettingsTryDictation"), tryArea);
 
     auto *layout = new QVBoxLayout(this);
     layout->addWidget(voiceBox);

@@ -1,6 +1,7 @@
 // cadenza: Cadenza's command-line tool.
 
 #include "CommandLine.h"
+#include "DictateCommand.h"
 #include "DownloadCommands.h"
 #include "InstallerCommands.h"
 #include "LanguagesCommand.h"
@@ -57,6 +58,9 @@ int main(int argc, char *argv[])
     }
     if (command == u"say") {
         return SayCommand::run(arguments);
+    }
+    if (command == u"dictate") {
+        return DictateCommand::run(arguments);
     }
     if (command == u"languages") {
         return LanguagesCommand::run(arguments);

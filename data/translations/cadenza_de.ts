@@ -10,6 +10,7 @@ Commands:
   voices         list the installed voices
   say            speak a text, or write it to a WAV file
   languages      list the installed and downloadable recognition languages
+  dictate        print the words spoken in a WAV file (or at the microphone)
   post           post a notification to every process of the session
   notify         the same as post, e.g. cadenza notify DictationIMNotificationRecognizerDidPreHeat
   status         show what the installer daemon is installing
@@ -27,6 +28,7 @@ Befehle:
   voices         die installierten Stimmen auflisten
   say            einen Text sprechen oder in eine WAV-Datei schreiben
   languages      die installierten und ladbaren Diktiersprachen auflisten
+  dictate        die in einer WAV-Datei (oder am Mikrofon) gesprochenen Wörter ausgeben
   post           allen Prozessen der Sitzung eine Mitteilung senden
   notify         dasselbe wie post, z. B. cadenza notify DictationIMNotificationRecognizerDidPreHeat
   status         zeigen, was der Installationsdienst gerade installiert
@@ -614,6 +616,30 @@ Befehle:
     <message id="SettingsDictation">
         <source>Dictation</source>
         <translation>Diktat</translation>
+    </message>
+    <message id="SettingsTryDictation">
+        <source>Try dictation:</source>
+        <translation>Diktat ausprobieren:</translation>
+    </message>
+    <message id="SettingsTryDictationRecord">
+        <source>Record</source>
+        <translation>Aufnehmen</translation>
+    </message>
+    <message id="SettingsTryDictationStop">
+        <source>Stop</source>
+        <translation>Anhalten</translation>
+    </message>
+    <message id="SettingsTryDictationHint">
+        <source>Press Record, speak, then press Stop.</source>
+        <translation>Auf „Aufnehmen“ klicken, sprechen, dann „Anhalten“.</translation>
+    </message>
+    <message id="SettingsTryDictationListening">
+        <source>Listening…</source>
+        <translation>Hört zu …</translation>
+    </message>
+    <message id="SettingsTryDictationNothing">
+        <source>No words were recognised.</source>
+        <translation>Es wurden keine Wörter erkannt.</translation>
     </message>
     <message id="SettingsOfferLabel">
         <source>&amp;Offer:</source>

@@ -10,6 +10,7 @@ Commands:
   voices         list the installed voices
   say            speak a text, or write it to a WAV file
   languages      list the installed and downloadable recognition languages
+  dictate        print the words spoken in a WAV file (or at the microphone)
   post           post a notification to every process of the session
   notify         the same as post, e.g. cadenza notify DictationIMNotificationRecognizerDidPreHeat
   status         show what the installer daemon is installing
@@ -27,6 +28,7 @@ Commands:
   voices         list the installed voices
   say            speak a text, or write it to a WAV file
   languages      list the installed and downloadable recognition languages
+  dictate        print the words spoken in a WAV file (or at the microphone)
   post           post a notification to every process of the session
   notify         the same as post, e.g. cadenza notify DictationIMNotificationRecognizerDidPreHeat
   status         show what the installer daemon is installing
@@ -614,6 +616,30 @@ Run 'cadenza COMMAND --help' for the options of a command.</translation>
     <message id="SettingsDictation">
         <source>Dictation</source>
         <translation>Dictation</translation>
+    </message>
+    <message id="SettingsTryDictation">
+        <source>Try dictation:</source>
+        <translation>Try dictation:</translation>
+    </message>
+    <message id="SettingsTryDictationRecord">
+        <source>Record</source>
+        <translation>Record</translation>
+    </message>
+    <message id="SettingsTryDictationStop">
+        <source>Stop</source>
+        <translation>Stop</translation>
+    </message>
+    <message id="SettingsTryDictationHint">
+        <source>Press Record, speak, then press Stop.</source>
+        <translation>Press Record, speak, then press Stop.</translation>
+    </message>
+    <message id="SettingsTryDictationListening">
+        <source>Listening…</source>
+        <translation>Listening…</translation>
+    </message>
+    <message id="SettingsTryDictationNothing">
+        <source>No words were recognised.</source>
+        <translation>No words were recognised.</translation>
     </message>
     <message id="SettingsOfferLabel">
         <source>&amp;Offer:</source>

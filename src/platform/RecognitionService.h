@@ -1,6 +1,7 @@
 #ifndef CADENZA_PLATFORM_RECOGNITIONSERVICE_H
 #define CADENZA_PLATFORM_RECOGNITIONSERVICE_H
 
+#include "RecognitionEngine.h"
 #include "cadenzacore_export.h"
 
 #include <QHash>
@@ -22,16 +23,36 @@ public:
     [[nodiscard]] virtual QString bundlePathForIdentifier(const QString &bundleIdentifier) = 0;
     /// The folder of the installed recognizer bundle named "<locale>.SpeechRecognition"; empty when none.
     [[nodiscard]] virtual QString bundlePathForLocale(const QString &localeIdentifier) = 0;
+    /**
+     * The model of the first installed bundle for @p localeIdentifier (spelled "en_US" or "en-US")
+     * whose engine can load it; nothing, with a readable @p reason, when the language is not
+     * installed or no bundle for it can recognise.
+     */
+    [[nodiscard]] virtual std::optional<RecognizerModel> modelForLocale(
+        const QString &localeIdentifier, QString *reason)
+        = 0;
 };
 
-/// The recognizer bundles (".SpeechRecognition", with "LocaleIdentifier" in their Info.plist) of the
-/// recognizer folders, user first.
+/**
+ * The recognizer bundles (".SpeechRecognition", with "LocaleIdentifier" in their Info.plist) of the
+ * recognizer folders, user first. A language counts as installed only when one of its bundles names a
+ * recognition engine ("RecognitionEngine") that is present and whose check of the bundle's model
+ * ("RecognitionModel") passes; the others are skipped with a logged reason.
+ */
 class CADENZACORE_EXPORT BundleRecognitionService final : public RecognitionService
 {
 public:
     std::optional<QStringList> installedLanguages() override;
     QString bundlePathForIdentifier(const QString &bundleIdentifier) override;
     QString bundlePathForLocale(const QString &localeIdentifier) override;
+    std::optional<RecognizerModel> modelForLocale(const QString &localeIdentifier, QString *reason) override;
+
+    /**
+     * Reads the bundle at @p bundlePath and checks its model with its engine; nothing, with a
+     * readable @p reason, when it cannot recognise.
+     */
+    [[nodiscard]] static std::optional<RecognizerModel> usableModel(
+        const QString &bundlePath, QString *reason);
 };
 
 /// Recognizer languages that a test sets.
@@ -46,6 +67,13 @@ public:
     QString bundlePathForLocale(const QString &localeIdentifier) override
     {
         return m_byLocale.value(localeIdentifier);
+    }
+    std::optional<RecognizerModel> modelForLocale(const QString &localeIdentifier, QString *reason) override
+    {
+        if (reason) {
+            *reason = QStringLiteral("the test recognizer of %1 has no model").arg(localeIdentifier);
+        }
+        return std::nullopt;
     }
     void setInstalledLanguages(const std::optional<QStringList> &languages) { m_languages = languages; }
     void addBundle(const QString &path, const QString &identifier, const QString &locale)

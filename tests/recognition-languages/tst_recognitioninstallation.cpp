@@ -1,6 +1,7 @@
 // A dictation language from the pop-up's sheet to the menu, with the real daemon, the session bus and a
 // second process that plays the dictation engine.
 #include "QuillondProcess.h"
+#include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
 #include "installation/CZSpeechInstallationManager.h"
@@ -37,13 +38,12 @@ private Q_SLOTS:
     {
         m_environment = std::make_unique<TestEnvironment>();
         m_environment->installSampleVoices();
-        // A German recognizer with a large model, packed into a repository of its own.
+        // A US English recognizer with a large model, packed into a repository of its own.
         const QString repository = m_environment->path(QStringLiteral("repository"));
-        const QString bundle = repository + QStringLiteral("/de_DE.SpeechRecognition");
-        QVERIFY(QDir().mkpath(bundle + QStringLiteral("/Resources")));
-        QVERIFY(QFile::copy(QStringLiteral(CADENZA_SOURCE_DIR
-                                "/data/sample-repository/recognizers/de_DE.SpeechRecognition/Info.plist"),
-            bundle + QStringLiteral("/Info.plist")));
+        // The test's own fixture: plausible pocketsphinx model files, so the language is listed once
+        // installed, plus a large file that makes the download take a while.
+        const QString bundle
+            = Testing::RecognizerFixture::writeTinyBundle(repository, QStringLiteral("en_US"));
         QFile model(bundle + QStringLiteral("/Resources/model.bin"));
         QVERIFY(model.open(QIODevice::WriteOnly));
         QByteArray noise(ModelBytes, Qt::Uninitialized);
@@ -53,26 +53,26 @@ private Q_SLOTS:
         QProcess tar;
         tar.setWorkingDirectory(repository);
         tar.start(QStringLiteral("tar"),
-            {QStringLiteral("czf"), QStringLiteral("de_DE.tar.gz"),
-                QStringLiteral("de_DE.SpeechRecognition")});
+            {QStringLiteral("czf"), QStringLiteral("en_US.tar.gz"),
+                QStringLiteral("en_US.SpeechRecognition")});
         QVERIFY(tar.waitForFinished(60000) && tar.exitCode() == 0);
-        QFile archive(repository + QStringLiteral("/de_DE.tar.gz"));
+        QFile archive(repository + QStringLiteral("/en_US.tar.gz"));
         QVERIFY(archive.open(QIODevice::ReadOnly));
         QCryptographicHash hash(QCryptographicHash::Sha256);
         hash.addData(&archive);
-        const QVariantMap package {{QStringLiteral("Path"), QStringLiteral("de_DE.tar.gz")},
+        const QVariantMap package {{QStringLiteral("Path"), QStringLiteral("en_US.tar.gz")},
             {QStringLiteral("SHA256"), QString::fromLatin1(hash.result().toHex())},
             {QStringLiteral("ByteSize"), qint64(archive.size())},
             {QStringLiteral("Kind"), QStringLiteral("recognizer")},
-            {QStringLiteral("BundleName"), QStringLiteral("de_DE.SpeechRecognition")},
-            {QStringLiteral("BundleIdentifier"), QStringLiteral("com.vendra.speech.recognition.de_DE")},
-            {QStringLiteral("ObjectID"), QStringLiteral("de_DE")},
+            {QStringLiteral("BundleName"), QStringLiteral("en_US.SpeechRecognition")},
+            {QStringLiteral("BundleIdentifier"), QStringLiteral("com.vendra.speech.recognition.en_US")},
+            {QStringLiteral("ObjectID"), QStringLiteral("en_US")},
             {QStringLiteral("Version"), QStringLiteral("1.0")}};
         const QString catalogue = m_environment->path(QStringLiteral("catalogue.plist"));
         QFile file(catalogue);
         QVERIFY(file.open(QIODevice::WriteOnly));
         file.write(Platform::PropertyList::serialize(QVariantMap {
-            {QStringLiteral("Packages"), QVariantMap {{QStringLiteral("SRCLANGID:de_DE"), package}}}}));
+            {QStringLiteral("Packages"), QVariantMap {{QStringLiteral("SRCLANGID:en_US"), package}}}}));
         file.close();
 
         QVERIFY2(m_daemon.start({QStringLiteral("--catalogue"), catalogue, QStringLiteral("--repository"),
@@ -97,11 +97,11 @@ private Q_SLOTS:
         window.resize(500, 300);
         window.show();
         const QStringList network {QStringLiteral("en_US"), QStringLiteral("de_DE")};
-        popUp->buildPopUpButtonAndSelectLocaleIdentifier(QStringLiteral("de_DE"), network, std::nullopt);
+        popUp->buildPopUpButtonAndSelectLocaleIdentifier(QStringLiteral("en_US"), network, std::nullopt);
         popUp->setEnabled(true);
-        QCOMPARE(popUp->currentText(), QStringLiteral("German (Germany)"));
+        QCOMPARE(popUp->currentText(), QStringLiteral("English (United States)"));
 
-        // The command item opens the sheet; German, the pop-up's language, is ticked for download.
+        // The command item opens the sheet; US English, the pop-up's language, is ticked for download.
         popUp->setCurrentIndex(popUp->count() - 1);
         QVERIFY(!popUp->sendAction());
         CZCustomizeSRLanguagesWindowController *sheet
@@ -114,7 +114,7 @@ private Q_SLOTS:
 
         // Watch the status line closely while the daemon works.
         const QString bundle
-            = Platform::Paths::userRecognizersFolder() + QStringLiteral("/de_DE.SpeechRecognition");
+            = Platform::Paths::userRecognizersFolder() + QStringLiteral("/en_US.SpeechRecognition");
         QStringList seen;
         QElapsedTimer clock;
         clock.start();
@@ -145,8 +145,8 @@ private Q_SLOTS:
         QVERIFY(!spinner->isVisible());
 
         // Listed, no longer as downloading, and still chosen.
-        QCOMPARE(popUp->currentText(), QStringLiteral("German (Germany)"));
-        QCOMPARE(popUp->selectedLanguageItem()->localeIdentifier(), QStringLiteral("de_DE"));
+        QCOMPARE(popUp->currentText(), QStringLiteral("English (United States)"));
+        QCOMPARE(popUp->selectedLanguageItem()->localeIdentifier(), QStringLiteral("en_US"));
         QVERIFY(popUp->model()->flags(popUp->model()->index(popUp->currentIndex(), 0)) & Qt::ItemIsEnabled);
     }
 

@@ -1,3 +1,4 @@
+#include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
 #include "platform/FakeSpeechSynthesisService.h"
@@ -211,26 +212,30 @@ private Q_SLOTS:
     void recognizerBundlesOnDisk()
     {
         Services::setRecognition(nullptr); // the bundle service, in this test's private world
-        auto bundle = [](const QString &folder, const QString &name, const QVariant &locale) {
-            QDir().mkpath(folder + QLatin1Char('/') + name);
-            QFile info(folder + QLatin1Char('/') + name + QStringLiteral("/Info.plist"));
-            QVERIFY(info.open(QIODevice::WriteOnly));
-            info.write(PropertyList::serialize(QVariantMap {{QStringLiteral("LocaleIdentifier"), locale}}));
-        };
-        bundle(Paths::userRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"),
-            QStringLiteral("de_DE"));
-        bundle(Paths::systemRecognizersFolder(), QStringLiteral("en_US.SpeechRecognition"),
-            QStringLiteral("en-US"));
-        bundle(Paths::systemRecognizersFolder(), QStringLiteral("de_DE.SpeechRecognition"),
-            QStringLiteral("de_DE"));
-        bundle(Paths::systemRecognizersFolder(), QStringLiteral("odd.SpeechRecognition"), 5);
-        // Locales that name no language are left out, each with one line naming its bundle.
+        // Listed only with a model their engine accepts: the fixtures carry small plausible model files.
+        Testing::RecognizerFixture::writeTinyBundle(Paths::userRecognizersFolder(), QStringLiteral("de_DE"),
+            QStringLiteral("de_DE.SpeechRecognition"));
+        Testing::RecognizerFixture::writeTinyBundle(Paths::systemRecognizersFolder(), QStringLiteral("en-US"),
+            QStringLiteral("en_US.SpeechRecognition"));
+        Testing::RecognizerFixture::writeTinyBundle(Paths::systemRecognizersFolder(), QStringLiteral("de_DE"),
+            QStringLiteral("de_DE.SpeechRecognition"));
+        Testing::RecognizerFixture::writeBareBundle(Paths::systemRecognizersFolder(),
+            QStringLiteral("odd.SpeechRecognition"), {{QStringLiteral("LocaleIdentifier"), 5}});
+        // A bundle without a model is not a language.
+        Testing::RecognizerFixture::writeBareBundle(Paths::systemRecognizersFolder(),
+            QStringLiteral("fr_FR.SpeechRecognition"),
+            {{QStringLiteral("LocaleIdentifier"), QStringLiteral("fr_FR")}});
+        QTest::ignoreMessage(QtWarningMsg,
+            QRegularExpression(
+                QStringLiteral("Skipping recognizer bundle .*fr_FR.*names no recognition engine")));
+        // Locales that name no language are left out, each with one line naming its bundle, even when
+        // the bundle carries a model.
         const QStringList nameless {QStringLiteral("_"), QStringLiteral("__"), QStringLiteral("_DE"),
             QStringLiteral("1234"), QStringLiteral("@calendar=x"), QStringLiteral("x"),
             QStringLiteral("\u00e9\u00e9")};
         for (int i = 0; i < nameless.size(); ++i) {
-            bundle(Paths::userRecognizersFolder(), QStringLiteral("nameless%1.SpeechRecognition").arg(i),
-                nameless.at(i));
+            Testing::RecognizerFixture::writeTinyBundle(Paths::userRecognizersFolder(), nameless.at(i),
+                QStringLiteral("nameless%1.SpeechRecognition").arg(i));
         }
         QTest::ignoreMessage(
             QtWarningMsg, QRegularExpression(QStringLiteral("Skipping recognizer bundle .*odd")));

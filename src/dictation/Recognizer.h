@@ -1,0 +1,66 @@
+// SPDX-License-Identifier: LGPL-2.1-or-later
+#ifndef CADENZA_DICTATION_RECOGNIZER_H
+#define CADENZA_DICTATION_RECOGNIZER_H
+
+#include "cadenzacore_export.h"
+
+#include <QObject>
+#include <QString>
+
+#include <atomic>
+#include <memory>
+
+namespace Cadenza {
+
+namespace Platform {
+class Microphone;
+}
+class Transcriber;
+
+/**
+ * Speech to text for applications. A recognition runs on a worker thread for files (the event loop
+ * never waits for decoding) and follows the microphone as it records; results arrive as signals in
+ * the recognizer's thread. One recognition at a time; starting another cancels the running one.
+ */
+class CADENZACORE_EXPORT Recognizer : public QObject
+{
+    Q_OBJECT
+public:
+    explicit Recognizer(QObject *parent = nullptr);
+    ~Recognizer() override;
+
+    /// The installed recognizer of @p locale, or of the preferred dictation language when empty.
+    void setLanguage(const QString &locale) { m_language = locale; }
+    /// A JSGF grammar to recognise instead of free dictation; empty for free dictation.
+    void setGrammarFile(const QString &path) { m_grammarFile = path; }
+
+    /// Transcribes the sound file @p path; finalResult() or failed() follows.
+    void startFromFile(const QString &path);
+    /// Listens to the microphone until stop(); failed() at once when there is none.
+    void startFromMicrophone();
+    /// Ends listening to the microphone; finalResult() follows.
+    void stop();
+    /// Abandons the running recognition: neither finalResult() nor failed() follows.
+    void cancel();
+    [[nodiscard]] bool isRunning() const { return m_running; }
+
+Q_SIGNALS:
+    void partialResult(const QString &text);
+    void finalResult(const QString &text);
+    void failed(const QString &reason);
+
+private:
+    void finishMicrophone();
+
+    QString m_language;
+    QString m_grammarFile;
+    bool m_running = false;
+    std::shared_ptr<std::atomic<bool>> m_cancelled;
+    std::unique_ptr<Platform::Microphone> m_microphone;
+    std::unique_ptr<Transcriber> m_transcriber;
+    quint64 m_generation = 0;
+};
+
+} // namespace Cadenza
+
+#endif
