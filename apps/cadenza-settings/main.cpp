@@ -27,6 +27,7 @@
 
 #include <cstdio>
 #include <functional>
+#include <memory>
 
 namespace {
 
@@ -149,9 +150,31 @@ int writeScreenshots(SettingsWindow &window, const QString &folder)
 }
 } // namespace
 
+namespace {
+
+/// Whether the command line asks only for what needs no window (help, the speech-dispatcher module),
+/// which must work without a display too, e.g. from scripts on a server.
+bool answersWithoutAWindow(int argc, char *argv[])
+{
+    for (int i = 1; i < argc; ++i) {
+        const QByteArray argument(argv[i]);
+        if (argument == "-h" || argument == "-?" || argument == "--help" || argument == "--help-all"
+            || argument == "--install-speech-dispatcher-module"
+            || argument == "--remove-speech-dispatcher-module") {
+            return true;
+        }
+    }
+    return false;
+}
+
+} // namespace
+
 int main(int argc, char *argv[])
 {
-    QApplication app(argc, argv);
+    const std::unique_ptr<QCoreApplication> application = answersWithoutAWindow(argc, argv)
+        ? std::make_unique<QCoreApplication>(argc, argv)
+        : std::make_unique<QApplication>(argc, argv);
+    QCoreApplication &app = *application;
     QApplication::setApplicationName(QStringLiteral("cadenza-settings"));
     QApplication::setDesktopFileName(QStringLiteral("org.cadenza.Settings"));
 

@@ -131,9 +131,16 @@ private Q_SLOTS:
         const QString module = writeProgram(m_env->path(QStringLiteral("prefix/lib/modules/sd_cadenza")));
         QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
         environment.insert(QStringLiteral("CADENZA_SPEECHD_MODULE"), module);
-        environment.insert(QStringLiteral("QT_QPA_PLATFORM"), QStringLiteral("offscreen"));
+        // As on a machine without a display (the main script runs it before any window exists).
+        for (const char *variable : {"QT_QPA_PLATFORM", "DISPLAY", "WAYLAND_DISPLAY"}) {
+            environment.remove(QString::fromLatin1(variable));
+        }
         QProcess settings;
         settings.setProcessEnvironment(environment);
+        settings.start(QStringLiteral(CADENZA_SETTINGS_PATH), {QStringLiteral("--help")});
+        QVERIFY(settings.waitForFinished(30000));
+        QCOMPARE(settings.exitCode(), 0);
+        QVERIFY(settings.readAllStandardOutput().contains("--install-speech-dispatcher-module"));
         settings.start(
             QStringLiteral(CADENZA_SETTINGS_PATH), {QStringLiteral("--install-speech-dispatcher-module")});
         QVERIFY(settings.waitForFinished(30000));
