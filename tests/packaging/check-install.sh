@@ -61,10 +61,14 @@ cat >"$work/bus.conf" <<XML
   <type>session</type>
   <listen>unix:tmpdir=$work</listen>
   <servicedir>$prefix/share/dbus-1/services</servicedir>
-  <policy context="default"><allow send_destination="*"/><allow own="*"/></policy>
+  <policy context="default">
+    <allow send_destination="*"/><allow receive_sender="*"/><allow own="*"/><allow user="*"/>
+  </policy>
 </busconfig>
 XML
-answer=$(dbus-run-session --config-file="$work/bus.conf" -- dbus-send --session --print-reply \
+# Installed into a prefix the loader does not search: the bus passes its environment on to the engine.
+answer=$(LD_LIBRARY_PATH="$(dirname "$(find "$prefix" -name 'libcadenzacore.so.*' -type f | head -1)")" \
+  dbus-run-session --config-file="$work/bus.conf" -- dbus-send --session --print-reply \
   --dest=org.cadenza.Dictation /org/cadenza/Dictation org.cadenza.Dictation.PreHeat string:xx_XX 2>&1 || true)
 case $answer in
   *org.cadenza.Dictation.Error.Failed*xx_XX*) ;;
