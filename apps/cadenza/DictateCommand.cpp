@@ -96,7 +96,7 @@ int DictateCommand::run(const QStringList &arguments)
     parser.addPositionalArgument(QStringLiteral("FILE.wav"), QStringLiteral("The recording to transcribe."),
         QStringLiteral("[FILE.wav]"));
     const QString program = arguments.first();
-    if (const auto done = CommandLine::parse(parser, arguments)) {
+    if (const auto done = CommandLine::parse(parser, arguments, 1)) {
         return *done;
     }
     const bool fromMicrophone = parser.isSet(microphoneOption);
