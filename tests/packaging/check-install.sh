@@ -29,7 +29,10 @@ check_staged() { # ROOT PREFIX: files were installed into ROOT and will run from
            share/polkit-1/actions/org.cadenza.remove-speech-bundle.policy share/cadenza/SpeechDataDefaults.plist; do
     [ -e "$root/$f" ] || { echo "not installed: $f" >&2; exit 1; }
   done
-  local exec_start helper
+  local exec_start helper dictation
+  dictation=$(sed -n 's/^Exec=\([^ ]*\).*/\1/p' "$root/share/dbus-1/services/org.cadenza.Dictation.service")
+  [ "$dictation" = "$run_prefix/libexec/cadenza-dictation" ] || { echo "the bus would start '$dictation'" >&2; exit 1; }
+  [ -x "$root${dictation#"$run_prefix"}" ] || { echo "no dictation engine at $dictation" >&2; exit 1; }
   exec_start=$(sed -n 's/^ExecStart=\([^ ]*\).*/\1/p' "$root/lib/systemd/user/quillond.service")
   [ "$exec_start" = "$run_prefix/bin/quillond" ] || { echo "quillond.service starts '$exec_start'" >&2; exit 1; }
   [ -x "$root${exec_start#"$run_prefix"}" ] || { echo "no daemon at $exec_start" >&2; exit 1; }
@@ -49,6 +52,28 @@ outside=$(find "$work/stage" -mindepth 1 -not -path "$work/stage/opt" -not -path
 
 cmake --install "$build" --prefix "$prefix" >/dev/null
 check_staged "$prefix" "$prefix"
+# A session bus that knows only the installed services starts the dictation engine on the first call;
+# the engine answers (here with the error for a language that is not installed).
+cat >"$work/bus.conf" <<XML
+<!DOCTYPE busconfig PUBLIC "-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN"
+ "http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd">
+<busconfig>
+  <type>session</type>
+  <listen>unix:tmpdir=$work</listen>
+  <servicedir>$prefix/share/dbus-1/services</servicedir>
+  <policy context="default">
+    <allow send_destination="*"/><allow receive_sender="*"/><allow own="*"/><allow user="*"/>
+  </policy>
+</busconfig>
+XML
+# Installed into a prefix the loader does not search: the bus passes its environment on to the engine.
+answer=$(LD_LIBRARY_PATH="$(dirname "$(find "$prefix" -name 'libcadenzacore.so.*' -type f | head -1)")" \
+  dbus-run-session --config-file="$work/bus.conf" -- dbus-send --session --print-reply \
+  --dest=org.cadenza.Dictation /org/cadenza/Dictation org.cadenza.Dictation.PreHeat string:xx_XX 2>&1 || true)
+case $answer in
+  *org.cadenza.Dictation.Error.Failed*xx_XX*) ;;
+  *) echo "the bus did not start the dictation engine: $answer" >&2; exit 1 ;;
+esac
 # The installed library finds its installed engine plugins: a flite voice and an espeak-ng voice speak
 # through the installed cadenza.
 libdir=$(dirname "$(find "$prefix" -name 'libcadenzacore.so.*' -type f | head -1)")
