@@ -67,9 +67,14 @@ cat >"$work/bus.conf" <<XML
 </busconfig>
 XML
 # Installed into a prefix the loader does not search: the bus passes its environment on to the engine.
-answer=$(LD_LIBRARY_PATH="$(dirname "$(find "$prefix" -name 'libcadenzacore.so.*' -type f | head -1)")" \
+# The answer goes to a file, not a pipe: the engine the bus starts inherits the bus's output and stays
+# until its idle time runs out, so reading a pipe to its end would wait for it. It is stopped below.
+LD_LIBRARY_PATH="$(dirname "$(find "$prefix" -name 'libcadenzacore.so.*' -type f | head -1)")" \
   dbus-run-session --config-file="$work/bus.conf" -- dbus-send --session --print-reply \
-  --dest=org.cadenza.Dictation /org/cadenza/Dictation org.cadenza.Dictation.PreHeat string:xx_XX 2>&1 || true)
+  --dest=org.cadenza.Dictation /org/cadenza/Dictation org.cadenza.Dictation.PreHeat string:xx_XX \
+  >"$work/answer" 2>&1 || true
+pkill -f "^$prefix/libexec/cadenza-dictation" || true
+answer=$(cat "$work/answer")
 case $answer in
   *org.cadenza.Dictation.Error.Failed*xx_XX*) ;;
   *) echo "the bus did not start the dictation engine: $answer" >&2; exit 1 ;;
