@@ -117,13 +117,16 @@ int main(int argc, char *argv[])
         }
     };
     const QString installed = QStringLiteral(CADENZA_SAMPLE_VOICES);
-    for (const QString &name :
-        {QStringLiteral("MarenCompact"), QStringLiteral("MarenPremium"), QStringLiteral("Orin"),
-            QStringLiteral("TobiasCompact"), QStringLiteral("TobiasEnhanced"), QStringLiteral("Wren")}) {
+    for (const QString &name : {QStringLiteral("MarenCompact"), QStringLiteral("MarenPremium"),
+             QStringLiteral("Orin"), QStringLiteral("Wren")}) {
         add(name, installed + QLatin1Char('/') + name + QStringLiteral(".SpeechVoice"));
     }
-    add(QStringLiteral("Orin (upgrade)"),
-        QStringLiteral(CADENZA_SAMPLE_REPOSITORY_BUNDLES "/voices/Orin.SpeechVoice"));
+    // The downloadable English voices: Tobias in both sizes and the upgrade of Orin.
+    const QString repository = QStringLiteral(CADENZA_SAMPLE_REPOSITORY_BUNDLES "/voices/");
+    for (const QString &name : {QStringLiteral("TobiasCompact"), QStringLiteral("TobiasPremium")}) {
+        add(name, repository + name + QStringLiteral(".SpeechVoice"));
+    }
+    add(QStringLiteral("Orin (upgrade)"), repository + QStringLiteral("Orin.SpeechVoice"));
 
     QMap<QString, double> synthesisSeconds, audioSeconds;
     QStringList control;
@@ -215,7 +218,7 @@ int main(int argc, char *argv[])
     };
     std::vector<Row> rows;
     const QMap<QString, QString> peers = {{QStringLiteral("MarenPremium"), QStringLiteral("MarenCompact")},
-        {QStringLiteral("TobiasEnhanced"), QStringLiteral("TobiasCompact")},
+        {QStringLiteral("TobiasPremium"), QStringLiteral("TobiasCompact")},
         {QStringLiteral("Orin (upgrade)"), QStringLiteral("Orin")}};
     for (int v = 0; v < voices.size(); ++v) {
         const QString peer = peers.value(voices[v].label, voices[v].label);

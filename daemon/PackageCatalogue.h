@@ -19,7 +19,7 @@ struct Package
     QByteArray sha256; ///< 32 bytes
     quint64 byteSize = 0;
     Kind kind = Kind::Voice;
-    QString bundleName; ///< the archive's single top-level folder, such as "JonasPremium.SpeechVoice"
+    QString bundleName; ///< the archive's single top-level folder, such as "TobiasPremium.SpeechVoice"
     QString bundleIdentifier;
     QString objectIdentifier;
     QString version;

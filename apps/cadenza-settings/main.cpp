@@ -13,6 +13,7 @@
 #include "voice-settings/VoiceSettingsAlertController.h"
 #include "voice-settings/VoiceSettingsSheetController.h"
 #include "voices/CZVoiceObject.h"
+#include "voices/DownloadableVoice.h"
 
 #include <QAccessibleWidget>
 #include <QApplication>
@@ -46,10 +47,21 @@ bool tickAndDownload(Cadenza::CustomizeVoicesWindowController *sheet, const std:
     using namespace Cadenza::InstallerProtocol;
     auto *manager = Cadenza::CZSpeechInstallationManager::sharedManager();
     const QList<Cadenza::VoiceTableRowPtr> rows = sheet->currentlyDisplayedVoiceRows();
+    // Preferably a voice offered in two sizes, so the picture shows the size choice.
     int chosen = -1;
-    for (int row = 0; row < rows.size() && chosen < 0; ++row) {
+    for (int row = 0; row < rows.size(); ++row) {
         const auto voice = rows.at(row)->voiceObject();
-        if (voice && voice->downloadStatus() == NotInstalledStatus) {
+        if (!voice || voice->downloadStatus() != NotInstalledStatus) {
+            continue;
+        }
+        if (voice->isDownloadable()
+            && !std::static_pointer_cast<Cadenza::DownloadableVoice>(voice)
+                    ->fullSizeBundleIdentifier()
+                    .isEmpty()) {
+            chosen = row;
+            break;
+        }
+        if (chosen < 0) {
             chosen = row;
         }
     }

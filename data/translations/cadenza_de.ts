@@ -106,8 +106,8 @@ Befehle:
         <translation>Ein JSON-Feld statt einer Tabelle ausgeben.</translation>
     </message>
     <message id="CLIInstallDescription">
-        <source>Asks the installer daemon to install TAG, such as VOICEID:com.vendra.speech.synthesis.voice.jonas.premium or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given.</source>
-        <translation>Bittet den Installationsdienst, TAG zu installieren, etwa VOICEID:com.vendra.speech.synthesis.voice.jonas.premium oder SRCLANGID:de_DE, und wartet bis zum Ende, außer mit --no-wait.</translation>
+        <source>Asks the installer daemon to install TAG, such as VOICEID:com.vendra.speech.synthesis.voice.tobias.premium or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given.</source>
+        <translation>Bittet den Installationsdienst, TAG zu installieren, etwa VOICEID:com.vendra.speech.synthesis.voice.tobias.premium oder SRCLANGID:de_DE, und wartet bis zum Ende, außer mit --no-wait.</translation>
     </message>
     <message id="CLINoWaitOption">
         <source>Return once the request is sent.</source>

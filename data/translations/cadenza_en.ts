@@ -106,8 +106,8 @@ Run 'cadenza COMMAND --help' for the options of a command.</translation>
         <translation>Print a JSON array instead of a table.</translation>
     </message>
     <message id="CLIInstallDescription">
-        <source>Asks the installer daemon to install TAG, such as VOICEID:com.vendra.speech.synthesis.voice.jonas.premium or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given.</source>
-        <translation>Asks the installer daemon to install TAG, such as VOICEID:com.vendra.speech.synthesis.voice.jonas.premium or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given.</translation>
+        <source>Asks the installer daemon to install TAG, such as VOICEID:com.vendra.speech.synthesis.voice.tobias.premium or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given.</source>
+        <translation>Asks the installer daemon to install TAG, such as VOICEID:com.vendra.speech.synthesis.voice.tobias.premium or SRCLANGID:de_DE, and waits until it is installed unless --no-wait is given.</translation>
     </message>
     <message id="CLINoWaitOption">
         <source>Return once the request is sent.</source>

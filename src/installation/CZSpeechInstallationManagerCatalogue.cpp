@@ -373,10 +373,26 @@ std::optional<SpeechBundle> CZSpeechInstallationManager::bundleForRemovableVoice
 {
     const QString identifier = voice.identifier();
     const QVariantMap voices = catalogueSection(QStringLiteral("DownloadableVoices"));
-    if (!voices.contains(identifier)) {
-        return std::nullopt;
+    // A voice is catalogued under its own identifier, or as the full size of another entry (a voice
+    // downloaded at full size); its installer tag follows.
+    QVariantMap entry;
+    QString tagKey = QStringLiteral("VoiceTag");
+    if (voices.contains(identifier)) {
+        entry = voices.value(identifier).toMap();
+    } else {
+        for (auto it = voices.cbegin(); !identifier.isEmpty() && it != voices.cend() && entry.isEmpty();
+             ++it) {
+            const QVariantMap candidate = it.value().toMap();
+            if (SpeechItemPrivate::stringValue(candidate.value(QStringLiteral("FullSizeBundleIdentifier")))
+                == identifier) {
+                entry = candidate;
+                tagKey = QStringLiteral("FullSizeTagName");
+            }
+        }
+        if (entry.isEmpty()) {
+            return std::nullopt;
+        }
     }
-    const QVariantMap entry = voices.value(identifier).toMap();
     std::optional<SpeechBundle> bundle;
     if (identifier == DefaultVoiceIdentifier) {
         const auto installed = Services::speechSynthesis().voice(identifier);
@@ -408,7 +424,7 @@ std::optional<SpeechBundle> CZSpeechInstallationManager::bundleForRemovableVoice
             bundle = SpeechBundle {byName};
         }
     }
-    const QString tag = SpeechItemPrivate::stringValue(entry.value(QStringLiteral("VoiceTag")));
+    const QString tag = SpeechItemPrivate::stringValue(entry.value(tagKey));
     if (passingBackTagName && !tag.isNull()) {
         *passingBackTagName = tag;
     }

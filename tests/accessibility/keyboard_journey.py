@@ -33,25 +33,25 @@ if sheet is None:
     finish()
 search = focused(sheet)
 check(search is not None and search.name == "Search", "the focus is in the search field")
-type_text("Femke")
+type_text("Tobias")
 
 events.clear()
 keys("Tab")
 heard = events.wait_for(lambda e: e[0].startswith("object:state-changed:focused") and e[2] == 1
-                        and e[1] == "Femke, Dutch (Netherlands)")
-check(heard is not None, "a screen reader is told the focus moved to Femke's row: %s"
+                        and e[1] == "Tobias, English (United Kingdom)")
+check(heard is not None, "a screen reader is told the focus moved to Tobias's row: %s"
       % [e[:3] for e in events.seen])
 row = focused(sheet)
-check(row is not None and row.name == "Femke, Dutch (Netherlands)" and role(row) == pyatspi.ROLE_CHECK_BOX,
-      "Tab reaches Femke's row: %r" % (row.name if row else None))
+check(row is not None and row.name == "Tobias, English (United Kingdom)" and role(row) == pyatspi.ROLE_CHECK_BOX,
+      "Tab reaches Tobias's row: %r" % (row.name if row else None))
 keys("space")
 check(row is not None and wait_for(lambda: pyatspi.STATE_CHECKED in states(fresh(row)), 5) is not None,
-      "Space ticks her")
+      "Space ticks him")
 
 keys("Tab")
 sizes = focused(sheet)
-check(sizes is not None and role(sizes) == pyatspi.ROLE_COMBO_BOX and sizes.description == "Download size for Femke",
-      "Tab reaches her size pop-up: %r" % (sizes.description if sizes else None))
+check(sizes is not None and role(sizes) == pyatspi.ROLE_COMBO_BOX and sizes.description == "Download size for Tobias",
+      "Tab reaches his size pop-up: %r" % (sizes.description if sizes else None))
 keys("space")
 keys("Down", "Return")
 
@@ -72,15 +72,15 @@ events.clear()
 keys("Return")
 check(gone(app, "Customize Voices") is not None, "Return is OK: the sheet closes")
 heard = events.wait_for(lambda e: e[0].startswith("object:property-change:accessible-description")
-                        and "Femke" in (e[3] or ""), 15)
+                        and "Tobias" in (e[3] or ""), 15)
 check(heard is not None, "a screen reader is told the pop-up's status changed: %s" % (heard,))
-status = find(main, lambda n: role(n) == pyatspi.ROLE_LABEL and "Femke" in n.name
+status = find(main, lambda n: role(n) == pyatspi.ROLE_LABEL and "Tobias" in n.name
               and pyatspi.STATE_SHOWING in states(n), timeout=20)
-check(status is not None, "the status beside the pop-up names Femke: %r" % (status.name if status else None))
+check(status is not None, "the status beside the pop-up names Tobias: %r" % (status.name if status else None))
 check(status is not None and ("Downloading" in status.name or "Waiting" in status.name),
-      "it says she is downloading")
+      "it says he is downloading")
 popup = fresh(popup)
-check("Femke" in (popup.description or ""), "the pop-up itself describes the download: %r" % popup.description)
+check("Tobias" in (popup.description or ""), "the pop-up itself describes the download: %r" % popup.description)
 screenshot("journey-downloading")
 
 # The daemon got the full size.

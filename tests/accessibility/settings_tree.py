@@ -59,8 +59,8 @@ names = [b.name for b in boxes]
 check("Maren, English (United States)" in names, "Maren's row is read 'Maren, English (United States)'")
 check(all(", " in name for name in names), "every voice row names its language: %s" % names)
 check(any(pyatspi.STATE_CHECKED in states(b) for b in boxes), "some rows read as checked")
-femke = next((b for b in boxes if b.name.startswith("Femke,")), None)
-check(femke is not None and pyatspi.STATE_CHECKED not in states(femke), "Femke's row is there, unchecked")
+tobias = next((b for b in boxes if b.name.startswith("Tobias,")), None)
+check(tobias is not None and pyatspi.STATE_CHECKED not in states(tobias), "Tobias's row is there, unchecked")
 check(find(sheet, lambda n: role(n) == pyatspi.ROLE_PUSH_BUTTON and n.name == "Play") is not None,
       "Play is a named button")
 
@@ -102,26 +102,26 @@ if upgradable is not None:
     check(back is not None and back.name == "Search", "Shift+Tab from the table reaches the search field")
 
 # Search, tick from the keyboard: the row reads as checked, with its status and size choice.
-type_text("Femke")
+type_text("Tobias")
 table, rows = sheet_rows(sheet)
-check([r.name for r in rows if role(r) == pyatspi.ROLE_CHECK_BOX] == ["Femke, Dutch (Netherlands)"],
-      "the search narrows the list to Femke")
+check([r.name for r in rows if role(r) == pyatspi.ROLE_CHECK_BOX] == ["Tobias, English (United Kingdom)"],
+      "the search narrows the list to Tobias")
 keys("Tab")
-femke = wait_for(lambda: next((r for r in sheet_rows(sheet)[1] if pyatspi.STATE_FOCUSED in states(r)), None))
-check(femke is not None and femke.name == "Femke, Dutch (Netherlands)", "Tab into the table focuses Femke's row")
+tobias = wait_for(lambda: next((r for r in sheet_rows(sheet)[1] if pyatspi.STATE_FOCUSED in states(r)), None))
+check(tobias is not None and tobias.name == "Tobias, English (United Kingdom)", "Tab into the table focuses Tobias's row")
 keys("space")
-femke = wait_for(lambda: next((r for r in sheet_rows(sheet)[1]
-                               if r.name.startswith("Femke") and pyatspi.STATE_CHECKED in states(fresh(r))), None))
-check(femke is not None, "Space ticks Femke: her row reads as checked")
-screenshot("a11y-femke-ticked")
-if femke is not None:
-    parts = [femke.getChildAtIndex(i) for i in range(femke.childCount)]
+tobias = wait_for(lambda: next((r for r in sheet_rows(sheet)[1]
+                               if r.name.startswith("Tobias") and pyatspi.STATE_CHECKED in states(fresh(r))), None))
+check(tobias is not None, "Space ticks Tobias: his row reads as checked")
+screenshot("a11y-tobias-ticked")
+if tobias is not None:
+    parts = [tobias.getChildAtIndex(i) for i in range(tobias.childCount)]
     check(any(role(p) == pyatspi.ROLE_LABEL and p.name == "Required" for p in parts),
           "the row's status 'Required' is a child label")
-    check(femke.description == "Required", "the row's description is its status")
+    check(tobias.description == "Required", "the row's description is its status")
     sizes = next((p for p in parts if role(p) == pyatspi.ROLE_COMBO_BOX), None)
-    check(sizes is not None and sizes.name.startswith("Compact") and sizes.description == "Download size for Femke",
-          "the size pop-up is a child reading its choice, described 'Download size for Femke'")
+    check(sizes is not None and sizes.name.startswith("Compact") and sizes.description == "Download size for Tobias",
+          "the size pop-up is a child reading its choice, described 'Download size for Tobias'")
 dump(sheet)
 
 # A search without results says so where the focus is.
@@ -136,7 +136,7 @@ keys("ctrl+a", "BackSpace")
 # Return is OK: the download starts and the voice pop-up's status line says so.
 keys("Return")
 check(gone(app, "Customize Voices") is not None, "Return closes the sheet with OK")
-status = find(main, lambda n: role(n) == pyatspi.ROLE_LABEL and ("Femke" in n.name or "Waiting" in n.name)
+status = find(main, lambda n: role(n) == pyatspi.ROLE_LABEL and ("Tobias" in n.name or "Waiting" in n.name)
               and pyatspi.STATE_SHOWING in states(n), timeout=20)
 check(status is not None, "the main window's status line names the download: %r" % (status.name if status else None))
 check(voice_popup is not None and wait_for(lambda: fresh(voice_popup).description, 10) is not None,
@@ -145,21 +145,21 @@ progress = find(main, lambda n: role(n) == pyatspi.ROLE_PROGRESS_BAR and pyatspi
 check(progress is not None and progress.name == "Voice download progress", "the progress bar is named")
 screenshot("a11y-downloading")
 
-# While it downloads, the sheet shows Femke's row disabled with its progress.
+# While it downloads, the sheet shows Tobias's row disabled with its progress.
 sheet = open_voices_sheet()
 check(sheet is not None, "the sheet opens again during the download")
 if sheet is not None:
     def downloading_row():
         for r in sheet_rows(sheet)[1]:
-            if r.name.startswith("Femke,") and r.description and ("Downloading" in r.description
+            if r.name.startswith("Tobias,") and r.description and ("Downloading" in r.description
                                                                   or "Waiting" in r.description):
                 return r
         return None
     row = wait_for(downloading_row, 20)
-    check(row is not None, "Femke's row reads its download status: %r" % (row.description if row else None))
+    check(row is not None, "Tobias's row reads its download status: %r" % (row.description if row else None))
     if row is not None:
         check(pyatspi.STATE_SENSITIVE not in states(row) or pyatspi.STATE_ENABLED not in states(row),
-              "Femke's row reads as disabled while it downloads")
+              "Tobias's row reads as disabled while it downloads")
     screenshot("a11y-sheet-during-download")
     keys("Escape")
     check(gone(app, "Customize Voices") is not None, "Escape closes the sheet")

@@ -9,9 +9,11 @@
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
 #include "installation/InstallerProtocol.h"
+#include "platform/BundleSpeechSynthesisService.h"
 #include "platform/Paths.h"
 #include "platform/Services.h"
 #include "platform/SizeVariants.h"
+#include "platform/WaveFile.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-popup/CZVoicePopUpButton_p.h"
 #include "voices/DownloadableVoice.h"
@@ -21,6 +23,7 @@
 #include <QComboBox>
 #include <QDialog>
 #include <QDir>
+#include <QFileInfo>
 #include <QLabel>
 #include <QProcess>
 #include <QProgressBar>
@@ -35,8 +38,8 @@ using Cadenza::Testing::TestEnvironment;
 
 namespace {
 const QString Femke = QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact");
-const QString IngridCompact = QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.compact");
-const QString IngridPremium = QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.premium");
+const QString TobiasCompact = QStringLiteral("com.vendra.speech.synthesis.voice.tobias.compact");
+const QString TobiasPremium = QStringLiteral("com.vendra.speech.synthesis.voice.tobias.premium");
 } // namespace
 
 class VoiceInstallationTest : public QObject
@@ -136,32 +139,37 @@ private Q_SLOTS:
         layout->addWidget(popUp);
         window.show();
         popUp->buildPopUpButtonWithSelectVoiceIdentifier(QString());
-        QCOMPARE(popUp->findText(QStringLiteral("Ingrid")), -1);
+        QCOMPARE(popUp->findText(QStringLiteral("Tobias")), -1);
 
-        // Tick Ingrid, choose her full size, OK.
+        // Tick Tobias, choose his full size, OK.
         CustomizeVoicesWindowController *sheet = openSheet(popUp);
-        const int ingridRow = rowOf(sheet, IngridCompact);
-        QVERIFY(ingridRow >= 0);
+        const int tobiasRow = rowOf(sheet, TobiasCompact);
+        QVERIFY(tobiasRow >= 0);
         sheet->voiceSelectionTableView()->scrollTo(
-            sheet->voiceSelectionTableView()->model()->index(ingridRow, 0));
-        QTRY_VERIFY(sheet->existingViewForRow(ingridRow));
-        VoiceTableCellView *view = sheet->existingViewForRow(ingridRow);
+            sheet->voiceSelectionTableView()->model()->index(tobiasRow, 0));
+        QTRY_VERIFY(sheet->existingViewForRow(tobiasRow));
+        VoiceTableCellView *view = sheet->existingViewForRow(tobiasRow);
         view->activeCheckbox()->click();
         QComboBox *sizes = view->downloadVariantPopUpButton();
         QVERIFY(sizes->isVisibleTo(view));
         const int fullSize = Platform::SizeVariants::isFullSize(sizes, 1) ? 1 : 0;
         QVERIFY(Platform::SizeVariants::isFullSize(sizes, fullSize));
+        // Two real sizes: the compact espeak-ng voice is kilobytes, the full-size flite voice megabytes.
+        QCOMPARE(sizes->count(), 2);
+        QVERIFY2(sizes->itemText(0) != sizes->itemText(1), qPrintable(sizes->itemText(fullSize)));
+        QVERIFY2(
+            sizes->itemText(fullSize).contains(QStringLiteral("MB")), qPrintable(sizes->itemText(fullSize)));
         sizes->setCurrentIndex(fullSize);
         Q_EMIT sizes->activated(fullSize);
         sheet->window()->findChild<QPushButton *>(QStringLiteral("okButton"))->click();
         QVERIFY(!sheet->window()->isVisible());
 
-        // While she downloads, the pop-up lists her as downloading, and the sheet keeps her row at
+        // While he downloads, the pop-up lists him as downloading, and the sheet keeps his row at
         // full size, ticked and greyed.
-        QTRY_VERIFY_WITH_TIMEOUT(popUp->findText(QStringLiteral("Ingrid (Downloading)")) >= 0, 30000);
+        QTRY_VERIFY_WITH_TIMEOUT(popUp->findText(QStringLiteral("Tobias (Downloading)")) >= 0, 30000);
         sheet = openSheet(popUp);
         const VoiceTableRowPtr downloading
-            = sheet->currentlyDisplayedVoiceRows().value(rowOf(sheet, IngridCompact));
+            = sheet->currentlyDisplayedVoiceRows().value(rowOf(sheet, TobiasCompact));
         QVERIFY(downloading);
         const qint64 status = downloading->voiceObject()->downloadStatus();
         QVERIFY2(status == 3 || status == 4, qPrintable(QString::number(status)));
@@ -169,31 +177,44 @@ private Q_SLOTS:
         QVERIFY(downloading->isSelected());
         sheet->cancelVoiceSelection();
 
-        // Installed at full size: Ingrid Premium is in the menus, once, and nothing is offered again.
-        QTRY_VERIFY_WITH_TIMEOUT(popUp->findText(QStringLiteral("Ingrid")) >= 0, 60000);
-        QVERIFY(QDir(Platform::Paths::userVoicesFolder() + QStringLiteral("/IngridPremium.SpeechVoice"))
-                    .exists());
+        // Installed at full size: Tobias Premium is in the menus, once, and nothing is offered again.
+        QTRY_VERIFY_WITH_TIMEOUT(popUp->findText(QStringLiteral("Tobias")) >= 0, 60000);
+        const QString installed
+            = Platform::Paths::userVoicesFolder() + QStringLiteral("/TobiasPremium.SpeechVoice");
+        QVERIFY(QFileInfo(installed + QStringLiteral("/Resources/cmu_us_awb.flitevox")).size() > 1024 * 1024);
+        // The full size is the flite voice, and it speaks.
+        Platform::BundleSpeechSynthesisService speech;
+        const auto premium = speech.voice(TobiasPremium);
+        QVERIFY(premium);
+        QCOMPARE(premium->engineName, QStringLiteral("flite"));
+        const QString wav = m_environment->path(QStringLiteral("tobias.wav"));
+        QString error;
+        QVERIFY2(
+            speech.renderToFile({QStringLiteral("Hello, my name is Tobias."), TobiasPremium}, wav, &error),
+            qPrintable(error));
+        const auto audio = Platform::WaveFile::read(wav, &error);
+        QVERIFY2(audio && audio->rootMeanSquare() > 300.0, qPrintable(error));
         const QList<VoiceTableRowPtr> menuRows = VoicePopUpPrivate::currentVoiceRows();
         QVERIFY(std::any_of(menuRows.cbegin(), menuRows.cend(), [](const VoiceTableRowPtr &row) {
-            return row->voiceObject() && row->voiceObject()->identifier() == IngridPremium;
+            return row->voiceObject() && row->voiceObject()->identifier() == TobiasPremium;
         }));
         const auto downloadables = CZSpeechInstallationManager::sharedManager()->downloadableVoices();
         QVERIFY(
             std::none_of(downloadables.cbegin(), downloadables.cend(), [](const DownloadableVoicePtr &voice) {
-                return voice->identifier().contains(QLatin1String(".ingrid."));
+                return voice->identifier().contains(QLatin1String(".tobias."));
             }));
 
         sheet = openSheet(popUp);
-        int ingridRows = 0;
+        int tobiasRows = 0;
         for (const VoiceTableRowPtr &row : sheet->currentlyDisplayedVoiceRows()) {
-            if (row->voiceObject() && row->voiceObject()->identifier().contains(QLatin1String(".ingrid."))) {
-                ++ingridRows;
-                QCOMPARE(row->voiceObject()->identifier(), IngridPremium);
+            if (row->voiceObject() && row->voiceObject()->identifier().contains(QLatin1String(".tobias."))) {
+                ++tobiasRows;
+                QCOMPARE(row->voiceObject()->identifier(), TobiasPremium);
                 QVERIFY(row->isSelected());
                 QCOMPARE(row->voiceObject()->downloadStatus(), 0);
             }
         }
-        QCOMPARE(ingridRows, 1);
+        QCOMPARE(tobiasRows, 1);
         sheet->_updateButtonStates();
         QVERIFY(sheet->window()
                     ->findChild<QLabel *>(QStringLiteral("selectedDownloadSizeTextField"))

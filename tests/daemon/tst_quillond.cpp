@@ -77,11 +77,11 @@ private Q_SLOTS:
             QUrl::fromLocalFile(QStringLiteral(CADENZA_SAMPLE_REPOSITORY)).toString()});
         QSignalSpy notifications(&Platform::Services::notifications(),
             &Platform::DistributedNotificationCenter::notificationPosted);
-        const QString voice = QStringLiteral("com.vendra.speech.synthesis.voice.jonas.premium");
+        const QString voice = QStringLiteral("com.vendra.speech.synthesis.voice.tobias.premium");
         QVERIFY(m_manager->_requestInstallation(
-            QStringLiteral("VOICEID:") + voice, QStringLiteral("Jonas"), 1, voice, 0));
+            QStringLiteral("VOICEID:") + voice, QStringLiteral("Tobias"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion));
-        QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/JonasPremium.SpeechVoice/Info.plist")));
+        QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/TobiasPremium.SpeechVoice/Info.plist")));
         QVERIFY(m_manager->pendingLocalPortNames().isEmpty());
         if (QDBusConnection::sessionBus().isConnected()) {
             // Other tests share the session bus: only this voice's notifications count.
@@ -102,9 +102,9 @@ private Q_SLOTS:
 
         // Installing again replaces the bundle in one step.
         QVERIFY(m_manager->_requestInstallation(
-            QStringLiteral("VOICEID:") + voice, QStringLiteral("Jonas"), 1, voice, 0));
+            QStringLiteral("VOICEID:") + voice, QStringLiteral("Tobias"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion));
-        QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/JonasPremium.SpeechVoice/Info.plist")));
+        QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/TobiasPremium.SpeechVoice/Info.plist")));
         QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
     }
 

@@ -235,6 +235,33 @@ private Q_SLOTS:
             QStringLiteral("VOICEID:Have Premium"))); // the recognition domain
     }
 
+    /// A voice fetched at full size is catalogued as the full size of its compact entry, not under its
+    /// own identifier: it is removable all the same, and the log names the full-size tag.
+    void aVoiceDownloadedAtFullSizeIsRemovable()
+    {
+        QVariantMap sized = downloadable(QStringLiteral("Sized Compact"), 4);
+        sized.insert(
+            QStringLiteral("FullSizeBundleIdentifier"), QString(P + QStringLiteral("sized.premium")));
+        SpeechItemPrivate::setInstallationDictionary(QVariantMap {{QStringLiteral("DownloadableVoices"),
+            QVariantMap {{P + QStringLiteral("sized.compact"), sized}}}});
+        installVoice(QStringLiteral("sized.premium"), QStringLiteral("Sized Premium"), 8);
+        const QString bundle = bundleOf(P + QStringLiteral("sized.premium"));
+        QVERIFY(QFileInfo(bundle).isDir());
+        QString tag;
+        QVERIFY(m_manager->bundleForRemovableVoice(
+            *CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("sized.premium")), &tag));
+        QCOMPARE(tag, QStringLiteral("VOICEID:full.Sized Compact"));
+        m_manager->startRemovingDownloadedSpeechItems(
+            {CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("sized.premium"))});
+        QTRY_VERIFY(!QFileInfo(bundle).exists());
+        const auto entry = m_manager->installationLogEntryForTag(
+            QStringLiteral("VOICEID:full.Sized Compact"), VoiceDomain);
+        QVERIFY(entry && entry->contains(QStringLiteral("RemovalDate")));
+        // An identifier that no entry names, not even as a full size, stays unremovable.
+        QVERIFY(!m_manager->bundleForRemovableVoice(
+            *CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("other.premium")), nullptr));
+    }
+
     void refusedRightsEndTheRemovalSilently()
     {
         m_administrator->setGrants(false);
