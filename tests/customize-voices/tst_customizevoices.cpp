@@ -83,8 +83,8 @@ private Q_SLOTS:
                 {P + QStringLiteral("iris.premium"),
                     downloadable(QStringLiteral("Iris Premium"), QStringLiteral("en_US"),
                         P + QStringLiteral("iris.full"))},
-                {P + QStringLiteral("femke.premium"),
-                    downloadable(QStringLiteral("Femke Premium"), QStringLiteral("nl_NL"))}}}});
+                {P + QStringLiteral("femke.compact"),
+                    downloadable(QStringLiteral("Femke Compact"), QStringLiteral("nl_NL"))}}}});
         // Maren and Tobias come with the system; Nora was downloaded into the user's folder.
         install(Paths::systemVoicesFolder(), QStringLiteral("maren.compact"), QStringLiteral("Maren Compact"),
             QStringLiteral("en_US"));
@@ -278,8 +278,8 @@ private Q_SLOTS:
     void downloadingRowsAreTickedAndGreyed()
     {
         m_daemon->setActiveRecords(
-            {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("femke.premium"))},
-                {InstallerProtocol::TagNameKey, QStringLiteral("VOICEID:Femke Premium")},
+            {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("femke.compact"))},
+                {InstallerProtocol::TagNameKey, QStringLiteral("VOICEID:Femke Compact")},
                 {InstallerProtocol::ItemDownloadStatusKey, qint64(3)},
                 {InstallerProtocol::ItemPercentCompleteKey, 0.7}}});
         show();
@@ -289,7 +289,7 @@ private Q_SLOTS:
         QVERIFY(!femke->textField()->isEnabled());
         QCOMPARE(femke->downloadMessageTextField()->text(), QStringLiteral("Downloading"));
         m_daemon->setActiveRecords(
-            {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("femke.premium"))},
+            {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("femke.compact"))},
                 {InstallerProtocol::ItemDownloadStatusKey, qint64(3)},
                 {InstallerProtocol::ItemPercentCompleteKey, 45.9}}});
         // The 2-second poll brings the percentage.
