@@ -262,7 +262,15 @@ private Q_SLOTS:
     void theShippedCatalogueIsLoadedOnce()
     {
         const QVariantMap catalogue = CZSpeechItem::installationDictionaryCache();
-        QVERIFY(catalogue.value(QStringLiteral("DownloadableVoices")).toMap().size() >= 10);
+        // Voices of several languages, and Tobias in two sizes.
+        const QVariantMap voices = catalogue.value(QStringLiteral("DownloadableVoices")).toMap();
+        QVERIFY(voices.size() >= 5);
+        QVERIFY(voices.contains(QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact")));
+        QCOMPARE(voices.value(QStringLiteral("com.vendra.speech.synthesis.voice.tobias.compact"))
+                     .toMap()
+                     .value(QStringLiteral("FullSizeBundleIdentifier"))
+                     .toString(),
+            QStringLiteral("com.vendra.speech.synthesis.voice.tobias.premium"));
         // Only languages with a real model are offered: US English.
         QCOMPARE(catalogue.value(QStringLiteral("DownloadableSRLanguages")).toMap().keys(),
             QStringList {QStringLiteral("com.vendra.speech.recognition.en_US")});
