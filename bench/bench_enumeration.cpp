@@ -19,6 +19,7 @@
 #include <QProcess>
 #include <QTemporaryDir>
 
+#include <dirent.h>
 #include <sys/stat.h>
 
 using namespace Cadenza;

@@ -460,17 +460,18 @@ private:
         if (!enterMap(&count)) {
             return false;
         }
-        // Keys come in the map's own order, each greater than the one before: appended at the end
-        // without a search, and no key twice.
-        QString previous;
+        // Keys come in the map's own order: each is appended at the end without a search (a key out
+        // of order still lands in its place). A key given twice leaves the map short.
         for (qsizetype i = 0; i < count; ++i) {
             QString key;
             QVariant value;
-            if (!readRef(&key) || (i > 0 && !(previous < key)) || !readValue(&value, depth + 1)) {
+            if (!readRef(&key) || !readValue(&value, depth + 1)) {
                 return false;
             }
             map->insert(map->cend(), key, value);
-            previous = key;
+        }
+        if (map->size() != count) {
+            return false;
         }
         return leave();
     }
