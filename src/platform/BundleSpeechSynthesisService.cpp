@@ -301,9 +301,8 @@ quint64 BundleSpeechSynthesisService::voicesGeneration() const
 
 std::optional<QString> BundleSpeechSynthesisService::speechLanguageLocale()
 {
-    PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(PreferencesDomain);
-    const QVariant stored = preferences.value(SpeechLanguageKey, PreferencesDomain);
+    // value() reads the domain again when its file changed.
+    const QVariant stored = Services::preferences().value(SpeechLanguageKey, PreferencesDomain);
     if (stored.typeId() != QMetaType::QString) {
         return std::nullopt;
     }

@@ -237,11 +237,13 @@ QStringList SpeechSynthesizer::avaliableMainstreamVoices()
 
 QString SpeechSynthesizer::defaultVoiceFromAllVoices()
 {
+    // Every value() reads the domain again when its file changed, so no synchronize() first.
     Platform::PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(VoicePreferencesDomain);
     const QVariant creator
         = preferences.value(QStringLiteral("SelectedVoiceCreator"), VoicePreferencesDomain);
-    const QVariant id = preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain);
+    const QVariant id = SpeechItemPrivate::isNumber(creator)
+        ? preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain)
+        : QVariant();
     SpeechSynthesisService &service = Services::speechSynthesis();
     const QString locale = service.speechLanguageLocale().value_or(QString());
     // The key names every input of the answer besides the voices, so that a preference change is a
