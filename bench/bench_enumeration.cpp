@@ -170,6 +170,12 @@ void measure(int count, const QString &cadenza)
         }
     });
     const double espeak = processSeconds(QStringLiteral("espeak-ng"), {QStringLiteral("--voices")}, cliRuns);
+    // The process floor of the tool itself: the same command with no voice installed at all.
+    QProcessEnvironment empty = QProcessEnvironment::systemEnvironment();
+    for (const char *variable : {"CADENZA_ROOT", "XDG_DATA_HOME", "XDG_CACHE_HOME"}) {
+        empty.insert(QLatin1String(variable), world.path() + QStringLiteral("/empty"));
+    }
+    const double cliEmpty = processSeconds(cadenza, {QStringLiteral("voices")}, cliRuns, {}, empty);
     // The floor of any index keyed by each Info.plist's stamp: list the folder and stat every
     // Info.plist, in this process (no process start, nothing decoded).
     const double stampFloor = median(samplesOf(5, [&] {
@@ -209,6 +215,8 @@ void measure(int count, const QString &cadenza)
             {"'cadenza voices' process, index warm, ms", cli * 1e3, "ms", "'espeak-ng --voices' process",
                 espeak * 1e3},
             {"'cadenza voices', one bundle changed, ms", cliChanged * 1e3, "ms",
+                "'espeak-ng --voices' process", espeak * 1e3},
+            {"'cadenza voices', no voices installed, ms", cliEmpty * 1e3, "ms",
                 "'espeak-ng --voices' process", espeak * 1e3},
             {"list + stat every Info.plist (floor), ms", stampFloor * 1e3, "ms",
                 "'espeak-ng --voices' process", espeak * 1e3}});
