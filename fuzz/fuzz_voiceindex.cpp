@@ -1,7 +1,7 @@
 // The voice index of the user's cache folder: any bytes may sit there (a disk error, another program,
 // another version). Half the inputs are taken as a whole file; the other half as the payload behind
 // a correct header, so that the checksum does not keep the fuzzer away from the decoder.
-#include "platform/VoiceIndex.h"
+#include "core/formats/VoiceIndex.h"
 
 #include <QtEndian>
 
