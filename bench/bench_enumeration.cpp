@@ -1,7 +1,7 @@
 // Voice enumeration over a generated root of N voice bundles (default 1,000 and 10,000):
 // the first scan beside the floor of reading the same Info.plist files, the cached calls beside the
 // floor of checking the three folders, and 'cadenza voices' as a whole process beside
-// 'espeak-ng --voices'.
+// 'espeak-ng --voices' (without the voice index, with it warm, and after one bundle changed).
 
 #include "BenchTable.h"
 
@@ -12,12 +12,14 @@
 #include "core/voices/SpeechSynthesizer.h"
 
 #include <QCoreApplication>
+#include <QDateTime>
 #include <QDir>
 #include <QDirIterator>
 #include <QFile>
 #include <QProcess>
 #include <QTemporaryDir>
 
+#include <dirent.h>
 #include <sys/stat.h>
 
 using namespace Cadenza;
@@ -51,17 +53,33 @@ void generate(const QString &folder, int count)
             qFatal("cannot write %s", qPrintable(file.fileName()));
         }
         file.write(Platform::PropertyList::serialize(info));
+        file.flush(); // before the time is set: writing would set it again
+        // Installed an hour ago: the voice index keeps only bundles that have settled.
+        file.setFileTime(QDateTime::currentDateTimeUtc().addSecs(-3600), QFileDevice::FileModificationTime);
     }
 }
 
-double processSeconds(const QString &program, const QStringList &arguments, int runs)
+/// Median wall time of @p runs processes; @p before runs untimed ahead of each.
+double processSeconds(const QString &program, const QStringList &arguments, int runs,
+    const std::function<void(int)> &before = {},
+    const QProcessEnvironment &environment = QProcessEnvironment::systemEnvironment())
 {
-    const auto samples = samplesOf(runs, [&] {
-        QProcess process;
-        process.setStandardOutputFile(QProcess::nullDevice());
-        process.start(program, arguments);
-        process.waitForFinished(120000);
-    });
+    std::vector<double> samples;
+    for (int i = 0; i < runs; ++i) {
+        if (before) {
+            before(i);
+        }
+        samples.push_back(secondsOf([&] {
+            QProcess process;
+            process.setProcessEnvironment(environment);
+            process.setStandardOutputFile(QProcess::nullDevice());
+            process.start(program, arguments);
+            if (!process.waitForFinished(120000) || process.exitCode() != 0) {
+                qFatal("%s failed", qPrintable(program));
+            }
+        }));
+    }
+    std::sort(samples.begin(), samples.end());
     return median(samples);
 }
 
@@ -71,6 +89,7 @@ void measure(int count, const QString &cadenza)
     qputenv("CADENZA_ROOT", QFile::encodeName(world.path() + QStringLiteral("/root")));
     qputenv("XDG_DATA_HOME", QFile::encodeName(world.path() + QStringLiteral("/data")));
     qputenv("XDG_CONFIG_HOME", QFile::encodeName(world.path() + QStringLiteral("/config")));
+    qputenv("XDG_CACHE_HOME", QFile::encodeName(world.path() + QStringLiteral("/cache")));
     generate(Platform::Paths::systemVoicesFolder(), count);
 
     // Floor of the first scan: list the folder and read every Info.plist, parsing nothing.
@@ -88,6 +107,14 @@ void measure(int count, const QString &cadenza)
         }
     }));
     const double firstScan = median(samplesOf(3, [&] {
+        Platform::BundleSpeechSynthesisService fresh;
+        fresh.setVoiceIndexPath(QString());
+        if (fresh.installedVoices().size() != count) {
+            qFatal("scan found the wrong number of voices");
+        }
+    }));
+    // The first scan of a process with the voice index warm (the first round writes it).
+    const double indexedScan = median(samplesOf(4, [&] {
         Platform::BundleSpeechSynthesisService fresh;
         if (fresh.installedVoices().size() != count) {
             qFatal("scan found the wrong number of voices");
@@ -126,14 +153,56 @@ void measure(int count, const QString &cadenza)
         (void)found;
     }));
 
-    const double cliRuns = count > 5000 ? 5 : 10;
-    const double cli = processSeconds(cadenza, {QStringLiteral("voices")}, int(cliRuns));
-    const double espeak
-        = processSeconds(QStringLiteral("espeak-ng"), {QStringLiteral("--voices")}, int(cliRuns));
+    const int cliRuns = count > 5000 ? 5 : 10;
+    QProcessEnvironment noIndex = QProcessEnvironment::systemEnvironment();
+    noIndex.insert(QStringLiteral("XDG_CACHE_HOME"), QStringLiteral("/dev/null/none"));
+    const double cliNoIndex = processSeconds(cadenza, {QStringLiteral("voices")}, cliRuns, {}, noIndex);
+    const double cli = processSeconds(cadenza, {QStringLiteral("voices")}, cliRuns);
+    // One bundle's Info.plist changes before each run: parsed again, and the index written anew.
+    const QString changing
+        = Platform::Paths::systemVoicesFolder() + QStringLiteral("/V1.SpeechVoice/Info.plist");
+    const double cliChanged = processSeconds(cadenza, {QStringLiteral("voices")}, cliRuns, [&](int i) {
+        QFile file(changing);
+        if (!file.open(QIODevice::ReadWrite)
+            || !file.setFileTime(
+                QDateTime::currentDateTimeUtc().addSecs(-3000 + i), QFileDevice::FileModificationTime)) {
+            qFatal("cannot touch %s", qPrintable(changing));
+        }
+    });
+    const double espeak = processSeconds(QStringLiteral("espeak-ng"), {QStringLiteral("--voices")}, cliRuns);
+    // The process floor of the tool itself: the same command with no voice installed at all.
+    QProcessEnvironment empty = QProcessEnvironment::systemEnvironment();
+    for (const char *variable : {"CADENZA_ROOT", "XDG_DATA_HOME", "XDG_CACHE_HOME"}) {
+        empty.insert(QLatin1String(variable), world.path() + QStringLiteral("/empty"));
+    }
+    const double cliEmpty = processSeconds(cadenza, {QStringLiteral("voices")}, cliRuns, {}, empty);
+    // The floor of any index keyed by each Info.plist's stamp: list the folder and stat every
+    // Info.plist, in this process (no process start, nothing decoded).
+    const double stampFloor = median(samplesOf(5, [&] {
+        const QByteArray folder = QFile::encodeName(Platform::Paths::systemVoicesFolder());
+        DIR *dir = ::opendir(folder.constData());
+        int found = 0;
+        while (const dirent *entry = dir ? ::readdir(dir) : nullptr) {
+            struct stat st
+            {
+            };
+            const QByteArray plist = QByteArray(entry->d_name) + "/Info.plist";
+            found += ::fstatat(::dirfd(dir), plist.constData(), &st, 0) == 0 ? 1 : 0;
+        }
+        if (dir) {
+            ::closedir(dir);
+        }
+        if (found != count) {
+            qFatal("stat found %d bundles", found);
+        }
+    }));
 
     const std::string n = " (" + std::to_string(count) + " bundles)";
     printTable(("Voice enumeration" + n).c_str(),
-        {{"first scan, ms", firstScan * 1e3, "ms", "read every Info.plist, no parsing", readFloor * 1e3},
+        {{"first scan, no index, ms", firstScan * 1e3, "ms", "read every Info.plist, no parsing",
+             readFloor * 1e3},
+            {"first scan, index warm, ms", indexedScan * 1e3, "ms", "read every Info.plist, no parsing",
+                readFloor * 1e3},
             {"allVoices, cached, us", all * 1e6, "us", "stat the three voice folders", statFloor * 1e6},
             {"avaliableMainstreamVoices, cached, us", mainstream * 1e6, "us", "stat the three voice folders",
                 statFloor * 1e6},
@@ -141,7 +210,16 @@ void measure(int count, const QString &cadenza)
                 "stat the three voice folders", statFloor * 1e6},
             {"resolveVoiceIdentifier (prefix), us", resolve * 1e6, "us", "QStringList::contains, miss",
                 scanFloor * 1e6},
-            {"'cadenza voices' process, ms", cli * 1e3, "ms", "'espeak-ng --voices' process", espeak * 1e3}});
+            {"'cadenza voices' process, no index, ms", cliNoIndex * 1e3, "ms", "'espeak-ng --voices' process",
+                espeak * 1e3},
+            {"'cadenza voices' process, index warm, ms", cli * 1e3, "ms", "'espeak-ng --voices' process",
+                espeak * 1e3},
+            {"'cadenza voices', one bundle changed, ms", cliChanged * 1e3, "ms",
+                "'espeak-ng --voices' process", espeak * 1e3},
+            {"'cadenza voices', no voices installed, ms", cliEmpty * 1e3, "ms",
+                "'espeak-ng --voices' process", espeak * 1e3},
+            {"list + stat every Info.plist (floor), ms", stampFloor * 1e3, "ms",
+                "'espeak-ng --voices' process", espeak * 1e3}});
     Platform::Services::setSpeechSynthesis(nullptr);
 }
 

@@ -8,6 +8,7 @@
 #include "core/files/Paths.h"
 #include "core/formats/Locale.h"
 #include "core/formats/PropertyList.h"
+#include "core/formats/VoiceIndex.h"
 
 #include <QAudioDevice>
 #include <QAudioFormat>
@@ -20,7 +21,10 @@
 #include <QThreadPool>
 #include <QtConcurrent/QtConcurrentMap>
 
+#include <dirent.h>
+#include <fcntl.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include <algorithm>
 
@@ -29,6 +33,16 @@ namespace Cadenza::Platform {
 namespace {
 
 const QString BundleSuffix = QStringLiteral(".SpeechVoice");
+// An Info.plist changed this recently may change again within the same tick of the file system's
+// clock, unseen by its stamp: such a bundle is parsed but not kept in the voice index.
+constexpr qint64 UnsettledNs = 2'000'000'000;
+
+qint64 nowNs()
+{
+    timespec now {};
+    ::clock_gettime(CLOCK_REALTIME, &now);
+    return qint64(now.tv_sec) * 1'000'000'000 + now.tv_nsec;
+}
 
 QString stampKey(const QString &folder, qint64 modifiedNs, quint64 inode)
 {
@@ -111,38 +125,113 @@ BundleSpeechSynthesisService::~BundleSpeechSynthesisService()
     delete m_buffer;
 }
 
+std::optional<VoiceDescription> BundleSpeechSynthesisService::parseBundle(
+    const QString &bundlePath, QString *error)
+{
+    const auto info = PropertyList::readFile(bundlePath + QStringLiteral("/Info.plist"), error);
+    if (!info || info->typeId() != QMetaType::QVariantMap) {
+        *error = QStringLiteral("unreadable Info.plist (%1)")
+                     .arg(info ? QStringLiteral("not a dictionary") : *error);
+        return std::nullopt;
+    }
+    auto voice = VoiceDescription::fromInfo(info->toMap(), error);
+    if (voice) {
+        voice->bundlePath = bundlePath;
+    }
+    return voice;
+}
+
 std::optional<VoiceDescription> BundleSpeechSynthesisService::readBundle(const QString &bundlePath)
 {
     QString error;
-    const auto info = PropertyList::readFile(bundlePath + QStringLiteral("/Info.plist"), &error);
-    if (!info || info->typeId() != QMetaType::QVariantMap) {
-        qCWarning(lcVoices, "Skipping voice bundle %s: unreadable Info.plist (%s)", qPrintable(bundlePath),
-            qPrintable(info ? QStringLiteral("not a dictionary") : error));
-        return std::nullopt;
-    }
-    auto voice = VoiceDescription::fromInfo(info->toMap(), &error);
+    auto voice = parseBundle(bundlePath, &error);
     if (!voice) {
         qCWarning(lcVoices, "Skipping voice bundle %s: %s", qPrintable(bundlePath), qPrintable(error));
-        return std::nullopt;
     }
-    voice->bundlePath = bundlePath;
     return voice;
+}
+
+void BundleSpeechSynthesisService::setVoiceIndexPath(const QString &path)
+{
+    QMutexLocker locker(&m_scanMutex);
+    m_indexPath = path;
+    m_index.reset();
 }
 
 QList<VoiceDescription> BundleSpeechSynthesisService::scanFolder(const QString &folder)
 {
-    const QStringList entries = QDir(folder).entryList(
-        {QLatin1Char('*') + BundleSuffix}, QDir::Dirs | QDir::NoDotAndDotDot, QDir::Unsorted);
+    struct Slot
+    {
+        QString path;
+        std::optional<VoiceIndex::Stamp> stamp; ///< nothing when the Info.plist could not be found
+        std::optional<VoiceDescription> voice;
+        QString error;
+        bool parse = false;
+    };
+    QList<Slot> slots;
+    QSet<QString> present;
+    const QByteArray suffix = BundleSuffix.toLatin1();
     const QString prefix = folder + QLatin1Char('/');
-    // Bundles are independent: parse them on every core.
-    const QList<std::optional<VoiceDescription>> parsed = QtConcurrent::blockingMapped(
-        entries, [&prefix](const QString &entry) { return readBundle(prefix + entry); });
-    QList<VoiceDescription> voices;
-    voices.reserve(parsed.size());
-    for (const auto &voice : parsed) {
-        if (voice) {
-            voices.append(*voice);
+    if (DIR *dir = ::opendir(QFile::encodeName(folder).constData())) {
+        const int fd = ::dirfd(dir);
+        while (const dirent *entry = ::readdir(dir)) {
+            const QByteArrayView name(entry->d_name);
+            // Hidden folders are an installation's staging folders, not bundles.
+            if (!name.endsWith(suffix) || name.startsWith('.')) {
+                continue;
+            }
+            Slot slot;
+            slot.path = prefix + QFile::decodeName(entry->d_name);
+            struct stat st
+            {
+            };
+            if (::fstatat(fd, QByteArray(name.toByteArray() + "/Info.plist").constData(), &st, 0) == 0) {
+                slot.stamp
+                    = VoiceIndex::Stamp {qint64(st.st_mtim.tv_sec) * 1'000'000'000 + st.st_mtim.tv_nsec,
+                        qint64(st.st_size), quint64(st.st_ino)};
+                present.insert(slot.path);
+            } else if (::fstatat(fd, entry->d_name, &st, 0) != 0 || !S_ISDIR(st.st_mode)) {
+                continue; // not a bundle folder
+            }
+            const VoiceIndex::Entry *known
+                = m_index && slot.stamp ? m_index->find(slot.path, *slot.stamp) : nullptr;
+            if (known) {
+                slot.voice = known->voice;
+                slot.error = known->error;
+            } else {
+                slot.parse = true;
+            }
+            slots.append(std::move(slot));
         }
+        ::closedir(dir);
+    }
+
+    // Bundles are independent: parse the ones the index does not know on every core.
+    QList<Slot *> toParse;
+    for (Slot &slot : slots) {
+        if (slot.parse) {
+            toParse.append(&slot);
+        }
+    }
+    QtConcurrent::blockingMap(
+        toParse, [](Slot *slot) { slot->voice = parseBundle(slot->path, &slot->error); });
+
+    const qint64 settled = nowNs() - UnsettledNs;
+    QList<VoiceDescription> voices;
+    voices.reserve(slots.size());
+    for (const Slot &slot : std::as_const(slots)) {
+        if (slot.voice) {
+            voices.append(*slot.voice);
+        } else {
+            qCWarning(
+                lcVoices, "Skipping voice bundle %s: %s", qPrintable(slot.path), qPrintable(slot.error));
+        }
+        if (m_index && slot.parse && slot.stamp && slot.stamp->modifiedNs < settled) {
+            m_index->insert(slot.path, {*slot.stamp, slot.voice, slot.error});
+        }
+    }
+    if (m_index) {
+        m_index->retainInFolder(folder, present);
     }
     return voices;
 }
@@ -153,6 +242,13 @@ QList<VoiceDescription> BundleSpeechSynthesisService::installedVoices()
     const QStringList folders = Paths::voiceFolders();
     QStringList key;
     bool changed = false;
+    if (!m_index && !(m_indexPath && m_indexPath->isEmpty())) {
+        m_index = std::make_unique<VoiceIndex>(m_indexPath.value_or(VoiceIndex::defaultPath()));
+        QString why;
+        if (!m_index->load(&why)) {
+            qCDebug(lcVoices, "Not using the voice index: %s", qPrintable(why));
+        }
+    }
     for (const QString &folder : folders) {
         struct stat st
         {
@@ -166,6 +262,12 @@ QList<VoiceDescription> BundleSpeechSynthesisService::installedVoices()
             // A missing folder is no error: it simply holds no voices.
             scan = {modified, inode, exists ? scanFolder(folder) : QList<VoiceDescription>()};
             changed = true;
+        }
+    }
+    if (m_index) {
+        QString error;
+        if (!m_index->saveIfChanged(&error)) {
+            qCDebug(lcVoices, "Cannot write the voice index: %s", qPrintable(error));
         }
     }
     if (!changed && key == m_mergedKey) {
@@ -199,9 +301,8 @@ quint64 BundleSpeechSynthesisService::voicesGeneration() const
 
 std::optional<QString> BundleSpeechSynthesisService::speechLanguageLocale()
 {
-    PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(PreferencesDomain);
-    const QVariant stored = preferences.value(SpeechLanguageKey, PreferencesDomain);
+    // value() reads the domain again when its file changed.
+    const QVariant stored = Services::preferences().value(SpeechLanguageKey, PreferencesDomain);
     if (stored.typeId() != QMetaType::QString) {
         return std::nullopt;
     }

@@ -8,10 +8,14 @@
 #include <QMutex>
 #include <QPointer>
 
+#include <memory>
+
 class QAudioSink;
 class QBuffer;
 
 namespace Cadenza::Platform {
+
+class VoiceIndex;
 
 /**
  * The Linux speech synthesis service: voices are the ".SpeechVoice" bundles of the voice folders
@@ -19,8 +23,10 @@ namespace Cadenza::Platform {
  * plugin its bundle names (see SpeechEngines).
  *
  * A folder is scanned again only when its modification time changes, which an installation's final
- * rename always does. Speech is rendered on a worker thread and played on the default audio output;
- * with no audio output, a request finishes as soon as it is rendered.
+ * rename always does. A scan parses only the bundles the voice index (see VoiceIndex) does not hold
+ * with their Info.plist's present stamp, and writes the index back when it learnt something. Speech is
+ * rendered on a worker thread and played on the default audio output; with no audio output, a request
+ * finishes as soon as it is rendered.
  */
 class CADENZACORE_EXPORT BundleSpeechSynthesisService final : public SpeechSynthesisService
 {
@@ -41,6 +47,10 @@ public:
     /// Reads one bundle; nothing, with one log line naming it, when its Info.plist is unreadable.
     [[nodiscard]] static std::optional<VoiceDescription> readBundle(const QString &bundlePath);
 
+    /// Where the voice index is kept (VoiceIndex::defaultPath() unless set); empty: no index. Takes
+    /// effect at the next scan.
+    void setVoiceIndexPath(const QString &path);
+
 private:
     struct FolderScan
     {
@@ -50,6 +60,7 @@ private:
     };
 
     QList<VoiceDescription> scanFolder(const QString &folder);
+    static std::optional<VoiceDescription> parseBundle(const QString &bundlePath, QString *error);
     std::optional<VoiceDescription> voiceForRequest(const SpeechRequest &request);
     void renderFinished(quint64 requestId, const std::optional<PcmAudio> &audio, const QString &error);
     void finishCurrent(bool completed);
@@ -59,6 +70,8 @@ private:
     QList<VoiceDescription> m_merged;
     QStringList m_mergedKey;
     quint64 m_generation = 0;
+    std::optional<QString> m_indexPath;
+    std::unique_ptr<VoiceIndex> m_index; ///< loaded at the first scan
 
     quint64 m_nextRequest = 1;
     quint64 m_currentRequest = 0;

@@ -54,6 +54,8 @@ struct SpeechSynthesisService::Catalog
     QStringList available;
     // Answers of voiceIdentifiersInGroups(), filled on demand; guarded by m_catalogMutex.
     mutable QHash<QStringList, QStringList> byGroups;
+    // Answers of rememberedForVoices(); guarded by m_catalogMutex.
+    mutable QHash<QString, QString> remembered;
 };
 
 std::shared_ptr<const SpeechSynthesisService::Catalog> SpeechSynthesisService::catalog()
@@ -121,6 +123,23 @@ QStringList SpeechSynthesisService::voiceIdentifiersInGroups(const QStringList &
     QMutexLocker locker(&m_catalogMutex);
     snapshot->byGroups.insert(groups, result);
     return result;
+}
+
+QString SpeechSynthesisService::rememberedForVoices(
+    const QString &key, const std::function<QString()> &compute)
+{
+    const auto snapshot = catalog();
+    {
+        QMutexLocker locker(&m_catalogMutex);
+        if (auto it = snapshot->remembered.constFind(key); it != snapshot->remembered.cend()) {
+            return *it;
+        }
+    }
+    const QString answer = compute();
+    QMutexLocker locker(&m_catalogMutex);
+    // Computed against this snapshot's voices, the answer belongs to it even if the voices changed since.
+    snapshot->remembered.insert(key, answer);
+    return answer;
 }
 
 QStringList SpeechSynthesisService::availableVoices()

@@ -9,6 +9,7 @@
 #include <QObject>
 #include <QStringList>
 
+#include <functional>
 #include <memory>
 #include <optional>
 
@@ -85,6 +86,12 @@ public:
      */
     [[nodiscard]] QString preferredVoiceForLocale(
         const QStringList &identifiers, const QString &localeIdentifier);
+    /**
+     * What @p compute answers for @p key, computed once for the installed voices as they are: a
+     * change of the voices (a new voicesGeneration()) forgets every answer. @p key must name every
+     * other input of the answer, such as the preferences it read.
+     */
+    [[nodiscard]] QString rememberedForVoices(const QString &key, const std::function<QString()> &compute);
 
 Q_SIGNALS:
     void speakingFinished(quint64 requestId, bool completed);

@@ -3,6 +3,7 @@
 #include "core/services/PreferencesStore.h"
 #include "core/services/Services.h"
 #include "core/services/SpeechSynthesisService.h"
+#include "core/services/UserLocaleService.h"
 #include "core/speech-items/CZSpeechItem_p.h"
 
 #include <QAtomicInteger>
@@ -236,20 +237,36 @@ QStringList SpeechSynthesizer::avaliableMainstreamVoices()
 
 QString SpeechSynthesizer::defaultVoiceFromAllVoices()
 {
+    // Every value() reads the domain again when its file changed, so no synchronize() first.
     Platform::PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(VoicePreferencesDomain);
     const QVariant creator
         = preferences.value(QStringLiteral("SelectedVoiceCreator"), VoicePreferencesDomain);
+    const QVariant id = SpeechItemPrivate::isNumber(creator)
+        ? preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain)
+        : QVariant();
     SpeechSynthesisService &service = Services::speechSynthesis();
+    const QString locale = service.speechLanguageLocale().value_or(QString());
+    // The key names every input of the answer besides the voices, so that a preference change is a
+    // new question; a change of the voices forgets every answer.
+    QString key = QStringLiteral("defaultVoiceFromAllVoices|");
     if (SpeechItemPrivate::isNumber(creator)) {
-        const QVariant id = preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain);
-        const qint32 idValue = SpeechItemPrivate::isNumber(id) ? qint32(id.toLongLong()) : 0;
-        const QString identifier = service.voiceIdentifierForSpec(qint32(creator.toLongLong()), idValue);
-        if (!identifier.isEmpty()) {
-            return identifier;
-        }
+        key += QString::number(creator.toLongLong()) + QLatin1Char('/')
+            + (SpeechItemPrivate::isNumber(id) ? QString::number(id.toLongLong()) : QStringLiteral("-"));
     }
-    return service.preferredVoiceForLocale(allVoices(), service.speechLanguageLocale().value_or(QString()));
+    key += QLatin1Char('|') + locale;
+    if (locale.isEmpty()) {
+        key += QLatin1Char('|') + Services::userLocale().preferredLanguages().value(0);
+    }
+    return service.rememberedForVoices(key, [&] {
+        if (SpeechItemPrivate::isNumber(creator)) {
+            const qint32 idValue = SpeechItemPrivate::isNumber(id) ? qint32(id.toLongLong()) : 0;
+            const QString identifier = service.voiceIdentifierForSpec(qint32(creator.toLongLong()), idValue);
+            if (!identifier.isEmpty()) {
+                return identifier;
+            }
+        }
+        return service.preferredVoiceForLocale(allVoices(), locale);
+    });
 }
 
 QString SpeechSynthesizer::defaultVoiceFromMainstreamVoices()

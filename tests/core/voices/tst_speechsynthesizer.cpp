@@ -86,6 +86,43 @@ private Q_SLOTS:
         QCOMPARE(SpeechSynthesizer::defaultVoiceFromAllVoices(), P + QStringLiteral("maren.premium"));
     }
 
+    void defaultVoiceFollowsEveryChange()
+    {
+        // Each question is asked twice: the second answer is the remembered one, and must agree.
+        auto ask = [] {
+            const QString first = SpeechSynthesizer::defaultVoiceFromAllVoices();
+            const QString again = SpeechSynthesizer::defaultVoiceFromAllVoices();
+            return first == again ? first : QStringLiteral("differs: %1 %2").arg(first, again);
+        };
+        m_service->setSpeechLanguageLocale(QStringLiteral("de_DE"));
+        QCOMPARE(ask(), P + QStringLiteral("liesel.compact"));
+        // A preference change is a new question.
+        m_preferences->setValue(QStringLiteral("SelectedVoiceCreator"), 5, Domain);
+        m_preferences->setValue(QStringLiteral("SelectedVoiceID"), 2, Domain);
+        QVERIFY(m_preferences->synchronize(Domain));
+        QCOMPARE(ask(), P + QStringLiteral("maren.compact"));
+        m_preferences->setValue(QStringLiteral("SelectedVoiceID"), 3, Domain);
+        QVERIFY(m_preferences->synchronize(Domain));
+        QCOMPARE(ask(), P + QStringLiteral("maren.premium"));
+        m_preferences->setValue(QStringLiteral("SelectedVoiceCreator"), QVariant(), Domain);
+        QVERIFY(m_preferences->synchronize(Domain));
+        QCOMPARE(ask(), P + QStringLiteral("liesel.compact"));
+        // So is another speech language, or with none, another first language of the user.
+        m_service->setSpeechLanguageLocale(std::nullopt);
+        m_locale->setPreferredLanguages({QStringLiteral("de_DE")});
+        QCOMPARE(ask(), P + QStringLiteral("liesel.compact"));
+        m_locale->setPreferredLanguages({QStringLiteral("en_US")});
+        QCOMPARE(ask(), P + QStringLiteral("maren.premium"));
+        // A change of the installed voices forgets the answers.
+        QVariantMap attributes = TestEnvironment::voiceAttributes(
+            P + QStringLiteral("Ava.premium"), QStringLiteral("Ava"), QStringLiteral("en_US"));
+        attributes.insert(VoiceAttribute::RelativeDesirability, 9000);
+        m_service->addVoice(attributes);
+        QCOMPARE(ask(), P + QStringLiteral("Ava.premium"));
+        m_service->removeVoice(P + QStringLiteral("Ava.premium"));
+        QCOMPARE(ask(), P + QStringLiteral("maren.premium"));
+    }
+
     void storedSpecOfNoVoiceFallsThrough()
     {
         m_preferences->setValue(QStringLiteral("SelectedVoiceCreator"), 5, Domain);
