@@ -1,7 +1,11 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 #include "Transcriber.h"
 
+#include "platform/LocalizationTable.h"
 #include "platform/RecognitionEngines.h"
+#include "platform/RecognitionService.h"
+#include "platform/Services.h"
+#include "recognition-languages/CZSRLanguageItem.h"
 
 #include <cmath>
 
@@ -25,6 +29,29 @@ std::unique_ptr<Transcriber> Transcriber::load(const Platform::RecognizerModel &
         return nullptr;
     }
     return std::make_unique<Transcriber>(std::move(decoder), engine->sampleRate());
+}
+
+std::unique_ptr<Transcriber> Transcriber::loadForLanguage(const QString &language, QString *error)
+{
+    Platform::RecognitionService &recognition = Platform::Services::recognition();
+    QString locale = language;
+    if (locale.isEmpty()) {
+        const QStringList installed = recognition.installedLanguages().value_or(QStringList());
+        if (installed.isEmpty()) {
+            *error = QStringLiteral("no recognition language is installed");
+            return nullptr;
+        }
+        locale = CZSRLanguageItem::preferredDictationLocaleIdentifierFromAvaiableLocaleIdentifiers(
+            installed, QString());
+    }
+    const auto model = recognition.modelForLocale(locale, error);
+    auto transcriber = model ? load(*model, error) : nullptr;
+    // A language that has a bundle but cannot be used is named so; a missing one keeps its reason.
+    if (!transcriber && !recognition.bundlePathForLocale(locale).isEmpty()) {
+        *error = Platform::LocalizationTable::shared().format(
+            QStringLiteral("RecognitionLanguageUnusable"), {locale, *error});
+    }
+    return transcriber;
 }
 
 Transcriber::Transcriber(std::unique_ptr<Platform::RecognitionDecoder> decoder, int sampleRate)
