@@ -7,10 +7,10 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
-#include "dictation/Transcriber.h"
-#include "platform/AudioFileReader.h"
-#include "platform/Paths.h"
-#include "platform/RecognitionService.h"
+#include "core/dictation/Transcriber.h"
+#include "core/files/Paths.h"
+#include "core/formats/AudioFileReader.h"
+#include "core/services/RecognitionService.h"
 
 #include <QCoreApplication>
 #include <QProcess>

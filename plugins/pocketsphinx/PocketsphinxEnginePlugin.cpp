@@ -4,8 +4,8 @@
 #include "PocketsphinxDecoder.h"
 #include "PocketsphinxModelCheck.h"
 
-#include "platform/IsolatedRun.h"
-#include "platform/Paths.h"
+#include "core/files/Paths.h"
+#include "core/services/IsolatedRun.h"
 
 #include <QCryptographicHash>
 #include <QDir>

@@ -5,7 +5,7 @@
 #include "TestEnvironment.h"
 #include "TryDictationArea.h"
 
-#include "platform/Paths.h"
+#include "core/files/Paths.h"
 
 #include <QLabel>
 #include <QPushButton>

@@ -6,8 +6,8 @@
 #include "TestEnvironment.h"
 #include "TryDictationArea.h"
 
-#include "dictation/Recognizer.h"
-#include "platform/Paths.h"
+#include "core/dictation/Recognizer.h"
+#include "core/files/Paths.h"
 
 #include <QLabel>
 #include <QProcess>
