@@ -44,7 +44,7 @@ struct DictationService::Models
         QString reason;
         const auto model = Platform::Services::recognition().modelForLocale(locale, &reason);
         if (!model) {
-            *error = QStringLiteral("The recognition language %1 cannot be used: %2").arg(locale, reason);
+            *error = QStringLiteral("The recognition language %1 is unusable: %2").arg(locale, reason);
             return nullptr;
         }
         *canonical = model->localeIdentifier.isEmpty() ? locale : model->localeIdentifier;
@@ -56,8 +56,7 @@ struct DictationService::Models
         }
         auto transcriber = Transcriber::load(*model, &reason);
         if (!transcriber) {
-            *error = QStringLiteral("The model of the recognition language %1 cannot be loaded: %2")
-                         .arg(*canonical, reason);
+            *error = QStringLiteral("The recognition language %1 is unusable: %2").arg(*canonical, reason);
             return nullptr;
         }
         Transcriber *result = transcriber.get();

@@ -33,6 +33,8 @@ TryDictationArea::TryDictationArea(std::function<QString()> language, QWidget *p
     layout->addWidget(m_button);
     layout->addWidget(m_words, 1);
     connect(m_button, &QPushButton::clicked, this, &TryDictationArea::toggle);
+    connect(m_recognizer, &Recognizer::listening, this,
+        [this] { m_words->setText(text("SettingsTryDictationListening")); });
     connect(m_recognizer, &Recognizer::partialResult, m_words, &QLabel::setText);
     connect(m_recognizer, &Recognizer::finalResult, this, [this](const QString &words) {
         showIdle();
@@ -64,6 +66,7 @@ void TryDictationArea::toggle()
     }
     m_recognizer->setLanguage(m_language ? m_language() : QString());
     m_button->setText(text("SettingsTryDictationStop"));
-    m_words->setText(text("SettingsTryDictationListening"));
+    // The model loads and the microphone opens on the recognizer's thread; listening() says when.
+    m_words->setText(text("SettingsTryDictationPreparing"));
     m_recognizer->startFromMicrophone();
 }

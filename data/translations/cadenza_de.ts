@@ -193,6 +193,70 @@ Befehle:
         <source>speaking failed</source>
         <translation>das Sprechen ist fehlgeschlagen</translation>
     </message>
+    <message id="CLIDictateDescription">
+        <source>Prints the words spoken in FILE.wav (any sample rate, format or number of channels), recognised with the installed recognizer of your preferred dictation language or the one chosen with --language.</source>
+        <translation>Gibt die in FILE.wav gesprochenen Wörter aus (jede Abtastrate, jedes Format, jede Kanalzahl), erkannt mit der installierten Erkennung Ihrer bevorzugten Diktiersprache oder der mit --language gewählten.</translation>
+    </message>
+    <message id="CLILanguageOption">
+        <source>Recognise with the recognizer of LOCALE (e.g. en_US).</source>
+        <translation>Mit der Erkennung von LOCALE erkennen (z. B. en_US).</translation>
+    </message>
+    <message id="CLIGrammarOption">
+        <source>Recognise only the sentences of the JSGF grammar FILE.gram.</source>
+        <translation>Nur die Sätze der JSGF-Grammatik FILE.gram erkennen.</translation>
+    </message>
+    <message id="CLIMicrophoneOption">
+        <source>Listen to the microphone instead of a file: partial results on standard error, the final text when Enter is pressed.</source>
+        <translation>Dem Mikrofon statt einer Datei zuhören: Zwischenergebnisse auf der Standardfehlerausgabe, der fertige Text, sobald die Eingabetaste gedrückt wird.</translation>
+    </message>
+    <message id="CLIRecordingOperand">
+        <source>The recording to transcribe.</source>
+        <translation>Die Aufnahme, die abgeschrieben werden soll.</translation>
+    </message>
+    <message id="CLIGiveOneRecording">
+        <source>give one sound file or --microphone (see --help)</source>
+        <translation>geben Sie eine Tondatei oder --microphone an (siehe --help)</translation>
+    </message>
+    <message id="CLINoSuchRecording">
+        <source>no file %1</source>
+        <translation>keine Datei %1</translation>
+    </message>
+    <message id="CLINoSuchGrammar">
+        <source>no grammar file %1</source>
+        <translation>keine Grammatikdatei %1</translation>
+    </message>
+    <message id="CLINoRecognitionLanguage">
+        <source>no recognition language is installed (see 'cadenza languages' and 'cadenza install')</source>
+        <translation>keine Diktiersprache ist installiert (siehe „cadenza languages“ und „cadenza install“)</translation>
+    </message>
+    <message id="CLIListening">
+        <source>Listening; press Enter to finish.</source>
+        <translation>Ich höre zu; zum Beenden die Eingabetaste drücken.</translation>
+    </message>
+    <message id="CLINoWordsRecognised">
+        <source>no words were recognised in %1 (%2 s of sound)</source>
+        <translation>in %1 wurden keine Wörter erkannt (%2 s Ton)</translation>
+    </message>
+    <message id="CLINoWordsHeard">
+        <source>no words were recognised</source>
+        <translation>es wurden keine Wörter erkannt</translation>
+    </message>
+    <message id="MicrophoneMissing">
+        <source>no microphone is connected (the system lists no audio input)</source>
+        <translation>kein Mikrofon ist angeschlossen (das System kennt keinen Toneingang)</translation>
+    </message>
+    <message id="MicrophoneFormatUnsupported">
+        <source>the microphone '%1' cannot record 16-bit mono at %2 Hz</source>
+        <translation>das Mikrofon „%1“ kann nicht 16 Bit mono mit %2 Hz aufnehmen</translation>
+    </message>
+    <message id="MicrophoneCannotOpen">
+        <source>the microphone '%1' cannot be opened</source>
+        <translation>das Mikrofon „%1“ lässt sich nicht öffnen</translation>
+    </message>
+    <message id="RecognitionLanguageUnusable">
+        <source>the recognition language %1 is unusable: %2</source>
+        <translation>die Diktiersprache %1 ist nicht nutzbar: %2</translation>
+    </message>
     <message id="CLILanguagesDescription">
         <source>Lists the recognition (dictation) languages: those installed on this computer and those that can be downloaded, with their names in your language and whether you chose to show them (0 hidden, 1 shown, 2 automatic).</source>
         <translation>Listet die Diktiersprachen auf: die auf diesem Computer installierten und die ladbaren, mit ihren Namen in Ihrer Sprache und ob Sie sie anzeigen lassen (0 ausgeblendet, 1 angezeigt, 2 automatisch).</translation>
@@ -632,6 +696,10 @@ Befehle:
     <message id="SettingsTryDictationHint">
         <source>Press Record, speak, then press Stop.</source>
         <translation>Auf „Aufnehmen“ klicken, sprechen, dann „Anhalten“.</translation>
+    </message>
+    <message id="SettingsTryDictationPreparing">
+        <source>Preparing…</source>
+        <translation>Wird vorbereitet …</translation>
     </message>
     <message id="SettingsTryDictationListening">
         <source>Listening…</source>

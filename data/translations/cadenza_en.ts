@@ -193,6 +193,70 @@ Run 'cadenza COMMAND --help' for the options of a command.</translation>
         <source>speaking failed</source>
         <translation>speaking failed</translation>
     </message>
+    <message id="CLIDictateDescription">
+        <source>Prints the words spoken in FILE.wav (any sample rate, format or number of channels), recognised with the installed recognizer of your preferred dictation language or the one chosen with --language.</source>
+        <translation>Prints the words spoken in FILE.wav (any sample rate, format or number of channels), recognised with the installed recognizer of your preferred dictation language or the one chosen with --language.</translation>
+    </message>
+    <message id="CLILanguageOption">
+        <source>Recognise with the recognizer of LOCALE (e.g. en_US).</source>
+        <translation>Recognise with the recognizer of LOCALE (e.g. en_US).</translation>
+    </message>
+    <message id="CLIGrammarOption">
+        <source>Recognise only the sentences of the JSGF grammar FILE.gram.</source>
+        <translation>Recognise only the sentences of the JSGF grammar FILE.gram.</translation>
+    </message>
+    <message id="CLIMicrophoneOption">
+        <source>Listen to the microphone instead of a file: partial results on standard error, the final text when Enter is pressed.</source>
+        <translation>Listen to the microphone instead of a file: partial results on standard error, the final text when Enter is pressed.</translation>
+    </message>
+    <message id="CLIRecordingOperand">
+        <source>The recording to transcribe.</source>
+        <translation>The recording to transcribe.</translation>
+    </message>
+    <message id="CLIGiveOneRecording">
+        <source>give one sound file or --microphone (see --help)</source>
+        <translation>give one sound file or --microphone (see --help)</translation>
+    </message>
+    <message id="CLINoSuchRecording">
+        <source>no file %1</source>
+        <translation>no file %1</translation>
+    </message>
+    <message id="CLINoSuchGrammar">
+        <source>no grammar file %1</source>
+        <translation>no grammar file %1</translation>
+    </message>
+    <message id="CLINoRecognitionLanguage">
+        <source>no recognition language is installed (see 'cadenza languages' and 'cadenza install')</source>
+        <translation>no recognition language is installed (see 'cadenza languages' and 'cadenza install')</translation>
+    </message>
+    <message id="CLIListening">
+        <source>Listening; press Enter to finish.</source>
+        <translation>Listening; press Enter to finish.</translation>
+    </message>
+    <message id="CLINoWordsRecognised">
+        <source>no words were recognised in %1 (%2 s of sound)</source>
+        <translation>no words were recognised in %1 (%2 s of sound)</translation>
+    </message>
+    <message id="CLINoWordsHeard">
+        <source>no words were recognised</source>
+        <translation>no words were recognised</translation>
+    </message>
+    <message id="MicrophoneMissing">
+        <source>no microphone is connected (the system lists no audio input)</source>
+        <translation>no microphone is connected (the system lists no audio input)</translation>
+    </message>
+    <message id="MicrophoneFormatUnsupported">
+        <source>the microphone '%1' cannot record 16-bit mono at %2 Hz</source>
+        <translation>the microphone '%1' cannot record 16-bit mono at %2 Hz</translation>
+    </message>
+    <message id="MicrophoneCannotOpen">
+        <source>the microphone '%1' cannot be opened</source>
+        <translation>the microphone '%1' cannot be opened</translation>
+    </message>
+    <message id="RecognitionLanguageUnusable">
+        <source>the recognition language %1 is unusable: %2</source>
+        <translation>the recognition language %1 is unusable: %2</translation>
+    </message>
     <message id="CLILanguagesDescription">
         <source>Lists the recognition (dictation) languages: those installed on this computer and those that can be downloaded, with their names in your language and whether you chose to show them (0 hidden, 1 shown, 2 automatic).</source>
         <translation>Lists the recognition (dictation) languages: those installed on this computer and those that can be downloaded, with their names in your language and whether you chose to show them (0 hidden, 1 shown, 2 automatic).</translation>
@@ -632,6 +696,10 @@ Run 'cadenza COMMAND --help' for the options of a command.</translation>
     <message id="SettingsTryDictationHint">
         <source>Press Record, speak, then press Stop.</source>
         <translation>Press Record, speak, then press Stop.</translation>
+    </message>
+    <message id="SettingsTryDictationPreparing">
+        <source>Preparing…</source>
+        <translation>Preparing…</translation>
     </message>
     <message id="SettingsTryDictationListening">
         <source>Listening…</source>

@@ -28,6 +28,22 @@ public:
     static QString writeTinyBundle(
         const QString &folder, const QString &locale, const QString &bundleName = {});
 
+    enum class Damage { Truncated, Zeroed, WrongMagic };
+    /// The model files a damaged bundle can have damaged: "acoustic/<name>", "language.lm.bin",
+    /// "pronunciation.dict".
+    [[nodiscard]] static QStringList modelFiles();
+
+    /**
+     * Writes a bundle like writeModelBundle() whose file @p file (one of modelFiles()) is a copy
+     * with @p damage: cut to half its length, every byte zero, or its first four bytes changed.
+     */
+    static QString writeDamagedBundle(
+        const QString &folder, const QString &locale, const QString &file, Damage damage);
+
+    /// Word error rate of @p hypothesis against @p reference: word edit distance over the reference's
+    /// word count, case and punctuation ignored.
+    [[nodiscard]] static double wordErrorRate(const QString &reference, const QString &hypothesis);
+
     /// Writes a bundle with only an Info.plist holding @p info.
     static QString writeBareBundle(const QString &folder, const QString &name, const QVariantMap &info);
 };

@@ -1,40 +1,15 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 #include "Recognizer.h"
 
+#include "MicrophoneSession.h"
 #include "Transcriber.h"
 #include "core/formats/AudioFileReader.h"
-#include "core/recognition-items/CZSRLanguageItem.h"
-#include "core/services/Microphone.h"
-#include "core/services/RecognitionService.h"
-#include "core/services/Services.h"
 
 #include <QCoreApplication>
 #include <QPointer>
 #include <QThread>
 
 namespace Cadenza {
-
-namespace {
-
-/// The model for @p language, or for the preferred dictation language among the installed ones.
-std::unique_ptr<Transcriber> loadTranscriber(const QString &language, QString *error)
-{
-    Platform::RecognitionService &recognition = Platform::Services::recognition();
-    QString locale = language;
-    if (locale.isEmpty()) {
-        const QStringList installed = recognition.installedLanguages().value_or(QStringList());
-        if (installed.isEmpty()) {
-            *error = QStringLiteral("no recognition language is installed");
-            return nullptr;
-        }
-        locale = CZSRLanguageItem::preferredDictationLocaleIdentifierFromAvaiableLocaleIdentifiers(
-            installed, QString());
-    }
-    const auto model = recognition.modelForLocale(locale, error);
-    return model ? Transcriber::load(*model, error) : nullptr;
-}
-
-} // namespace
 
 Recognizer::Recognizer(QObject *parent)
     : QObject(parent)
@@ -78,7 +53,7 @@ void Recognizer::startFromFile(const QString &path)
                 Q_EMIT r->failed(reason);
             });
         };
-        const auto transcriber = loadTranscriber(language, &error);
+        const auto transcriber = Transcriber::loadForLanguage(language, &error);
         if (!transcriber) {
             return fail(error);
         }
@@ -124,52 +99,39 @@ void Recognizer::startFromMicrophone()
 {
     cancel();
     ++m_generation;
-    QString error;
-    m_transcriber = loadTranscriber(m_language, &error);
-    if (!m_transcriber || !m_transcriber->begin(m_grammarFile, &error)) {
-        m_transcriber.reset();
-        Q_EMIT failed(error);
-        return;
-    }
-    m_microphone = std::make_unique<Platform::Microphone>();
-    if (!m_microphone->start(m_transcriber->sampleRate(), &error)) {
-        m_microphone.reset();
-        m_transcriber.reset();
-        Q_EMIT failed(error);
-        return;
-    }
     m_running = true;
-    connect(m_microphone.get(), &Platform::Microphone::samplesAvailable, this,
-        [this](const QVector<qint16> &samples) {
-            QString error;
-            if (!m_transcriber || !m_transcriber->feed(samples.constData(), samples.size(), &error)) {
-                cancel();
-                Q_EMIT failed(error);
-                return;
-            }
-            Q_EMIT partialResult(m_transcriber->partialResult());
-        });
+    m_session = new MicrophoneSession(m_language, m_grammarFile);
+    m_session->moveToThread(MicrophoneSession::audioThread());
+    // Queued: the session's signals come from the audio thread; once it is ended or cancelled it
+    // is disconnected, so nothing it still sends arrives.
+    connect(m_session, &MicrophoneSession::listening, this, &Recognizer::listening);
+    connect(m_session, &MicrophoneSession::partialResult, this, &Recognizer::partialResult);
+    connect(m_session, &MicrophoneSession::finalResult, this, [this](const QString &text) {
+        endMicrophone();
+        Q_EMIT finalResult(text);
+    });
+    connect(m_session, &MicrophoneSession::failed, this, [this](const QString &reason) {
+        endMicrophone();
+        Q_EMIT failed(reason);
+    });
+    QMetaObject::invokeMethod(m_session, &MicrophoneSession::start, Qt::QueuedConnection);
 }
 
 void Recognizer::stop()
 {
-    if (m_microphone) {
-        finishMicrophone();
+    if (m_session) {
+        QMetaObject::invokeMethod(m_session, &MicrophoneSession::finish, Qt::QueuedConnection);
     }
 }
 
-void Recognizer::finishMicrophone()
+void Recognizer::endMicrophone()
 {
-    m_microphone.reset();
-    QString error;
-    const auto text = m_transcriber ? m_transcriber->finish(&error) : std::nullopt;
-    m_transcriber.reset();
-    m_running = false;
-    if (text) {
-        Q_EMIT finalResult(*text);
-    } else {
-        Q_EMIT failed(error);
+    if (m_session) {
+        disconnect(m_session, nullptr, this, nullptr);
+        m_session->deleteLater(); // on its own thread
+        m_session = nullptr;
     }
+    m_running = false;
 }
 
 void Recognizer::cancel()
@@ -178,9 +140,7 @@ void Recognizer::cancel()
         *m_cancelled = true;
         m_cancelled.reset();
     }
-    m_microphone.reset();
-    m_transcriber.reset();
-    m_running = false;
+    endMicrophone();
 }
 
 } // namespace Cadenza

@@ -12,10 +12,7 @@
 
 namespace Cadenza {
 
-namespace Platform {
-class Microphone;
-}
-class Transcriber;
+class MicrophoneSession;
 
 /**
  * Speech to text for applications. A recognition runs on a worker thread for files (the event loop
@@ -36,7 +33,11 @@ public:
 
     /// Transcribes the sound file @p path; finalResult() or failed() follows.
     void startFromFile(const QString &path);
-    /// Listens to the microphone until stop(); failed() at once when there is none.
+    /**
+     * Listens to the microphone until stop(): listening() once the model is loaded and the microphone
+     * open, failed() when there is none. The model is loaded and the microphone opened and decoded on
+     * a thread of the library's, so this returns at once.
+     */
     void startFromMicrophone();
     /// Ends listening to the microphone; finalResult() follows.
     void stop();
@@ -45,19 +46,20 @@ public:
     [[nodiscard]] bool isRunning() const { return m_running; }
 
 Q_SIGNALS:
+    /// The microphone is open: what is said from now on is recognised.
+    void listening();
     void partialResult(const QString &text);
     void finalResult(const QString &text);
     void failed(const QString &reason);
 
 private:
-    void finishMicrophone();
+    void endMicrophone();
 
     QString m_language;
     QString m_grammarFile;
     bool m_running = false;
     std::shared_ptr<std::atomic<bool>> m_cancelled;
-    std::unique_ptr<Platform::Microphone> m_microphone;
-    std::unique_ptr<Transcriber> m_transcriber;
+    MicrophoneSession *m_session = nullptr; ///< lives on MicrophoneSession::audioThread()
     quint64 m_generation = 0;
 };
 

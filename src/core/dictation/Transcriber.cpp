@@ -2,6 +2,10 @@
 #include "Transcriber.h"
 
 #include "core/engines/RecognitionEngines.h"
+#include "core/locale/LocalizationTable.h"
+#include "core/recognition-items/CZSRLanguageItem.h"
+#include "core/services/RecognitionService.h"
+#include "core/services/Services.h"
 
 #include <cmath>
 
@@ -25,6 +29,29 @@ std::unique_ptr<Transcriber> Transcriber::load(const Platform::RecognizerModel &
         return nullptr;
     }
     return std::make_unique<Transcriber>(std::move(decoder), engine->sampleRate());
+}
+
+std::unique_ptr<Transcriber> Transcriber::loadForLanguage(const QString &language, QString *error)
+{
+    Platform::RecognitionService &recognition = Platform::Services::recognition();
+    QString locale = language;
+    if (locale.isEmpty()) {
+        const QStringList installed = recognition.installedLanguages().value_or(QStringList());
+        if (installed.isEmpty()) {
+            *error = QStringLiteral("no recognition language is installed");
+            return nullptr;
+        }
+        locale = CZSRLanguageItem::preferredDictationLocaleIdentifierFromAvaiableLocaleIdentifiers(
+            installed, QString());
+    }
+    const auto model = recognition.modelForLocale(locale, error);
+    auto transcriber = model ? load(*model, error) : nullptr;
+    // A language that has a bundle but cannot be used is named so; a missing one keeps its reason.
+    if (!transcriber && !recognition.bundlePathForLocale(locale).isEmpty()) {
+        *error = Platform::LocalizationTable::shared().format(
+            QStringLiteral("RecognitionLanguageUnusable"), {locale, *error});
+    }
+    return transcriber;
 }
 
 Transcriber::Transcriber(std::unique_ptr<Platform::RecognitionDecoder> decoder, int sampleRate)

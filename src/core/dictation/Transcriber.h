@@ -29,6 +29,13 @@ public:
     [[nodiscard]] static std::unique_ptr<Transcriber> load(
         const Platform::RecognizerModel &model, QString *error);
 
+    /**
+     * Loads the model of the installed recognizer of @p language, or of the preferred dictation
+     * language among the installed ones when it is empty.
+     */
+    [[nodiscard]] static std::unique_ptr<Transcriber> loadForLanguage(
+        const QString &language, QString *error);
+
     Transcriber(std::unique_ptr<Platform::RecognitionDecoder> decoder, int sampleRate);
     ~Transcriber();
 

@@ -25,12 +25,17 @@ public:
      * microphone or it cannot record 16-bit mono at that rate.
      */
     [[nodiscard]] bool start(int sampleRate, QString *error);
+    /// Hands on what was recorded but not yet delivered, then stops recording.
+    void finish();
+    /// Stops recording and drops what was not yet delivered.
     void stop();
 
 Q_SIGNALS:
     void samplesAvailable(const QVector<qint16> &samples);
 
 private:
+    void deliver();
+
     QAudioSource *m_source = nullptr;
     QIODevice *m_device = nullptr;
     QByteArray m_pending;

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 // Recognition with the pocketsphinx engine: which recognizer bundles count as installed, and
 // "cadenza dictate" on speech made by the project's own voices and on bad sound files.
+#include "PrivateSoundServer.h"
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
@@ -12,10 +13,12 @@
 #include "core/formats/WaveFile.h"
 #include "core/services/RecognitionService.h"
 
+#include <QElapsedTimer>
 #include <QFile>
 #include <QProcess>
 #include <QRegularExpression>
 #include <QSignalSpy>
+#include <QTemporaryDir>
 #include <QTest>
 
 #include <cmath>
@@ -35,9 +38,17 @@ struct Result
     QString err;
 };
 
-Result cadenza(const QStringList &arguments)
+/// The sound server the tests' own processes use unless a test starts one: none listens there.
+QString absentSoundServer;
+
+Result cadenza(const QStringList &arguments, const QProcessEnvironment &environment = {})
 {
     QProcess process;
+    QProcessEnvironment used = environment.isEmpty() ? QProcessEnvironment::systemEnvironment() : environment;
+    if (!used.contains(QStringLiteral("PULSE_SERVER"))) {
+        used.insert(QStringLiteral("PULSE_SERVER"), absentSoundServer);
+    }
+    process.setProcessEnvironment(used);
     process.start(QStringLiteral(CADENZA_CLI_PATH), arguments);
     process.closeWriteChannel();
     if (!process.waitForFinished(120000)) {
@@ -113,6 +124,14 @@ class DictationTest : public QObject
     }
 
 private Q_SLOTS:
+    void initTestCase()
+    {
+        // No sound server of the machine's, nor one started on demand, is ever reached.
+        static QTemporaryDir folder;
+        absentSoundServer = PrivateSoundServer::absentAddress(folder.path());
+        qputenv("PULSE_SERVER", absentSoundServer.toLocal8Bit());
+    }
+
     void init()
     {
         m_environment = std::make_unique<TestEnvironment>();
@@ -356,6 +375,151 @@ private Q_SLOTS:
         QCOMPARE(r.exitCode, 2);
     }
 
+    /// A sound server that runs but has no input: the same plain message.
+    void aServerWithoutInputsHasNoMicrophone()
+    {
+        PrivateSoundServer server(PrivateSoundServer::Input::None);
+        QVERIFY2(server.isRunning(), qPrintable(server.error()));
+        const Result r = cadenza(
+            {QStringLiteral("dictate"), QStringLiteral("--microphone")}, server.clientEnvironment());
+        QCOMPARE(r.exitCode, 1);
+        QVERIFY2(r.err.contains(QStringLiteral("no microphone is connected")), qPrintable(r.err));
+        QCOMPARE(r.out, QString());
+    }
+
+    /// Speech played into the sound server's only input while "cadenza dictate --microphone" listens:
+    /// partial results appear on standard error as it speaks, the text on standard output after Enter.
+    void dictatingFromTheMicrophone_data()
+    {
+        QTest::addColumn<QString>("voice");
+        QTest::addColumn<QString>("sentence");
+        QTest::addColumn<bool>("grammar");
+        QTest::newRow("grammar slt") << QStringLiteral("slt") << QStringLiteral("lock the garage") << true;
+        QTest::newRow("grammar rms") << QStringLiteral("rms") << QStringLiteral("turn off the light") << true;
+        QTest::newRow("free rms") << QStringLiteral("rms")
+                                  << QStringLiteral("We are going to the station tomorrow morning.") << false;
+    }
+    void dictatingFromTheMicrophone()
+    {
+        QFETCH(QString, voice);
+        QFETCH(QString, sentence);
+        QFETCH(bool, grammar);
+        const QString wav = speak(voice, sentence, QStringLiteral("spoken.wav"));
+        QVERIFY(!wav.isEmpty());
+        PrivateSoundServer server;
+        QVERIFY2(server.isRunning(), qPrintable(server.error()));
+
+        QProcess dictate;
+        dictate.setProcessEnvironment(server.clientEnvironment());
+        QStringList arguments {QStringLiteral("dictate"), QStringLiteral("--microphone")};
+        if (grammar) {
+            arguments << QStringLiteral("--grammar") << writeGrammar();
+        }
+        dictate.start(QStringLiteral(CADENZA_CLI_PATH), arguments);
+        QVERIFY(dictate.waitForStarted());
+        QByteArray err;
+        QElapsedTimer waited;
+        waited.start();
+        while (
+            !err.contains("Listening") && waited.elapsed() < 60000 && dictate.state() == QProcess::Running) {
+            dictate.waitForReadyRead(200);
+            err += dictate.readAllStandardError();
+        }
+        QVERIFY2(err.contains("Listening; press Enter to finish."), err.constData());
+        QVERIFY(server.play(wav));
+        // The pause after the words ends the utterance; then Enter.
+        QTest::qWait(1200);
+        dictate.write("\n");
+        QVERIFY(dictate.waitForFinished(60000));
+        err += dictate.readAllStandardError();
+        const QString out = QString::fromUtf8(dictate.readAllStandardOutput()).trimmed();
+        QCOMPARE(dictate.exitStatus(), QProcess::NormalExit);
+        QVERIFY2(dictate.exitCode() == 0, err.constData());
+        const QStringList partials
+            = QString::fromUtf8(err).split(QLatin1Char('\n')).filter(QStringLiteral("… "));
+        QVERIFY2(!partials.isEmpty(), err.constData());
+        if (grammar) {
+            QCOMPARE(out, sentence);
+        } else {
+            const double rate = wordErrorRate(words(sentence), words(out));
+            QVERIFY2(rate <= 0.20, qPrintable(QStringLiteral("%1 %: %2").arg(rate * 100).arg(out)));
+        }
+        // The last partial result already held the words; the final text is no shorter.
+        QVERIFY2(words(out).size() >= words(partials.last()).size(), err.constData());
+    }
+
+    /// A damaged file in a model: the language is unusable with a reason, the command ends normally
+    /// with status 1, and another language keeps working.
+    void aDamagedModelFileMakesTheLanguageUnusable_data()
+    {
+        QTest::addColumn<QString>("file");
+        QTest::addColumn<int>("damage");
+        QTest::addColumn<bool>("mayStillLoad");
+        for (const QString &file : RecognizerFixture::modelFiles()) {
+            // A pronouncing dictionary or noise dictionary cut at half, or with another first word,
+            // is still one (fewer or other words).
+            const bool text
+                = file.endsWith(QStringLiteral(".dict")) || file.endsWith(QStringLiteral("noisedict"));
+            QTest::newRow(qPrintable(file + QStringLiteral(" truncated")))
+                << file << int(RecognizerFixture::Damage::Truncated) << text;
+            QTest::newRow(qPrintable(file + QStringLiteral(" zeroed")))
+                << file << int(RecognizerFixture::Damage::Zeroed) << false;
+            QTest::newRow(qPrintable(file + QStringLiteral(" wrong magic")))
+                << file << int(RecognizerFixture::Damage::WrongMagic) << text;
+        }
+    }
+    void aDamagedModelFileMakesTheLanguageUnusable()
+    {
+        QFETCH(QString, file);
+        QFETCH(int, damage);
+        QFETCH(bool, mayStillLoad);
+        RecognizerFixture::writeDamagedBundle(
+            Paths::userRecognizersFolder(), QStringLiteral("nl_NL"), file, RecognizerFixture::Damage(damage));
+        const QString wav
+            = speak(QStringLiteral("slt"), QStringLiteral("open the door"), QStringLiteral("door.wav"));
+        const Result dutch = cadenza({QStringLiteral("dictate"), QStringLiteral("--language"),
+            QStringLiteral("nl_NL"), QStringLiteral("--grammar"), writeGrammar(), wav});
+        if (mayStillLoad) {
+            // A smaller dictionary is still one: words, or a clear error (its grammar's words are
+            // missing), never the end of the process.
+            QVERIFY2(dutch.exitCode == 0 || dutch.exitCode == 1,
+                qPrintable(QString::number(dutch.exitCode) + u' ' + dutch.err));
+        } else {
+            QVERIFY2(dutch.exitCode == 1, qPrintable(QString::number(dutch.exitCode) + u' ' + dutch.err));
+            QVERIFY2(dutch.err.contains(QStringLiteral("the recognition language nl_NL is unusable: ")),
+                qPrintable(dutch.err));
+            QCOMPARE(dutch.out, QString());
+        }
+        if (RecognizerFixture::Damage(damage) != RecognizerFixture::Damage::WrongMagic) {
+            return; // once per file is enough to see the intact language keep working
+        }
+        const Result english = cadenza({QStringLiteral("dictate"), QStringLiteral("--language"),
+            QStringLiteral("en_US"), QStringLiteral("--grammar"), writeGrammar(), wav});
+        QVERIFY2(english.exitCode == 0, qPrintable(english.err));
+        QCOMPARE(english.out.trimmed(), QStringLiteral("open the door"));
+    }
+
+    /// The command's messages follow the user's language.
+    void theMessagesAreLocalized()
+    {
+        QProcessEnvironment german = QProcessEnvironment::systemEnvironment();
+        german.insert(QStringLiteral("LANGUAGE"), QStringLiteral("de_DE"));
+        german.insert(QStringLiteral("LANG"), QStringLiteral("de_DE.UTF-8"));
+        Result r = cadenza({QStringLiteral("dictate")}, german);
+        QCOMPARE(r.exitCode, 2);
+        QVERIFY2(r.err.contains(QStringLiteral("geben Sie eine Tondatei oder --microphone an")),
+            qPrintable(r.err));
+        r = cadenza({QStringLiteral("dictate"), m_environment->path(QStringLiteral("absent.wav"))}, german);
+        QCOMPARE(r.exitCode, 1);
+        QVERIFY2(r.err.contains(QStringLiteral("keine Datei")), qPrintable(r.err));
+        r = cadenza({QStringLiteral("dictate"), QStringLiteral("--microphone")}, german);
+        QCOMPARE(r.exitCode, 1);
+        QVERIFY2(r.err.contains(QStringLiteral("kein Mikrofon ist angeschlossen")), qPrintable(r.err));
+        r = cadenza({QStringLiteral("dictate"), QStringLiteral("--help")}, german);
+        QCOMPARE(r.exitCode, 0);
+        QVERIFY2(r.out.contains(QStringLiteral("Dem Mikrofon statt einer Datei zuhören")), qPrintable(r.out));
+    }
+
     /// The application interface: results as signals, a cancelled run says nothing more.
     void theRecognizerSignalsItsResults()
     {
@@ -389,8 +553,11 @@ private Q_SLOTS:
         QTRY_COMPARE_WITH_TIMEOUT(failed.count(), 1, 60000);
         QVERIFY2(failed.at(0).at(0).toString().contains(QStringLiteral("is not a sound file")),
             qPrintable(failed.at(0).at(0).toString()));
+        QSignalSpy listening(&recognizer, &Recognizer::listening);
         recognizer.startFromMicrophone();
-        QCOMPARE(failed.count(), 2);
+        QVERIFY(recognizer.isRunning()); // the model loads and the microphone opens on another thread
+        QTRY_COMPARE_WITH_TIMEOUT(failed.count(), 2, 60000);
+        QCOMPARE(listening.count(), 0);
         QVERIFY2(failed.at(1).at(0).toString().contains(QStringLiteral("no microphone")),
             qPrintable(failed.at(1).at(0).toString()));
         QVERIFY(!recognizer.isRunning());

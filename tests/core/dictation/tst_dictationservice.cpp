@@ -9,6 +9,7 @@
 #include "core/files/Paths.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/services/DistributedNotificationCenter.h"
+#include "core/services/RecognitionService.h"
 #include "core/services/Services.h"
 #include "widgets/installation/CZSpeechInstallationManagerSheets.h"
 #include "widgets/recognition-languages/CZCustomizeSRLanguagesWindowController.h"
@@ -239,6 +240,43 @@ private Q_SLOTS:
             QStringLiteral("TranscribeFileWithGrammar"), {wav, QStringLiteral("en_US"), writeGrammar()});
         QVERIFY2(reply.type() == QDBusMessage::ReplyMessage, qPrintable(reply.errorMessage()));
         QCOMPARE(reply.arguments().value(0).toString(), QStringLiteral("open the door"));
+    }
+
+    /// Every file of a model damaged in turn (zeroed, cut short, a foreign first word): the engine
+    /// reports the language unusable with a reason and goes on serving the intact one.
+    void everyDamagedModelFileFailsInTheEngine()
+    {
+        using Testing::RecognizerFixture;
+        const QString wav = speak(QStringLiteral("close the window"), QStringLiteral("window.wav"));
+        const QString folder = Platform::Paths::userRecognizersFolder();
+        if (Platform::Services::recognition().bundlePathForLocale(QStringLiteral("en_US")).isEmpty()) {
+            RecognizerFixture::writeModelBundle(folder, QStringLiteral("en_US")); // run on its own
+        }
+        const QStringList binary {QStringLiteral("acoustic/mdef"), QStringLiteral("acoustic/means"),
+            QStringLiteral("acoustic/variances"), QStringLiteral("acoustic/sendump"),
+            QStringLiteral("acoustic/transition_matrices"), QStringLiteral("language.lm.bin")};
+        for (const QString &file : RecognizerFixture::modelFiles()) {
+            for (const auto damage : {RecognizerFixture::Damage::Zeroed, RecognizerFixture::Damage::Truncated,
+                     RecognizerFixture::Damage::WrongMagic}) {
+                if (damage != RecognizerFixture::Damage::Zeroed && !binary.contains(file)) {
+                    continue; // a text file cut short or with another first word may still be a model
+                }
+                const QString what = file + QStringLiteral(" damage ") + QString::number(int(damage));
+                QDir(folder + QStringLiteral("/nl_NL.SpeechRecognition")).removeRecursively();
+                RecognizerFixture::writeDamagedBundle(folder, QStringLiteral("nl_NL"), file, damage);
+                const QDBusMessage reply
+                    = call(QStringLiteral("TranscribeFile"), {wav, QStringLiteral("nl_NL")});
+                QVERIFY2(reply.type() == QDBusMessage::ErrorMessage, qPrintable(what));
+                QVERIFY2(reply.errorMessage().contains(
+                             QStringLiteral("The recognition language nl_NL is unusable: ")),
+                    qPrintable(what + u' ' + reply.errorMessage()));
+                QVERIFY2(m_engine.state() == QProcess::Running, qPrintable(what));
+            }
+        }
+        const QDBusMessage reply = call(
+            QStringLiteral("TranscribeFileWithGrammar"), {wav, QStringLiteral("en_US"), writeGrammar()});
+        QVERIFY2(reply.type() == QDBusMessage::ReplyMessage, qPrintable(reply.errorMessage()));
+        QCOMPARE(reply.arguments().value(0).toString(), QStringLiteral("close the window"));
     }
 };
 
