@@ -6,19 +6,30 @@
 // speech-dispatcher drives it (INIT, AUDIO with server-side audio, SET, SPEAK), so the figures are
 // the modules' own and leave out the server's fixed cost, the same for both.
 //
+// A second table takes the module away: the espeak-ng engine plugin called in this process, to show
+// what the engine itself needs before its first block (the floor for any module built on it).
+//
 //   bench_speechd [RUNS]     (default 20; needs speech-dispatcher-espeak-ng)
 
 #include "BenchTable.h"
 #include "ModuleDriver.h"
 
 #include "platform/Paths.h"
+#include "platform/Services.h"
+#include "platform/SpeechEngine.h"
+#include "platform/SpeechEngines.h"
+#include "platform/SpeechSynthesisService.h"
 
 #include <QCoreApplication>
+#include <QCryptographicHash>
 #include <QDir>
 #include <QDirIterator>
 #include <QElapsedTimer>
 #include <QFile>
 #include <QFileInfo>
+#include <QTemporaryDir>
+
+#include <optional>
 
 namespace {
 
@@ -30,6 +41,7 @@ struct Timing
     std::vector<double> firstAudioMs;
     std::vector<double> endMs;
     qsizetype samples = 0;
+    qsizetype firstBlockSamples = 0;
 };
 
 bool setUp(
@@ -61,8 +73,100 @@ bool speakOnce(ModuleDriver &module, Timing &timing)
         return false;
     }
     timing.endMs.push_back(double(clock.nsecsElapsed()) / 1e6);
-    timing.samples = qsizetype(ModuleDriver::samplesOf(module.takeItems()).size());
+    const auto items = module.takeItems();
+    timing.samples = qsizetype(ModuleDriver::samplesOf(items).size());
+    for (const auto &item : items) {
+        if (!item.samples.empty()) {
+            timing.firstBlockSamples = qsizetype(item.samples.size());
+            break;
+        }
+    }
     return true;
+}
+
+/// An engine plugin alone, in this process: from the render call to its first block, with the voice
+/// already chosen and (when @p other is given) with the voice chosen anew each time; the first
+/// block's size; and the whole render.
+void measureEngine(const char *title, const Cadenza::Platform::VoiceDescription &voice,
+    const std::optional<Cadenza::Platform::VoiceDescription> &other, int runs)
+{
+    using namespace Cadenza::Platform;
+    QString error;
+    SpeechEngine *engine = SpeechEngines::engine(voice.engineName, &error);
+    if (!engine) {
+        std::fprintf(
+            stderr, "bench_speechd: no engine %s: %s\n", qPrintable(voice.engineName), qPrintable(error));
+        return;
+    }
+    SynthesisParameters parameters;
+    parameters.normalWordsPerMinute = parameters.wordsPerMinute = voice.engineRate;
+    parameters.normalPitch = parameters.pitch = voice.enginePitch;
+    const QString text = QString::fromUtf8(Sentence);
+    qsizetype samples = 0;
+    const auto firstBlock = [&](const VoiceDescription &with) {
+        QElapsedTimer clock;
+        clock.start();
+        double ms = -1;
+        if (!engine->renderBlocks(
+                with, text, parameters,
+                [&](const qint16 *, qsizetype count, int) {
+                    ms = double(clock.nsecsElapsed()) / 1e6;
+                    samples = count;
+                    return false; // the first block is all this measures
+                },
+                &error)) {
+            std::fprintf(stderr, "bench_speechd: %s\n", qPrintable(error));
+        }
+        return ms;
+    };
+    std::vector<double> kept;
+    std::vector<double> anew;
+    std::vector<double> whole;
+    (void)firstBlock(voice);
+    for (int i = 0; i < runs; ++i) {
+        kept.push_back(firstBlock(voice));
+        if (other) {
+            anew.push_back(firstBlock(i % 2 ? voice : *other));
+        }
+        QElapsedTimer clock;
+        clock.start();
+        (void)engine->render(voice, text, parameters, &error);
+        whole.push_back(double(clock.nsecsElapsed()) / 1e6);
+    }
+    (void)firstBlock(voice);
+    for (auto *list : {&kept, &anew, &whole}) {
+        std::sort(list->begin(), list->end());
+    }
+    using CadenzaBench::median;
+    std::vector<CadenzaBench::Row> rows {
+        {"render call to first block, voice kept, ms", median(kept), "ms", "", 0}};
+    if (other) {
+        rows.push_back({"render call to first block, voice chosen, ms", median(anew), "ms", "", 0});
+    }
+    rows.push_back({"first block, samples", double(samples), "samples", "", 0});
+    rows.push_back({"whole sentence rendered, ms", median(whole), "ms", "", 0});
+    CadenzaBench::printTable(title, rows);
+}
+
+/// A flite voice description for the build's slt voice, its file in a bundle folder under @p folder.
+std::optional<Cadenza::Platform::VoiceDescription> fliteVoice(const QString &folder)
+{
+    const QString source = QStringLiteral(CADENZA_FLITE_VOICES_DIR "/cmu_us_slt.flitevox");
+    QFile file(source);
+    if (!file.open(QIODevice::ReadOnly) || !QDir().mkpath(folder + QStringLiteral("/Resources"))) {
+        return std::nullopt;
+    }
+    const QByteArray data = file.readAll();
+    (void)QFile::copy(source, folder + QStringLiteral("/Resources/cmu_us_slt.flitevox"));
+    Cadenza::Platform::VoiceDescription voice;
+    voice.identifier = QStringLiteral("bench.slt");
+    voice.engineName = QStringLiteral("flite");
+    voice.engineVoice = QStringLiteral("cmu_us_slt.flitevox");
+    voice.bundlePath = folder;
+    voice.engineSettings = {{QStringLiteral("VoiceFileSize"), qint64(data.size())},
+        {QStringLiteral("VoiceFileSHA256"),
+            QString::fromLatin1(QCryptographicHash::hash(data, QCryptographicHash::Sha256).toHex())}};
+    return voice;
 }
 
 /// Copies the shipped compact sample voice into this private world's system voice folder.
@@ -128,6 +232,19 @@ int main(int argc, char *argv[])
                 "sd_espeak-ng", percentile(theirs.firstAudioMs, 0.9)},
             {"SPEAK to END, median, ms", median(ours.endMs), "ms", "sd_espeak-ng", median(theirs.endMs)},
             {"audio of the sentence, s", double(ours.samples) / 22050.0, "s", "sd_espeak-ng",
-                double(theirs.samples) / 22050.0, true}});
+                double(theirs.samples) / 22050.0, true},
+            {"first audio block, samples", double(ours.firstBlockSamples), "samples", "sd_espeak-ng",
+                double(theirs.firstBlockSamples)}});
+    if (const auto maren = Cadenza::Platform::Services::speechSynthesis().voice(
+            QStringLiteral("com.vendra.speech.synthesis.voice.maren.compact"))) {
+        // Another variant of the same voice makes the engine choose its voice again.
+        auto other = *maren;
+        other.engineVariant = QStringLiteral("f3");
+        measureEngine("espeak-ng engine plugin alone, in this process (Maren Compact)", *maren, other, runs);
+    }
+    QTemporaryDir scratch;
+    if (const auto slt = fliteVoice(scratch.filePath(QStringLiteral("slt")))) {
+        measureEngine("flite engine plugin alone, in this process (slt)", *slt, std::nullopt, runs);
+    }
     return 0;
 }
