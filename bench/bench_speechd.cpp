@@ -6,11 +6,13 @@
 // speech-dispatcher drives it (INIT, AUDIO with server-side audio, SET, SPEAK), so the figures are
 // the modules' own and leave out the server's fixed cost, the same for both.
 //
+// A module that only answers, at once, shows what the pipes and the driver cost by themselves.
 // A second table takes the module away: the espeak-ng engine plugin called in this process, to show
 // what the engine itself needs before its first block (the floor for any module built on it).
 //
 //   bench_speechd [RUNS]     (default 20; needs speech-dispatcher-espeak-ng)
 
+#include "AudioSender.h"
 #include "BenchTable.h"
 #include "ModuleDriver.h"
 
@@ -28,6 +30,9 @@
 #include <QFile>
 #include <QFileInfo>
 #include <QTemporaryDir>
+
+#include <cstring>
+#include <unistd.h>
 
 #include <optional>
 
@@ -169,6 +174,64 @@ std::optional<Cadenza::Platform::VoiceDescription> fliteVoice(const QString &fol
     return voice;
 }
 
+/**
+ * The floor: a module that does nothing but answer. It reads lines with plain read(), and answers the
+ * end of each message's data with the answers and events of speaking and one block of silence as
+ * large as sd_cadenza's first. Run as "bench_speechd --answering-module".
+ */
+int answeringModule()
+{
+    const std::vector<qint16> silence(1324, 0);
+    const QByteArray speech = "701 BEGIN\n"
+        + SdCadenza::AudioSender::audioEvent(silence.data(), qsizetype(silence.size()), 22050) + "702 END\n";
+    QByteArray pending;
+    QByteArray command; // the command whose data is being read
+    char buffer[65536];
+    for (;;) {
+        const ssize_t got = ::read(STDIN_FILENO, buffer, sizeof buffer);
+        if (got <= 0) {
+            return 0;
+        }
+        pending.append(buffer, qsizetype(got));
+        for (qsizetype end = pending.indexOf('\n'); end >= 0; end = pending.indexOf('\n')) {
+            const QByteArray line = pending.left(end);
+            pending.remove(0, end + 1);
+            QByteArrayList answers; // each written on its own, as a module answers before it speaks
+            if (command.isEmpty()) {
+                if (line == "INIT") {
+                    answers = {"299 OK LOADED SUCCESSFULLY\n"};
+                } else {
+                    command = line;
+                    if (line == "AUDIO") {
+                        answers = {"207 OK RECEIVING AUDIO SETTINGS\n"};
+                    } else if (line == "SET") {
+                        answers = {"203 OK RECEIVING SETTINGS\n"};
+                    }
+                }
+            } else if (line == ".") {
+                if (command == "AUDIO") {
+                    answers = {"203 OK AUDIO INITIALIZED\n"};
+                } else if (command == "SET") {
+                    answers = {"203 OK SETTINGS RECEIVED\n"};
+                } else {
+                    answers = {"200 OK SPEAKING\n", speech};
+                }
+                command.clear();
+            }
+            for (const QByteArray &answer : std::as_const(answers)) {
+                for (qsizetype at = 0; at < answer.size();) {
+                    const ssize_t written
+                        = ::write(STDOUT_FILENO, answer.constData() + at, size_t(answer.size() - at));
+                    if (written <= 0) {
+                        return 1;
+                    }
+                    at += written;
+                }
+            }
+        }
+    }
+}
+
 /// Copies the shipped compact sample voice into this private world's system voice folder.
 void installCompactVoice()
 {
@@ -188,6 +251,9 @@ void installCompactVoice()
 
 int main(int argc, char *argv[])
 {
+    if (argc > 1 && std::strcmp(argv[1], "--answering-module") == 0) {
+        return answeringModule();
+    }
     QCoreApplication app(argc, argv);
     const int runs = argc > 1 ? qMax(1, std::atoi(argv[1])) : 20;
     installCompactVoice();
@@ -195,11 +261,14 @@ int main(int argc, char *argv[])
     const QString espeak = QStringLiteral("/usr/lib/speech-dispatcher-modules/sd_espeak-ng");
     ModuleDriver cadenza;
     ModuleDriver peer;
+    ModuleDriver answering;
     if (!setUp(cadenza, QStringLiteral(SD_CADENZA_PATH), {},
             "synthesis_voice=Maren Compact\nrate=0\npitch=0\nvolume=100\nlanguage=en\n")
         || !setUp(peer, espeak, {QStringLiteral("/etc/speech-dispatcher/modules/espeak-ng.conf")},
             "language=en-us\nvoice=female1\nsynthesis_voice=NULL\nrate=0\npitch=0\nvolume=100\n"
-            "punctuation_mode=none\nspelling_mode=off\ncap_let_recogn=none\n")) {
+            "punctuation_mode=none\nspelling_mode=off\ncap_let_recogn=none\n")
+        || !setUp(
+            answering, QCoreApplication::applicationFilePath(), {QStringLiteral("--answering-module")}, "")) {
         std::fprintf(
             stderr, "bench_speechd: cannot start both modules (is %s installed?)\n", qPrintable(espeak));
         return 1;
@@ -207,18 +276,22 @@ int main(int argc, char *argv[])
 
     Timing ours;
     Timing theirs;
-    // One warm-up each, then the two in turn, so that both see the same machine.
+    Timing floor;
+    // One warm-up each, then the three in turn, so that all see the same machine.
     (void)speakOnce(cadenza, ours);
     (void)speakOnce(peer, theirs);
+    (void)speakOnce(answering, floor);
     ours = {};
     theirs = {};
+    floor = {};
     for (int i = 0; i < runs; ++i) {
-        if (!speakOnce(cadenza, ours) || !speakOnce(peer, theirs)) {
+        if (!speakOnce(cadenza, ours) || !speakOnce(peer, theirs) || !speakOnce(answering, floor)) {
             std::fprintf(stderr, "bench_speechd: a module did not finish speaking\n");
             return 1;
         }
     }
-    for (auto *list : {&ours.firstAudioMs, &ours.endMs, &theirs.firstAudioMs, &theirs.endMs}) {
+    for (auto *list :
+        {&ours.firstAudioMs, &ours.endMs, &theirs.firstAudioMs, &theirs.endMs, &floor.firstAudioMs}) {
         std::sort(list->begin(), list->end());
     }
     using CadenzaBench::median;
@@ -234,7 +307,11 @@ int main(int argc, char *argv[])
             {"audio of the sentence, s", double(ours.samples) / 22050.0, "s", "sd_espeak-ng",
                 double(theirs.samples) / 22050.0, true},
             {"first audio block, samples", double(ours.firstBlockSamples), "samples", "sd_espeak-ng",
-                double(theirs.firstBlockSamples)}});
+                double(theirs.firstBlockSamples)},
+            // The pipes and the driver's own reading, the same for every module.
+            {"module that only answers: first audio, ms", median(floor.firstAudioMs), "ms", "", 0},
+            {"first audio above that module's, ms", median(ours.firstAudioMs) - median(floor.firstAudioMs),
+                "ms", "sd_espeak-ng", median(theirs.firstAudioMs) - median(floor.firstAudioMs)}});
     if (const auto maren = Cadenza::Platform::Services::speechSynthesis().voice(
             QStringLiteral("com.vendra.speech.synthesis.voice.maren.compact"))) {
         // Another variant of the same voice makes the engine choose its voice again.
