@@ -487,7 +487,7 @@ private Q_SLOTS:
         module.send("STOP\n");
         QVERIFY(module.waitForLine("703 STOP", 60000));
         const auto items = module.takeItems();
-        // Between STOP's arrival and the STOP event, at most what one sentence rendering takes.
+        // The audio stops at the block after STOP's arrival; what came before depends on the machine.
         const auto samples = module.samplesOf(items);
         QVERIFY2(samples.size() < 22050 * 60, QByteArray::number(qulonglong(samples.size())));
         QCOMPARE(module.linesOf(items).count("702 END"), 0);
