@@ -16,11 +16,11 @@
 #include "BenchTable.h"
 #include "ModuleDriver.h"
 
-#include "platform/Paths.h"
-#include "platform/Services.h"
-#include "platform/SpeechEngine.h"
-#include "platform/SpeechEngines.h"
-#include "platform/SpeechSynthesisService.h"
+#include "core/engines/SpeechEngine.h"
+#include "core/engines/SpeechEngines.h"
+#include "core/files/Paths.h"
+#include "core/services/Services.h"
+#include "core/services/SpeechSynthesisService.h"
 
 #include <QCoreApplication>
 #include <QCryptographicHash>

@@ -3,9 +3,9 @@
 
 #include "AudioSender.h"
 
-#include "platform/Services.h"
-#include "platform/SpeechEngines.h"
-#include "platform/SpeechSynthesisService.h"
+#include "core/engines/SpeechEngines.h"
+#include "core/services/Services.h"
+#include "core/services/SpeechSynthesisService.h"
 
 #include <QFileInfo>
 #include <QRegularExpression>

@@ -4,7 +4,7 @@
 
 #include "SsmlText.h"
 
-#include "platform/SpeechEngine.h"
+#include "core/engines/SpeechEngine.h"
 
 #include <QString>
 #include <QStringList>

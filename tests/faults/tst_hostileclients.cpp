@@ -5,10 +5,10 @@
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "installation/InstallerProtocol.h"
-#include "platform/MessageFrame.h"
-#include "platform/UnixMessagePortService.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/services/UnixMessagePortService.h"
+#include "protocol/InstallerProtocol.h"
+#include "protocol/MessageFrame.h"
 
 #include <QElapsedTimer>
 #include <QLocalSocket>
