@@ -3,16 +3,13 @@
 
 #include "AudioSender.h"
 
-#include "core/formats/WaveFile.h"
-#include "core/voices/SpeechSynthesizer.h"
+#include "core/engines/SpeechEngines.h"
+#include "core/services/Services.h"
+#include "core/services/SpeechSynthesisService.h"
 
-#include <QDir>
-#include <QFile>
+#include <QFileInfo>
 #include <QRegularExpression>
-#include <QStandardPaths>
 #include <QtMath>
-
-#include <unistd.h>
 
 using namespace Cadenza;
 using namespace Cadenza::Platform;
@@ -43,12 +40,10 @@ int cutPoint(const QString &text, qsizetype from, qsizetype maximum)
 
 } // namespace
 
-SpeechWorker::SpeechWorker(AudioSender &sender)
+SpeechWorker::SpeechWorker(AudioSender &sender, EngineLookup engines)
     : m_sender(sender)
+    , m_engines(engines ? std::move(engines) : EngineLookup(&SpeechEngines::engine))
 {
-    const QString runtime = QStandardPaths::writableLocation(QStandardPaths::RuntimeLocation);
-    m_wavPath = (runtime.isEmpty() ? QDir::tempPath() : runtime)
-        + QStringLiteral("/sd_cadenza-%1.wav").arg(::getpid());
     m_thread = std::thread([this] { run(); });
 }
 
@@ -61,7 +56,6 @@ SpeechWorker::~SpeechWorker()
     }
     m_wake.notify_all();
     m_thread.join();
-    QFile::remove(m_wavPath);
 }
 
 bool SpeechWorker::start(SpeechJob job)
@@ -132,37 +126,39 @@ QStringList SpeechWorker::chunks(const QString &text, qsizetype maximum)
     return result;
 }
 
-std::optional<PcmAudio> SpeechWorker::render(
-    const QString &text, const SpeechJob &job, const QString &wavPath, QString *error)
+std::optional<SpeechWorker::Speaker> SpeechWorker::speakerFor(
+    const SpeechJob &job, const EngineLookup &engines, QString *error)
 {
-    auto synthesizer = SpeechSynthesizer::initWithVoice(job.voiceIdentifier);
-    if (!synthesizer) {
-        if (error) {
-            *error = QStringLiteral("the voice '%1' is not installed").arg(job.voiceIdentifier);
-        }
+    SpeechSynthesisService &service = Services::speechSynthesis();
+    const QString identifier = job.voiceIdentifier.isEmpty() ? service.defaultVoice() : job.voiceIdentifier;
+    auto voice = service.voice(identifier);
+    if (!voice) {
+        *error = QStringLiteral("the voice '%1' is not installed").arg(identifier);
         return std::nullopt;
     }
+    Speaker speaker;
+    speaker.engine = engines(voice->engineName, error);
+    if (!speaker.engine) {
+        return std::nullopt;
+    }
+    SynthesisParameters &parameters = speaker.parameters;
     // speech-dispatcher's scales run from -100 to 100 around the voice's own rate and pitch.
-    const double rate
-        = synthesizer->_normalSpeakingRate() * std::pow(3.0, qBound(-100, job.rate, 100) / 100.0);
-    synthesizer->setRate(float(qBound(80.0, rate, 450.0)));
+    parameters.normalWordsPerMinute = voice->engineRate;
+    parameters.wordsPerMinute
+        = qBound(80.0, voice->engineRate * std::pow(3.0, qBound(-100, job.rate, 100) / 100.0), 450.0);
     // Pitch moves by up to half the engine's 0..100 scale either way; a capital letter said on its own
     // a further fifth up.
-    double pitch = synthesizer->speechPitch() + qBound(-100, job.pitch, 100) / 2.0;
+    parameters.normalPitch = voice->enginePitch;
+    double pitch = voice->enginePitch + qBound(-100, job.pitch, 100) / 2.0;
     if (job.raisePitch) {
         pitch += 20;
     }
-    synthesizer->setSpeechPitch(float(qBound(1.0, pitch, 100.0)));
+    parameters.pitch = qBound(1.0, pitch, 100.0);
     // speech-dispatcher's 0 is the voice's normal loudness (its clients' usual setting); the samples
     // cannot go louder than full scale without clipping, so only values below 0 make a difference.
-    const double volume = qMin(0, qBound(-100, job.volume, 100)) / 100.0 + 1.0;
-    synthesizer->setObject(QVariant(qint64(volume * 65536)), SpeechSynthesizer::VolumeProperty, 4);
-    if (!synthesizer->startSpeakingStringToFile(text, wavPath, error)) {
-        return std::nullopt;
-    }
-    auto audio = WaveFile::read(wavPath, error);
-    QFile::remove(wavPath);
-    return audio;
+    parameters.volume = qMin(0, qBound(-100, job.volume, 100)) / 100.0 + 1.0;
+    speaker.voice = std::move(*voice);
+    return speaker;
 }
 
 void SpeechWorker::run()
@@ -196,6 +192,10 @@ bool SpeechWorker::sendSamples(const qint16 *samples, qsizetype count, int sampl
         if (!m_sender.sendAudio(samples + at, qMin(BlockSamples, count - at), sampleRate)) {
             return false;
         }
+        // The server was just woken to read this block, but this thread would go on rendering and keep
+        // the processor: on a busy machine the server then waits a scheduler slice (about 1.5 ms
+        // measured) before it sees the audio. Giving way lets it read at once.
+        std::this_thread::yield();
     }
     return true;
 }
@@ -209,6 +209,19 @@ QByteArray SpeechWorker::speak(const SpeechJob &job)
     }
     int sampleRate = DefaultSampleRate;
     const char *ending = "702 END\n";
+    std::optional<Speaker> speaker;
+    const auto fail = [&](const QString &error) {
+        // A voice removed while speaking ends up here: the message ends, the next one chooses its
+        // voice again.
+        qWarning("sd_cadenza: cannot speak: %s", qPrintable(error));
+        ending = "703 STOP\n";
+        m_interrupt = Interrupt::Stop;
+    };
+    // Audio goes out block by block as the engine renders it; a stop ends the render at the next block.
+    const AudioBlockSink sink = [this, &sampleRate](const qint16 *samples, qsizetype count, int rate) {
+        sampleRate = rate;
+        return sendSamples(samples, count, rate);
+    };
     for (const auto &segment : job.segments) {
         if (m_interrupt.load() != Interrupt::None) {
             break;
@@ -228,17 +241,18 @@ QByteArray SpeechWorker::speak(const SpeechJob &job)
                     break;
                 }
                 QString error;
-                const auto audio = render(chunk, job, m_wavPath, &error);
-                if (!audio) {
-                    // A voice removed while speaking ends up here: the message ends, the next one
-                    // chooses its voice again.
-                    qWarning("sd_cadenza: cannot speak: %s", qPrintable(error));
-                    ending = "703 STOP\n";
-                    m_interrupt = Interrupt::Stop;
+                if (!speaker) {
+                    speaker = speakerFor(job, m_engines, &error);
+                } else if (!QFileInfo::exists(speaker->voice.bundlePath)) {
+                    // Found once per message, but a voice removed meanwhile is not spoken with.
+                    error = QStringLiteral("the voice '%1' was removed").arg(speaker->voice.identifier);
+                }
+                if (!speaker || !error.isEmpty()
+                    || !speaker->engine->renderBlocks(
+                        speaker->voice, chunk, speaker->parameters, sink, &error)) {
+                    fail(error);
                     break;
                 }
-                sampleRate = audio->sampleRate;
-                (void)sendSamples(audio->samples.data(), qsizetype(audio->samples.size()), sampleRate);
             }
             break;
         }

@@ -4,18 +4,17 @@
 
 #include "SsmlText.h"
 
+#include "core/engines/SpeechEngine.h"
+
 #include <QString>
 #include <QStringList>
 
 #include <atomic>
 #include <condition_variable>
+#include <functional>
 #include <mutex>
 #include <optional>
 #include <thread>
-
-namespace Cadenza::Platform {
-struct PcmAudio;
-}
 
 namespace SdCadenza {
 
@@ -36,19 +35,33 @@ struct SpeechJob
 /**
  * Speaks one message at a time on a thread of its own, so that the protocol is served meanwhile.
  *
- * The message is rendered a sentence at a time (long sentences are cut at clause or word ends) and
- * sent in blocks of BlockSamples; a stop is noticed before every block, so speech ends within one
- * block once the sentence being rendered is done. A pause waits for the end of the sentence, the place
- * where speaking can later go on without a gap. Events follow the protocol: BEGIN, then index marks
- * and audio in order, then exactly one of END, STOP (also after an error) or PAUSE.
+ * The voice, its engine and the figures are found once per message. The message is rendered a
+ * sentence at a time (long sentences are cut at clause or word ends), and each block of audio is sent
+ * as soon as the engine hands it out; a stop is noticed at every block, so speech ends within one
+ * block. A pause waits for the end of the sentence, the place where speaking can later go on without
+ * a gap. Events follow the protocol: BEGIN, then index marks and audio in order, then exactly one of
+ * END, STOP (also after an error) or PAUSE.
  */
 class SpeechWorker
 {
 public:
-    static constexpr qsizetype BlockSamples = 4096;
+    static constexpr qsizetype BlockSamples = 4096; ///< the largest audio event
     static constexpr qsizetype MaximumChunk = 300; ///< characters rendered at once
 
-    explicit SpeechWorker(AudioSender &sender);
+    /// Finds the engine called @p name; nullptr with a readable @p error when there is none.
+    using EngineLookup
+        = std::function<Cadenza::Platform::SpeechEngine *(const QString &name, QString *error)>;
+
+    /// The voice, engine and figures a message is spoken with.
+    struct Speaker
+    {
+        Cadenza::Platform::VoiceDescription voice;
+        Cadenza::Platform::SynthesisParameters parameters;
+        Cadenza::Platform::SpeechEngine *engine = nullptr;
+    };
+
+    /// Speaks through @p sender with the engines @p engines finds (the engine plugins when not given).
+    explicit SpeechWorker(AudioSender &sender, EngineLookup engines = {});
     ~SpeechWorker();
     SpeechWorker(const SpeechWorker &) = delete;
     SpeechWorker &operator=(const SpeechWorker &) = delete;
@@ -61,9 +74,9 @@ public:
 
     /// @p text cut into pieces of at most @p maximum characters, at sentence ends where possible.
     [[nodiscard]] static QStringList chunks(const QString &text, qsizetype maximum = MaximumChunk);
-    /// Renders @p text with @p job's voice and settings.
-    [[nodiscard]] static std::optional<Cadenza::Platform::PcmAudio> render(
-        const QString &text, const SpeechJob &job, const QString &wavPath, QString *error);
+    /// The installed voice of @p job with its settings resolved, and its engine from @p engines.
+    [[nodiscard]] static std::optional<Speaker> speakerFor(
+        const SpeechJob &job, const EngineLookup &engines, QString *error);
 
 private:
     enum class Interrupt { None, Stop, Pause };
@@ -75,6 +88,7 @@ private:
     bool sendSamples(const qint16 *samples, qsizetype count, int sampleRate);
 
     AudioSender &m_sender;
+    EngineLookup m_engines;
     std::thread m_thread;
     std::mutex m_mutex;
     std::condition_variable m_wake;
@@ -82,7 +96,6 @@ private:
     bool m_quit = false;
     std::atomic<bool> m_busy {false};
     std::atomic<Interrupt> m_interrupt {Interrupt::None};
-    QString m_wavPath;
 };
 
 } // namespace SdCadenza

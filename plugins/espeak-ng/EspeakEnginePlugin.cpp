@@ -5,7 +5,6 @@
 
 namespace Cadenza::Engines {
 
-using Platform::PcmAudio;
 using Platform::SynthesisParameters;
 using Platform::VoiceDescription;
 
@@ -13,18 +12,24 @@ namespace {
 
 struct RenderTarget
 {
-    std::vector<qint16> *samples = nullptr;
+    const Platform::AudioBlockSink *sink = nullptr;
     std::atomic<bool> *cancelled = nullptr;
+    int sampleRate = 0;
+    bool stopped = false; ///< the sink or cancel() asked to stop
 };
 RenderTarget currentTarget; // guarded by the plugin's mutex: espeak-ng has one synthesiser
 
 int collectSamples(short *wav, int count, espeak_EVENT *)
 {
-    if (currentTarget.cancelled && currentTarget.cancelled->load()) {
+    if (currentTarget.stopped || (currentTarget.cancelled && currentTarget.cancelled->load())) {
+        currentTarget.stopped = true;
         return 1; // asks espeak-ng to stop
     }
-    if (wav && count > 0 && currentTarget.samples) {
-        currentTarget.samples->insert(currentTarget.samples->end(), wav, wav + count);
+    if (wav && count > 0 && currentTarget.sink) {
+        if (!(*currentTarget.sink)(wav, count, currentTarget.sampleRate)) {
+            currentTarget.stopped = true;
+            return 1;
+        }
     }
     return 0;
 }
@@ -65,7 +70,8 @@ bool EspeakEnginePlugin::initialise(QString *error)
         return m_sampleRate > 0;
     }
     m_initialised = true;
-    m_sampleRate = espeak_Initialize(AUDIO_OUTPUT_SYNCHRONOUS, 0, nullptr, espeakINITIALIZE_DONT_EXIT);
+    m_sampleRate
+        = espeak_Initialize(AUDIO_OUTPUT_SYNCHRONOUS, BlockMilliseconds, nullptr, espeakINITIALIZE_DONT_EXIT);
     if (m_sampleRate <= 0) {
         if (error) {
             *error = QStringLiteral("the espeak-ng engine could not start (is espeak-ng-data installed?)");
@@ -76,24 +82,31 @@ bool EspeakEnginePlugin::initialise(QString *error)
     return true;
 }
 
-std::optional<PcmAudio> EspeakEnginePlugin::render(
-    const VoiceDescription &voice, const QString &text, const SynthesisParameters &parameters, QString *error)
+bool EspeakEnginePlugin::renderBlocks(const VoiceDescription &voice, const QString &text,
+    const SynthesisParameters &parameters, const Platform::AudioBlockSink &sink, QString *error)
 {
     QMutexLocker locker(&m_mutex);
     if (!initialise(error)) {
         if (error && error->isEmpty()) {
             *error = QStringLiteral("the espeak-ng engine could not start");
         }
-        return std::nullopt;
+        return false;
     }
     m_cancelled = false;
 
-    if (!selectVoice(voice.engineVoice, voice.engineVariant,
-            voice.attributes.value(Platform::VoiceAttribute::Gender).toString())) {
-        if (error) {
-            *error = QStringLiteral("espeak-ng has no voice or language '%1'").arg(voice.engineVoice);
+    // Choosing a voice reads its files again; a run of renders with one voice chooses it once.
+    const QString gender = voice.attributes.value(Platform::VoiceAttribute::Gender).toString();
+    const QString voiceKey
+        = voice.engineVoice + QLatin1Char('\n') + voice.engineVariant + QLatin1Char('\n') + gender;
+    if (voiceKey != m_currentVoice) {
+        m_currentVoice.clear();
+        if (!selectVoice(voice.engineVoice, voice.engineVariant, gender)) {
+            if (error) {
+                *error = QStringLiteral("espeak-ng has no voice or language '%1'").arg(voice.engineVoice);
+            }
+            return false;
         }
-        return std::nullopt;
+        m_currentVoice = voiceKey;
     }
     // espeak-ng speaks in words per minute and takes its pitch base on the same 0..100 scale.
     espeak_SetParameter(espeakRATE, qRound(parameters.wordsPerMinute), 0);
@@ -101,21 +114,20 @@ std::optional<PcmAudio> EspeakEnginePlugin::render(
     // espeak-ng's volume runs 0..200 with 100 as normal loudness.
     espeak_SetParameter(espeakVOLUME, qRound(parameters.volume * 100.0), 0);
 
-    PcmAudio audio;
-    audio.sampleRate = m_sampleRate;
-    currentTarget = {&audio.samples, &m_cancelled};
+    currentTarget = {&sink, &m_cancelled, m_sampleRate, false};
     const QByteArray utf8 = text.toUtf8();
     const espeak_ERROR result = espeak_Synth(
         utf8.constData(), size_t(utf8.size()) + 1, 0, POS_CHARACTER, 0, espeakCHARS_UTF8, nullptr, nullptr);
     espeak_Synchronize();
+    const bool stopped = currentTarget.stopped;
     currentTarget = {};
-    if (result != EE_OK) {
+    if (result != EE_OK && !stopped) {
         if (error) {
             *error = QStringLiteral("espeak-ng could not speak the text");
         }
-        return std::nullopt;
+        return false;
     }
-    return audio;
+    return true;
 }
 
 } // namespace Cadenza::Engines

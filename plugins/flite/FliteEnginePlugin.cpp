@@ -12,6 +12,7 @@ extern "C" {
 }
 
 #include <csetjmp>
+#include <vector>
 
 extern "C" {
 // The English front end and lexicon of flite's own voices; their headers are not installed.
@@ -21,7 +22,6 @@ cst_lexicon *cmu_lex_init(void);
 
 namespace Cadenza::Engines {
 
-using Platform::PcmAudio;
 using Platform::SynthesisParameters;
 using Platform::VoiceDescription;
 
@@ -62,6 +62,48 @@ QByteArray stampOf(const QString &path)
         + '|' + QFile::encodeName(info.canonicalFilePath());
 }
 
+/// Where flite's streaming callback hands its audio.
+struct StreamTarget
+{
+    const Platform::AudioBlockSink *sink = nullptr;
+    const std::atomic<bool> *cancelled = nullptr;
+    double volume = 1.0;
+    int sent = 0; ///< samples of the wave handed out so far
+    bool stopped = false;
+    std::vector<qint16> block;
+
+    /// Hands out the wave's samples [sent, end); false once the render is to stop.
+    bool pass(const cst_wave *wave, int end)
+    {
+        if (stopped || cancelled->load()) {
+            stopped = true;
+            return false;
+        }
+        const int channels = qMax(1, wave->num_channels);
+        end = qMin(end, wave->num_samples);
+        if (end <= sent) {
+            return true;
+        }
+        // Volume: flite has no loudness of its own, so the samples are scaled.
+        block.resize(size_t(end - sent));
+        for (int i = sent; i < end; ++i) {
+            const double sample = wave->samples[qsizetype(i) * channels] * volume;
+            block[size_t(i - sent)] = qint16(qBound(-32768.0, sample, 32767.0));
+        }
+        sent = end;
+        if (!(*sink)(block.data(), qsizetype(block.size()), wave->sample_rate)) {
+            stopped = true;
+        }
+        return !stopped;
+    }
+};
+
+int streamChunk(const cst_wave *wave, int start, int size, int, cst_audio_streaming_info *info)
+{
+    auto *target = static_cast<StreamTarget *>(info->userdata);
+    return target->pass(wave, start + size) ? CST_AUDIO_STREAM_CONT : CST_AUDIO_STREAM_STOP;
+}
+
 } // namespace
 
 cst_voice *FliteEnginePlugin::loadVoice(const VoiceDescription &voice, QString *error)
@@ -96,8 +138,8 @@ cst_voice *FliteEnginePlugin::loadVoice(const VoiceDescription &voice, QString *
     return loaded;
 }
 
-std::optional<PcmAudio> FliteEnginePlugin::render(
-    const VoiceDescription &voice, const QString &text, const SynthesisParameters &parameters, QString *error)
+bool FliteEnginePlugin::renderBlocks(const VoiceDescription &voice, const QString &text,
+    const SynthesisParameters &parameters, const Platform::AudioBlockSink &sink, QString *error)
 {
     QMutexLocker locker(&m_mutex);
     QString reason;
@@ -113,7 +155,7 @@ std::optional<PcmAudio> FliteEnginePlugin::render(
         if (error) {
             *error = reason;
         }
-        return std::nullopt;
+        return false;
     }
 
     // Rate: flite stretches durations; the bundle's Rate is the voice's own words per minute.
@@ -130,27 +172,35 @@ std::optional<PcmAudio> FliteEnginePlugin::render(
     } else {
         flite_feat_remove(engineVoice->features, "int_f0_target_mean");
     }
+    // The voice's waveform synthesis hands out its samples as it goes (clustergen voices do; others
+    // give the whole wave at the end, which is then handed out below).
+    StreamTarget target {&sink, &m_cancelled, parameters.volume};
+    cst_audio_streaming_info *streaming = new_audio_streaming_info();
+    streaming->min_buffsize = StreamSamples;
+    streaming->asc = streamChunk;
+    streaming->userdata = &target;
+    flite_feat_set(engineVoice->features, "streaming_info", audio_streaming_info_val(streaming));
     cst_wave *wave = guardedTextToWave(text.toUtf8().constData(), engineVoice);
+    flite_feat_remove(engineVoice->features, "streaming_info"); // frees the streaming info
     if (model) {
         model->spamf0 = ownContour;
     }
     if (!wave) {
+        if (target.stopped) {
+            return true;
+        }
         if (error) {
             *error = QStringLiteral("flite could not speak the text");
         }
-        return std::nullopt;
+        return false;
     }
-    PcmAudio audio;
-    audio.sampleRate = wave->sample_rate;
-    const int channels = qMax(1, wave->num_channels);
-    audio.samples.reserve(size_t(wave->num_samples));
-    // Volume: flite has no loudness of its own, so the samples are scaled.
-    for (int i = 0; i < wave->num_samples && !m_cancelled; ++i) {
-        const double sample = wave->samples[qsizetype(i) * channels] * parameters.volume;
-        audio.samples.push_back(qint16(qBound(-32768.0, sample, 32767.0)));
+    for (int end = target.sent + StreamSamples; target.sent < wave->num_samples; end += StreamSamples) {
+        if (!target.pass(wave, end)) {
+            break;
+        }
     }
     delete_wave(wave);
-    return audio;
+    return true;
 }
 
 } // namespace Cadenza::Engines

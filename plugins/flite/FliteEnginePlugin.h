@@ -19,7 +19,8 @@ namespace Cadenza::Engines {
  *
  * A bundle's "Voice" names that file; "VoiceFileSize" and "VoiceFileSHA256" describe it, and the file
  * is checked against them (and its header read) before flite sees it. A voice is loaded once and kept
- * while its file stays the same. flite's voices are not safe to share between threads, so renders are
+ * while its file stays the same. Audio is handed out while flite synthesises the waveform, after
+ * it has analysed the whole text. flite's voices are not safe to share between threads, so renders are
  * serialised.
  */
 class FliteEnginePlugin final : public QObject, public Platform::SpeechEngine
@@ -29,8 +30,12 @@ class FliteEnginePlugin final : public QObject, public Platform::SpeechEngine
     Q_INTERFACES(Cadenza::Platform::SpeechEngine)
 public:
     QString engineName() const override { return QStringLiteral("flite"); }
-    std::optional<Platform::PcmAudio> render(const Platform::VoiceDescription &voice, const QString &text,
-        const Platform::SynthesisParameters &parameters, QString *error) override;
+    /// The size of the audio blocks handed out, in samples.
+    static constexpr int StreamSamples = 2048;
+
+    bool renderBlocks(const Platform::VoiceDescription &voice, const QString &text,
+        const Platform::SynthesisParameters &parameters, const Platform::AudioBlockSink &sink,
+        QString *error) override;
     void cancel() override { m_cancelled = true; }
 
 private:

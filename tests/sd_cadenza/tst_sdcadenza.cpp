@@ -20,7 +20,11 @@
 #include <QTest>
 
 #include <algorithm>
+#include <atomic>
 #include <cmath>
+
+#include <fcntl.h>
+#include <unistd.h>
 
 using namespace Cadenza::Platform;
 using namespace Cadenza::Testing;
@@ -38,6 +42,91 @@ const QByteArray Setup = "INIT\nAUDIO\naudio_output_method=server\n.\n";
 QByteArray speak(const QByteArray &text)
 {
     return "SPEAK\n" + text + "\n.\n";
+}
+
+/**
+ * An engine that hands out a number of blocks and writes down what it does, so that a test can see
+ * in which order the engine's work and the module's audio events happen.
+ */
+class ScriptedEngine final : public SpeechEngine
+{
+public:
+    int blocks = 8;
+    /// Called on the rendering thread after each block was handed out, with the block's number.
+    std::function<void(int)> afterBlock;
+    QStringList log;
+    int renders = 0;
+
+    QString engineName() const override { return QStringLiteral("scripted"); }
+    bool renderBlocks(const VoiceDescription &, const QString &, const SynthesisParameters &,
+        const AudioBlockSink &sink, QString *) override
+    {
+        m_cancelled = false;
+        ++renders;
+        const std::vector<qint16> block(1000, 1200);
+        for (int i = 1; i <= blocks && !m_cancelled; ++i) {
+            log.append(QStringLiteral("engine renders block %1").arg(i));
+            const bool more = sink(block.data(), qsizetype(block.size()), 22050);
+            if (afterBlock) {
+                afterBlock(i);
+            }
+            if (!more) {
+                log.append(QStringLiteral("engine told to stop"));
+                break;
+            }
+        }
+        log.append(QStringLiteral("engine done"));
+        return true;
+    }
+    void cancel() override { m_cancelled = true; }
+
+private:
+    std::atomic<bool> m_cancelled {false};
+};
+
+/// A pipe standing in for speech-dispatcher: the worker writes to it, the test reads what arrived.
+class ServerPipe
+{
+public:
+    ServerPipe()
+    {
+        if (::pipe(m_fds) == 0) {
+            ::fcntl(m_fds[0], F_SETFL, O_NONBLOCK);
+        }
+    }
+    ~ServerPipe()
+    {
+        ::close(m_fds[0]);
+        ::close(m_fds[1]);
+    }
+    [[nodiscard]] int writeEnd() const { return m_fds[1]; }
+    /// Everything written so far.
+    QByteArray received()
+    {
+        char buffer[65536];
+        for (;;) {
+            const ssize_t got = ::read(m_fds[0], buffer, sizeof buffer);
+            if (got <= 0) {
+                break;
+            }
+            m_received.append(buffer, qsizetype(got));
+        }
+        return m_received;
+    }
+    /// How many audio events arrived so far (the event's data never holds a line feed).
+    int audioEvents() { return int(received().count("\n705 AUDIO\n")); }
+
+private:
+    int m_fds[2] = {-1, -1};
+    QByteArray m_received;
+};
+
+SpeechJob textJob(const QString &text)
+{
+    SpeechJob job;
+    job.voiceIdentifier = Ada;
+    job.segments = SsmlText::parse(text);
+    return job;
 }
 
 } // namespace
@@ -239,6 +328,89 @@ private Q_SLOTS:
         QVERIFY(SpeechWorker::chunks(QStringLiteral("   ")).isEmpty());
     }
 
+    /// Each block reaches the server as soon as the engine hands it out: the engine sees the audio
+    /// event of its first block before it renders the second.
+    void audioIsSentWhileTheEngineRenders()
+    {
+        ServerPipe server;
+        AudioSender sender(server.writeEnd());
+        ScriptedEngine engine;
+        int lookups = 0;
+        SpeechWorker worker(sender, [&](const QString &, QString *) {
+            ++lookups;
+            return &engine;
+        });
+        engine.afterBlock = [&](int) {
+            engine.log.append(QStringLiteral("server has %1 audio events").arg(server.audioEvents()));
+        };
+        QVERIFY(worker.start(
+            textJob(QStringLiteral("One sentence to speak. And another one after it. A third."))));
+        QTRY_VERIFY(!worker.isBusy());
+        QStringList expected;
+        for (int render = 0; render < 3; ++render) {
+            for (int i = 1; i <= engine.blocks; ++i) {
+                expected << QStringLiteral("engine renders block %1").arg(i)
+                         << QStringLiteral("server has %1 audio events").arg(render * engine.blocks + i);
+            }
+            expected << QStringLiteral("engine done");
+        }
+        QCOMPARE(engine.log, expected);
+        // Three sentences, three renders, one look-up of the voice and its engine.
+        QCOMPARE(engine.renders, 3);
+        QCOMPARE(lookups, 1);
+        const QByteArray stream = server.received();
+        QVERIFY(stream.startsWith("701 BEGIN\n"));
+        QVERIFY(stream.endsWith("\n705 AUDIO\n702 END\n"));
+        QCOMPARE(ModuleDriver::samplesOfStream(stream).size(), size_t(3 * engine.blocks * 1000));
+    }
+
+    /// A stop that comes while the engine renders ends the render at the next block: STOP follows,
+    /// and no audio after it.
+    void stopDuringARenderEndsAtTheNextBlock()
+    {
+        ServerPipe server;
+        AudioSender sender(server.writeEnd());
+        ScriptedEngine engine;
+        engine.blocks = 100000; // minutes of audio
+        SpeechWorker worker(sender, [&](const QString &, QString *) { return &engine; });
+        engine.afterBlock = [&](int block) {
+            if (block == 3) {
+                worker.stop(); // as when STOP arrives from the server now
+            }
+        };
+        QVERIFY(worker.start(textJob(QStringLiteral("A long text. ").repeated(50))));
+        QTRY_VERIFY(!worker.isBusy());
+        QCOMPARE(engine.log,
+            QStringList({QStringLiteral("engine renders block 1"), QStringLiteral("engine renders block 2"),
+                QStringLiteral("engine renders block 3"), QStringLiteral("engine renders block 4"),
+                QStringLiteral("engine told to stop"), QStringLiteral("engine done")}));
+        QCOMPARE(engine.renders, 1); // the other sentences are not rendered at all
+        const QByteArray stream = server.received();
+        QCOMPARE(stream.count("\n705 AUDIO\n"), 3);
+        QVERIFY(stream.endsWith("\n705 AUDIO\n703 STOP\n"));
+        QCOMPARE(stream.count("702 END"), 0);
+        // The worker serves the next message.
+        engine.blocks = 2;
+        engine.afterBlock = {};
+        QVERIFY(worker.start(textJob(QStringLiteral("Next."))));
+        QTRY_VERIFY(!worker.isBusy());
+        QVERIFY(server.received().endsWith("\n705 AUDIO\n702 END\n"));
+    }
+
+    /// A voice that cannot be found ends the message with STOP before any audio.
+    void missingEngineEndsTheMessageWithStop()
+    {
+        ServerPipe server;
+        AudioSender sender(server.writeEnd());
+        SpeechWorker worker(sender, [](const QString &name, QString *error) -> SpeechEngine * {
+            *error = QStringLiteral("no engine %1").arg(name);
+            return nullptr;
+        });
+        QVERIFY(worker.start(textJob(QStringLiteral("Hello."))));
+        QTRY_VERIFY(!worker.isBusy());
+        QCOMPARE(server.received(), QByteArray("701 BEGIN\n703 STOP\n"));
+    }
+
     void settingsAreCheckedLineByLine()
     {
         SpeechSettings settings;
@@ -315,7 +487,7 @@ private Q_SLOTS:
         module.send("STOP\n");
         QVERIFY(module.waitForLine("703 STOP", 60000));
         const auto items = module.takeItems();
-        // Between STOP's arrival and the STOP event, at most what one sentence rendering takes.
+        // The audio stops at the block after STOP's arrival; what came before depends on the machine.
         const auto samples = module.samplesOf(items);
         QVERIFY2(samples.size() < 22050 * 60, QByteArray::number(qulonglong(samples.size())));
         QCOMPARE(module.linesOf(items).count("702 END"), 0);

@@ -61,7 +61,18 @@ void EnginePlugins::scanLocked()
             // Reading the metadata does not load the library.
             QPluginLoader loader(file.absoluteFilePath());
             const QJsonObject meta = loader.metaData();
-            if (meta.value(QStringLiteral("IID")).toString() != QLatin1String(m_kind.interfaceId)) {
+            const QString iid = meta.value(QStringLiteral("IID")).toString();
+            if (iid != QLatin1String(m_kind.interfaceId)) {
+                // A plugin of this kind built against another version of the interface would crash
+                // when called: refuse it, and say so, as it is usually a leftover of an older install.
+                const QString wanted = QLatin1String(m_kind.interfaceId);
+                const QString family = wanted.left(wanted.lastIndexOf(QLatin1Char('/')) + 1);
+                if (iid.startsWith(family)) {
+                    qCWarning(m_kind.category,
+                        "Skipping the %s plugin %s: it was built for %s, this library needs %s",
+                        qPrintable(m_kind.noun), qPrintable(file.absoluteFilePath()), qPrintable(iid),
+                        qPrintable(wanted));
+                }
                 continue;
             }
             const QString name = meta.value(QStringLiteral("MetaData"))

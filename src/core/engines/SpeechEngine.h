@@ -9,6 +9,7 @@
 #include <QtPlugin>
 
 #include <cmath>
+#include <functional>
 #include <optional>
 
 namespace Cadenza::Platform {
@@ -43,11 +44,14 @@ struct SynthesisParameters
     }
 };
 
+/// Receives rendered audio block by block; returning false stops the render after this block.
+using AudioBlockSink = std::function<bool(const qint16 *samples, qsizetype count, int sampleRate)>;
+
 /**
  * A speech engine: turns text into 16-bit mono PCM with one voice. Each engine is a Qt plugin in
  * the library's plugin folder (see SpeechEngines); voice bundles name the engine they need.
  *
- * render() may be called from any thread; an engine serialises its renders when it must.
+ * Renders may be called from any thread; an engine serialises its renders when it must.
  */
 class SpeechEngine
 {
@@ -58,19 +62,42 @@ public:
     [[nodiscard]] virtual QString engineName() const = 0;
     /**
      * Speaks @p text with @p voice (its bundle folder in voice.bundlePath, its engine settings in
-     * voice.engineSettings). Returns nothing, with a readable @p error, when the voice cannot speak.
+     * voice.engineSettings), handing the audio to @p sink in blocks as the engine produces them, so
+     * that the first block can be played long before the whole text is rendered. The render ends
+     * early, still successfully, after a block for which @p sink returns false or after cancel().
+     * Returns false, with a readable @p error, when the voice cannot speak.
+     */
+    [[nodiscard]] virtual bool renderBlocks(const VoiceDescription &voice, const QString &text,
+        const SynthesisParameters &parameters, const AudioBlockSink &sink, QString *error)
+        = 0;
+    /**
+     * Speaks @p text whole. Returns nothing, with a readable @p error, when the voice cannot speak.
      * A render cut short by cancel() returns what was rendered so far.
      */
-    [[nodiscard]] virtual std::optional<PcmAudio> render(const VoiceDescription &voice, const QString &text,
+    [[nodiscard]] std::optional<PcmAudio> render(const VoiceDescription &voice, const QString &text,
         const SynthesisParameters &parameters, QString *error)
-        = 0;
+    {
+        PcmAudio audio;
+        const bool spoken = renderBlocks(
+            voice, text, parameters,
+            [&audio](const qint16 *samples, qsizetype count, int sampleRate) {
+                audio.sampleRate = sampleRate;
+                audio.samples.insert(audio.samples.end(), samples, samples + count);
+                return true;
+            },
+            error);
+        if (!spoken) {
+            return std::nullopt;
+        }
+        return audio;
+    }
     /// Makes the running render return early.
     virtual void cancel() = 0;
 };
 
 } // namespace Cadenza::Platform
 
-#define CadenzaSpeechEngine_iid "org.cadenza.SpeechEngine/1"
+#define CadenzaSpeechEngine_iid "org.cadenza.SpeechEngine/2" // raised whenever the class above changes
 Q_DECLARE_INTERFACE(Cadenza::Platform::SpeechEngine, CadenzaSpeechEngine_iid)
 
 #endif

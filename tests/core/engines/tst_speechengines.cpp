@@ -2,6 +2,7 @@
 #include "TestEnvironment.h"
 
 #include "FliteVoiceFile.h"
+#include "core/engines/SpeechEngine.h"
 #include "core/engines/SpeechEngines.h"
 #include "core/files/Paths.h"
 #include "core/formats/WaveFile.h"
@@ -14,6 +15,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <numeric>
 
 using namespace Cadenza::Platform;
 using Cadenza::Engines::FliteVoiceFile;
@@ -134,6 +136,62 @@ private Q_SLOTS:
         QVERIFY2(male, qPrintable(error));
         QVERIFY2(female > 140 && medianPitch(*male) < 130,
             qPrintable(QStringLiteral("%1 %2").arg(female).arg(medianPitch(*male))));
+    }
+
+    void bothEnginesHandOutBlocksAndStopBetweenThem_data()
+    {
+        QTest::addColumn<QString>("voice");
+        QTest::newRow("espeak-ng") << QStringLiteral("espeak");
+        QTest::newRow("flite") << QStringLiteral("slt");
+    }
+    /// The audio comes in many blocks, which together are the whole render; a sink that refuses a
+    /// block ends the render there.
+    void bothEnginesHandOutBlocksAndStopBetweenThem()
+    {
+        QFETCH(QString, voice);
+        BundleSpeechSynthesisService service;
+        const auto description = service.voice(P + voice);
+        QVERIFY(description);
+        QString error;
+        SpeechEngine *engine = SpeechEngines::engine(description->engineName, &error);
+        QVERIFY2(engine, qPrintable(error));
+        SynthesisParameters parameters;
+        parameters.wordsPerMinute = parameters.normalWordsPerMinute = description->engineRate;
+        parameters.pitch = parameters.normalPitch = description->enginePitch;
+        const QString text = Text + QLatin1Char(' ') + Text;
+
+        const auto whole = engine->render(*description, text, parameters, &error);
+        QVERIFY2(whole && whole->durationSeconds() > 4.0, qPrintable(error));
+        std::vector<qsizetype> blocks;
+        QVERIFY2(engine->renderBlocks(
+                     *description, text, parameters,
+                     [&](const qint16 *, qsizetype count, int sampleRate) {
+                         blocks.push_back(sampleRate == whole->sampleRate ? count : -1);
+                         return true;
+                     },
+                     &error),
+            qPrintable(error));
+        QVERIFY2(blocks.size() >= 20, qPrintable(QString::number(blocks.size())));
+        QCOMPARE(std::count(blocks.cbegin(), blocks.cend(), -1), 0);
+        // No block holds more than a fifth of a second.
+        QVERIFY(*std::max_element(blocks.cbegin(), blocks.cend()) <= whole->sampleRate / 5);
+        const qsizetype total = std::accumulate(blocks.cbegin(), blocks.cend(), qsizetype(0));
+        QVERIFY2(std::abs(double(total) / double(whole->samples.size()) - 1.0) < 0.05,
+            qPrintable(QStringLiteral("%1 of %2").arg(total).arg(whole->samples.size())));
+
+        int calls = 0;
+        QVERIFY2(engine->renderBlocks(
+                     *description, text, parameters,
+                     [&](const qint16 *, qsizetype, int) {
+                         ++calls;
+                         return calls < 2;
+                     },
+                     &error),
+            qPrintable(error));
+        QCOMPARE(calls, 2);
+        // The engine speaks again after a stop.
+        const auto again = engine->render(*description, Text, parameters, &error);
+        QVERIFY2(again && again->durationSeconds() > 2.0, qPrintable(error));
     }
 
     void rateChangesBothEngines_data()
@@ -322,6 +380,49 @@ private Q_SLOTS:
                          QStringLiteral("--output"), wav, QStringLiteral("Hello")},
                      &err),
             0);
+        QString error;
+        const auto audio = WaveFile::read(wav, &error);
+        QVERIFY2(audio && audio->rootMeanSquare() > 300.0, qPrintable(error));
+    }
+
+    /// A plugin built for an older version of the engine interface is refused with a line saying so,
+    /// and the engine of a later folder is used instead.
+    void pluginOfAnOlderInterfaceIsRefused()
+    {
+        const QString old = m_environment->path(QStringLiteral("old-plugins"));
+        const QString current = m_environment->path(QStringLiteral("plugins"));
+        QVERIFY(QDir().mkpath(old) && QDir().mkpath(current));
+        QVERIFY(
+            QFile::link(QStringLiteral(OLD_ENGINE_PLUGIN), old + QStringLiteral("/cadenza_espeak_ng.so")));
+        QVERIFY(QFile::link(QStringLiteral(CADENZA_BUILD_PLUGIN_DIR "/cadenza_espeak_ng.so"),
+            current + QStringLiteral("/cadenza_espeak_ng.so")));
+        const QString wav = m_environment->path(QStringLiteral("x.wav"));
+        const auto say = [&](const QString &pluginPath, QString *err) {
+            QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+            environment.insert(QStringLiteral("CADENZA_PLUGIN_PATH"), pluginPath);
+            QProcess process;
+            process.setProcessEnvironment(environment);
+            process.start(QStringLiteral(CADENZA_CLI_PATH),
+                {QStringLiteral("say"), QStringLiteral("--voice"), P + QStringLiteral("espeak"),
+                    QStringLiteral("--output"), wav, QStringLiteral("Hello")});
+            if (!process.waitForFinished(30000) || process.exitStatus() != QProcess::NormalExit) {
+                return -1;
+            }
+            *err = QString::fromUtf8(process.readAllStandardError());
+            return process.exitCode();
+        };
+        const QString refusal
+            = QStringLiteral("Skipping the speech engine plugin %1/cadenza_espeak_ng.so: it was "
+                             "built for org.cadenza.SpeechEngine/1, this library needs %2")
+                  .arg(old, QStringLiteral(CadenzaSpeechEngine_iid));
+        QString err;
+        QCOMPARE(say(old, &err), 1);
+        QVERIFY2(err.contains(refusal), qPrintable(err));
+        QVERIFY2(
+            err.contains(QStringLiteral("the speech engine 'espeak-ng' is not installed")), qPrintable(err));
+        QVERIFY(!QFile::exists(wav));
+        QCOMPARE(say(old + QLatin1Char(':') + current, &err), 0);
+        QVERIFY2(err.contains(refusal), qPrintable(err));
         QString error;
         const auto audio = WaveFile::read(wav, &error);
         QVERIFY2(audio && audio->rootMeanSquare() > 300.0, qPrintable(error));
