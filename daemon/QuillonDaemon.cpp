@@ -10,11 +10,9 @@
 #include "platform/Paths.h"
 #include "platform/Services.h"
 #include "platform/UnixMessagePortService.h"
+#include "quillond_logging.h"
 
 #include <QDir>
-#include <QLoggingCategory>
-
-Q_LOGGING_CATEGORY(lcDaemon, "quillond", QtInfoMsg)
 
 namespace Quillond {
 

@@ -37,15 +37,15 @@ int dictateFromMicrophone(const QString &program, Transcriber &transcriber)
         return 1;
     }
     std::fprintf(stderr, "Listening; press Enter to finish.\n");
-    int status = 0;
+    bool failed = false;
     QString shown;
     QObject::connect(&microphone, &Microphone::samplesAvailable, [&](const QVector<qint16> &samples) {
-        if (status != 0) {
+        if (failed) {
             return;
         }
         if (!transcriber.feed(samples.constData(), samples.size(), &error)) {
             std::fprintf(stderr, "%s: %s\n", qPrintable(program), qPrintable(error));
-            status = 1;
+            failed = true;
             QCoreApplication::quit();
             return;
         }
@@ -63,8 +63,8 @@ int dictateFromMicrophone(const QString &program, Transcriber &transcriber)
     });
     QCoreApplication::exec();
     microphone.stop();
-    if (status != 0) {
-        return status;
+    if (failed) {
+        return 1;
     }
     const auto text = transcriber.finish(&error);
     if (!text) {

@@ -4,6 +4,7 @@
 #include "platform/Locale.h"
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
+#include "platform/SpeechNames.h"
 #include "platform/SpeechSynthesisService.h"
 #include "platform/VoiceDescription.h"
 
@@ -57,13 +58,15 @@ QString qualitySuffix(const QString &identifier)
 bool hasSelectedVoice(SpeechSynthesisService &service)
 {
     PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(SpeechSynthesisService::PreferencesDomain);
+    (void)preferences.synchronize(Cadenza::SpeechNames::VoicePreferencesDomain);
     bool creatorOk = false;
-    const int creator
-        = preferences.value(QStringLiteral("SelectedVoiceCreator"), SpeechSynthesisService::PreferencesDomain)
-              .toInt(&creatorOk);
+    const int creator = preferences
+                            .value(Cadenza::SpeechNames::SelectedVoiceCreatorKey,
+                                Cadenza::SpeechNames::VoicePreferencesDomain)
+                            .toInt(&creatorOk);
     const int id
-        = preferences.value(QStringLiteral("SelectedVoiceID"), SpeechSynthesisService::PreferencesDomain)
+        = preferences
+              .value(Cadenza::SpeechNames::SelectedVoiceIDKey, Cadenza::SpeechNames::VoicePreferencesDomain)
               .toInt();
     return creatorOk && !service.voiceIdentifierForSpec(creator, id).isEmpty();
 }

@@ -117,11 +117,11 @@ std::optional<QByteArray> CZSpeechInstallationManager::_sendMessage(
     const auto result = _serverPortRef->sendRequest(messageId, data, SendTimeout, receiveTimeout, withReply);
     m_lastSendStatus = result.status;
     if (result.status != Platform::MessagePortStatus::Success) {
-        qCWarning(lcInstallation, "failed to send request %d: %d\n", int(messageId), result.status);
+        qCWarning(lcInstallation, "failed to send request %d: %d", int(messageId), result.status);
         return std::nullopt;
     }
     if (withReply && !result.reply) {
-        qCWarning(lcInstallation, "client got NULL return data\n");
+        qCWarning(lcInstallation, "client got NULL return data");
     }
     return result.reply;
 }

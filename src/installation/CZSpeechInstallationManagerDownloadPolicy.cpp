@@ -8,6 +8,7 @@
 #include "platform/PowerSourcesInfo.h"
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
+#include "platform/SpeechNames.h"
 #include "platform/SpeechSynthesisService.h"
 #include "platform/VoiceDescription.h"
 #include "recognition-languages/CZSRLanguageItem.h"
@@ -61,13 +62,13 @@ void CZSpeechInstallationManager::markDownloadableVoiceObject(
         return;
     }
     Platform::PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(VoicePreferencesDomain);
-    QVariantMap log = preferences.value(InstallationLogKey, VoicePreferencesDomain).toMap();
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
+    QVariantMap log = preferences.value(InstallationLogKey, SpeechNames::VoicePreferencesDomain).toMap();
     QVariantMap entry = log.value(tag).toMap();
     entry.insert(QStringLiteral("AutoAttemptProhibited"), withAutoDownloadProhibitFlag);
     log.insert(tag, entry);
-    preferences.setValue(InstallationLogKey, log, VoicePreferencesDomain);
-    (void)preferences.synchronize(VoicePreferencesDomain);
+    preferences.setValue(InstallationLogKey, log, SpeechNames::VoicePreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
 }
 
 bool CZSpeechInstallationManager::isAutoDownloadProhibitedForDownloadableVoiceObject(
@@ -76,7 +77,7 @@ bool CZSpeechInstallationManager::isAutoDownloadProhibitedForDownloadableVoiceOb
     if (voice.tagName().isEmpty()) {
         return false;
     }
-    const auto entry = installationLogEntryForTag(voice.tagName(), VoicePreferencesDomain);
+    const auto entry = installationLogEntryForTag(voice.tagName(), SpeechNames::VoicePreferencesDomain);
     if (!entry) {
         return false;
     }
@@ -146,7 +147,7 @@ bool CZSpeechInstallationManager::startDownloadingHighestQualityIfNecessaryForVo
     }
     const QString tag = upgrade->fullSizeBundleIdentifier() == voiceIdentifier ? upgrade->fullSizeTagName()
                                                                                : upgrade->tagName();
-    if (const auto entry = installationLogEntryForTag(tag, VoicePreferencesDomain)) {
+    if (const auto entry = installationLogEntryForTag(tag, SpeechNames::VoicePreferencesDomain)) {
         if (entry->contains(QStringLiteral("RemovalDate"))) {
             return false; // the user removed it
         }

@@ -8,6 +8,7 @@
 #include "Services.h"
 #include "SpeechEngine.h"
 #include "SpeechEngines.h"
+#include "SpeechNames.h"
 
 #include <QAudioDevice>
 #include <QAudioFormat>
@@ -200,8 +201,8 @@ quint64 BundleSpeechSynthesisService::voicesGeneration() const
 std::optional<QString> BundleSpeechSynthesisService::speechLanguageLocale()
 {
     PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(PreferencesDomain);
-    const QVariant stored = preferences.value(SpeechLanguageKey, PreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
+    const QVariant stored = preferences.value(SpeechLanguageKey, SpeechNames::VoicePreferencesDomain);
     if (stored.typeId() != QMetaType::QString) {
         return std::nullopt;
     }

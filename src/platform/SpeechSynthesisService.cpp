@@ -3,6 +3,7 @@
 #include "Locale.h"
 #include "PreferencesStore.h"
 #include "Services.h"
+#include "SpeechNames.h"
 #include "UserLocaleService.h"
 
 #include <QHash>
@@ -11,9 +12,6 @@ namespace Cadenza::Platform {
 
 const QString SpeechSynthesisService::DefaultVoiceGroup = QStringLiteral("VoiceGroupDefault");
 const QString SpeechSynthesisService::CompactVoiceGroup = QStringLiteral("VoiceGroupCompact");
-const QString SpeechSynthesisService::FallbackVoiceIdentifier
-    = QStringLiteral("com.vendra.speech.synthesis.voice.Orin");
-const QString SpeechSynthesisService::PreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
 const QString SpeechSynthesisService::SpeechLanguageKey = QStringLiteral("SpeechLanguageLocale");
 
 namespace {
@@ -134,12 +132,12 @@ QString SpeechSynthesisService::defaultVoice()
 {
     const QStringList available = availableVoices();
     PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(PreferencesDomain);
-    const auto creator
-        = storedInteger(preferences.value(QStringLiteral("SelectedVoiceCreator"), PreferencesDomain));
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
+    const auto creator = storedInteger(
+        preferences.value(SpeechNames::SelectedVoiceCreatorKey, SpeechNames::VoicePreferencesDomain));
     if (creator) {
-        const auto id
-            = storedInteger(preferences.value(QStringLiteral("SelectedVoiceID"), PreferencesDomain));
+        const auto id = storedInteger(
+            preferences.value(SpeechNames::SelectedVoiceIDKey, SpeechNames::VoicePreferencesDomain));
         const QString selected = voiceIdentifierForSpec(*creator, id.value_or(0));
         if (!selected.isEmpty()) {
             const QString base = VoiceDescription::baseIdentifierOf(selected);
@@ -218,8 +216,8 @@ QString SpeechSynthesisService::preferredVoiceForLocale(
     if (!best.isEmpty()) {
         return best;
     }
-    if (identifiers.contains(FallbackVoiceIdentifier)) {
-        return FallbackVoiceIdentifier;
+    if (identifiers.contains(SpeechNames::OrinIdentifier)) {
+        return SpeechNames::OrinIdentifier;
     }
     return identifiers.first();
 }

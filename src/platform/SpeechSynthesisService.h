@@ -37,10 +37,7 @@ class CADENZACORE_EXPORT SpeechSynthesisService : public QObject
 public:
     static const QString DefaultVoiceGroup; ///< "VoiceGroupDefault"
     static const QString CompactVoiceGroup; ///< "VoiceGroupCompact"
-    /// The voice that stands in when nothing else fits.
-    static const QString FallbackVoiceIdentifier;
-    /// Preference domain and keys that hold the user's voice choice.
-    static const QString PreferencesDomain;
+    /// Preference key (in SpeechNames::VoicePreferencesDomain) of the speech language.
     static const QString SpeechLanguageKey;
 
     explicit SpeechSynthesisService(QObject *parent = nullptr);

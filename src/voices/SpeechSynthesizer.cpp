@@ -2,6 +2,7 @@
 
 #include "platform/PreferencesStore.h"
 #include "platform/Services.h"
+#include "platform/SpeechNames.h"
 #include "platform/SpeechSynthesisService.h"
 #include "speech-items/CZSpeechItem_p.h"
 
@@ -20,7 +21,6 @@ const QString kVoiceSettingsCustomRelativeRateKey = QStringLiteral("CustomRelati
 const QString kVoiceSettingsCustomVolumeKey = QStringLiteral("CustomVolume");
 
 namespace {
-const QString VoicePreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
 constexpr double FixedOne = 65536.0;
 
 qint64 nextChannelHandle()
@@ -237,12 +237,13 @@ QStringList SpeechSynthesizer::avaliableMainstreamVoices()
 QString SpeechSynthesizer::defaultVoiceFromAllVoices()
 {
     Platform::PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(VoicePreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
     const QVariant creator
-        = preferences.value(QStringLiteral("SelectedVoiceCreator"), VoicePreferencesDomain);
+        = preferences.value(SpeechNames::SelectedVoiceCreatorKey, SpeechNames::VoicePreferencesDomain);
     SpeechSynthesisService &service = Services::speechSynthesis();
     if (SpeechItemPrivate::isNumber(creator)) {
-        const QVariant id = preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain);
+        const QVariant id
+            = preferences.value(SpeechNames::SelectedVoiceIDKey, SpeechNames::VoicePreferencesDomain);
         const qint32 idValue = SpeechItemPrivate::isNumber(id) ? qint32(id.toLongLong()) : 0;
         const QString identifier = service.voiceIdentifierForSpec(qint32(creator.toLongLong()), idValue);
         if (!identifier.isEmpty()) {

@@ -1,9 +1,11 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
+#include "installation/InstallerProtocol.h"
 #include "platform/FilePreferencesStore.h"
 #include "platform/Paths.h"
 #include "platform/PropertyList.h"
+#include "platform/SpeechNames.h"
 #include "platform/WaveFile.h"
 
 #include <QDir>
@@ -277,12 +279,15 @@ private Q_SLOTS:
             status.insert(value.toObject().value(QStringLiteral("identifier")).toString(),
                 value.toObject().value(QStringLiteral("status")).toInt());
         }
-        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.jonas.premium")), 1);
-        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.compact")), 2);
+        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.jonas.premium")),
+            int(Cadenza::InstallerProtocol::UpgradeAvailableStatus));
+        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.compact")),
+            int(Cadenza::InstallerProtocol::NotInstalledStatus));
         // Ingrid's premium quality is the full size of her compact entry, not a voice of its own.
         QVERIFY(!status.contains(QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.premium")));
-        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.Orin")), 1);
-        QCOMPARE(status.value(QStringLiteral("en_US")), 2);
+        QCOMPARE(status.value(Cadenza::SpeechNames::OrinIdentifier),
+            int(Cadenza::InstallerProtocol::UpgradeAvailableStatus));
+        QCOMPARE(status.value(QStringLiteral("en_US")), int(Cadenza::InstallerProtocol::NotInstalledStatus));
         QVERIFY(
             !status.contains(QStringLiteral("com.vendra.speech.synthesis.voice.maren.premium"))); // installed
 
@@ -300,7 +305,7 @@ private Q_SLOTS:
         Cadenza::Platform::FilePreferencesStore preferences;
         const QVariantMap log = preferences
                                     .value(QStringLiteral("SpeechDataInstallationLog"),
-                                        QStringLiteral("com.vendra.speech.voice.prefs"))
+                                        Cadenza::SpeechNames::VoicePreferencesDomain)
                                     .toMap();
         QVERIFY(log.value(QStringLiteral("VOICEID:com.vendra.speech.synthesis.voice.jonas.premium"))
                     .toMap()

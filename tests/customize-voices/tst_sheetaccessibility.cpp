@@ -17,6 +17,7 @@
 #include "platform/Paths.h"
 #include "platform/RowView.h"
 #include "platform/Services.h"
+#include "platform/SpeechNames.h"
 #include "speech-items/CZSpeechItem_p.h"
 #include "voice-popup/CZVoicePopUpButton_p.h"
 #include "voices/CZVoiceObject.h"
@@ -39,7 +40,7 @@ using Cadenza::Testing::TestEnvironment;
 
 namespace {
 const QString P = QStringLiteral("com.vendra.speech.synthesis.voice.");
-const QString Domain = QStringLiteral("com.vendra.speech.voice.prefs");
+const QString Domain = Cadenza::SpeechNames::VoicePreferencesDomain;
 
 QVariantMap downloadable(
     const QString &name, const QString &locale, const QString &fullSizeIdentifier = QString())

@@ -5,6 +5,7 @@
 
 #include "customize-voices/CZVoiceRowCheckboxButton.h"
 #include "customize-voices/CustomizeVoicesWindowController.h"
+#include "customize-voices/CustomizeVoicesWindowController_p.h"
 #include "customize-voices/VoiceTableCellView.h"
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
@@ -164,7 +165,8 @@ private Q_SLOTS:
             = sheet->currentlyDisplayedVoiceRows().value(rowOf(sheet, IngridCompact));
         QVERIFY(downloading);
         const qint64 status = downloading->voiceObject()->downloadStatus();
-        QVERIFY2(status == 3 || status == 4, qPrintable(QString::number(status)));
+        QVERIFY2(status == InstallerProtocol::DownloadingStatus || status == InstallerProtocol::WaitingStatus,
+            qPrintable(QString::number(status)));
         QVERIFY(std::static_pointer_cast<DownloadableVoice>(downloading->voiceObject())->downloadFullSize());
         QVERIFY(downloading->isSelected());
         sheet->cancelVoiceSelection();
@@ -190,11 +192,11 @@ private Q_SLOTS:
                 ++ingridRows;
                 QCOMPARE(row->voiceObject()->identifier(), IngridPremium);
                 QVERIFY(row->isSelected());
-                QCOMPARE(row->voiceObject()->downloadStatus(), 0);
+                QCOMPARE(row->voiceObject()->downloadStatus(), qint64(InstallerProtocol::InstalledStatus));
             }
         }
         QCOMPARE(ingridRows, 1);
-        sheet->_updateButtonStates();
+        CustomizeVoicesWindowControllerPrivate::get(sheet)->_updateButtonStates();
         QVERIFY(sheet->window()
                     ->findChild<QLabel *>(QStringLiteral("selectedDownloadSizeTextField"))
                     ->text()

@@ -1,6 +1,7 @@
 #include "TestEnvironment.h"
 
 #include "customize-voices/VoiceTableRow.h"
+#include "installation/InstallerProtocol.h"
 #include "platform/FakeSpeechSynthesisService.h"
 #include "platform/FakeUserLocaleService.h"
 #include "platform/InProcessNotificationCenter.h"
@@ -138,7 +139,7 @@ private Q_SLOTS:
         auto hidden
             = downloadable(QStringLiteral("hidden"), QStringLiteral("Hidden"), QStringLiteral("en_US"));
         hidden->setVisibility(0);
-        hidden->setDownloadStatus(4);
+        hidden->setDownloadStatus(InstallerProtocol::WaitingStatus);
         auto chosen
             = downloadable(QStringLiteral("chosen"), QStringLiteral("Chosen"), QStringLiteral("de_DE"));
         chosen->setVisibility(1);

@@ -11,6 +11,7 @@
 #include "platform/Paths.h"
 #include "platform/PropertyList.h"
 #include "platform/Services.h"
+#include "platform/SpeechNames.h"
 #include "platform/UnixMessagePortService.h"
 #include "speech-items/CZSpeechItem_p.h"
 #include "voices/DownloadableVoice.h"
@@ -222,7 +223,7 @@ private Q_SLOTS:
         QVERIFY(server.listen());
         server.dropNextTransferAfter(1024 * 1024 + 17);
         startDaemon({QStringLiteral("--repository"), server.baseUrl().toString()});
-        const QString voice = QStringLiteral("com.vendra.speech.synthesis.voice.Orin");
+        const QString voice = Cadenza::SpeechNames::OrinIdentifier;
         QVERIFY(m_manager->_requestInstallation(
             QStringLiteral("VOICEID:") + voice, QStringLiteral("Orin"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion, 30000));

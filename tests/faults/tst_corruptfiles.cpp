@@ -8,6 +8,7 @@
 #include "platform/FilePreferencesStore.h"
 #include "platform/Paths.h"
 #include "platform/Services.h"
+#include "platform/SpeechNames.h"
 #include "voices/CZVoiceObject.h"
 #include "voices/SpeechSynthesizer.h"
 
@@ -171,7 +172,7 @@ private Q_SLOTS:
             TestEnvironment::voiceAttributes(Good, QStringLiteral("Good Compact"), QStringLiteral("en_US")));
         const QString folder = Paths::configFolder();
         FilePreferencesStore store(folder);
-        const QString domain = QStringLiteral("com.vendra.speech.voice.prefs");
+        const QString domain = Cadenza::SpeechNames::VoicePreferencesDomain;
         writeFile(store.filePath(domain),
             plist("<dict><key>VisibleIdentifiers</key><string>everything</string>"
                   "<key>SelectedVoiceCreator</key><string>abc</string><key>SelectedVoiceID</key><array/>"

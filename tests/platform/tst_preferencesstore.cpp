@@ -2,6 +2,7 @@
 
 #include "platform/FilePreferencesStore.h"
 #include "platform/MemoryPreferencesStore.h"
+#include "platform/SpeechNames.h"
 
 #include <QDir>
 #include <QFile>
@@ -10,7 +11,7 @@
 using namespace Cadenza::Platform;
 
 namespace {
-const QString Domain = QStringLiteral("com.vendra.speech.voice.prefs");
+const QString Domain = Cadenza::SpeechNames::VoicePreferencesDomain;
 }
 
 /**

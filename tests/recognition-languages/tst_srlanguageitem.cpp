@@ -1,6 +1,7 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
+#include "installation/InstallerProtocol.h"
 #include "platform/FakeSpeechSynthesisService.h"
 #include "platform/FakeUserLocaleService.h"
 #include "platform/InProcessNotificationCenter.h"
@@ -9,6 +10,7 @@
 #include "platform/PropertyList.h"
 #include "platform/RecognitionService.h"
 #include "platform/Services.h"
+#include "platform/SpeechNames.h"
 #include "recognition-languages/CZSRLanguageItem.h"
 #include "speech-items/CZSpeechItem_p.h"
 
@@ -194,15 +196,14 @@ private Q_SLOTS:
         QCOMPARE(CZSRLanguageItem::visibiltyValueForLocaleIdentifier(QStringLiteral("de"), &exists), 2);
         QVERIFY(!exists);
         QTRY_COMPARE(posted.size(), 3); // every write announces, changed or not
-        QCOMPARE(posted.first().at(0).toString(),
-            QStringLiteral("com.vendra.speech.DefaultSRLanguageChangedNotification"));
+        QCOMPARE(posted.first().at(0).toString(), Cadenza::SpeechNames::DefaultSRLanguageChangedNotification);
         QCOMPARE(CZSRLanguageItem::initWithLocaleIdentifier(QStringLiteral("fr_CA"))->visibility(), 0);
     }
 
     void description()
     {
         const auto item = CZSRLanguageItem::initWithLocaleIdentifier(QStringLiteral("de-DE"));
-        item->setDownloadStatus(3);
+        item->setDownloadStatus(InstallerProtocol::DownloadingStatus);
         item->setDownloadPercentComplete(12.5);
         QCOMPARE(item->description(),
             QStringLiteral(

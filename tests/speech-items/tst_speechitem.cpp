@@ -1,5 +1,6 @@
 #include "TestEnvironment.h"
 
+#include "installation/InstallerProtocol.h"
 #include "platform/FakeSpeechSynthesisService.h"
 #include "platform/FakeUserLocaleService.h"
 #include "platform/LocalizationTable.h"
@@ -255,7 +256,7 @@ private Q_SLOTS:
         QVERIFY(odd->tagName().isNull());
         QCOMPARE(odd->fullSizeByteSize(), 77u);
         QCOMPARE(odd->version(), QStringLiteral("2.0"));
-        QCOMPARE(odd->downloadStatus(), 0);
+        QCOMPARE(odd->downloadStatus(), qint64(InstallerProtocol::InstalledStatus));
         QCOMPARE(odd->visibility(), 0);
     }
 
