@@ -78,7 +78,7 @@ CustomizeVoicesWindowController::CustomizeVoicesWindowController(QObject *parent
     d->setUpForm({ui.voiceSelectionTableView, ui.okButton, ui.cancelButton, ui.searchField,
                      ui.selectedDownloadSizeTextField, ui.noResultsFoundTextField, ui.explanationLabel},
         {QStringLiteral("VoiceCustomizationTitle"), QStringLiteral("VoiceCustomizationExplanation"),
-            QStringLiteral("VoiceCustomizationTable")},
+            QStringLiteral("VoiceCustomizationTable"), QStringLiteral("DeleteDisabledVoiceAlertTitleText")},
         d->voiceModel, VoiceTableCellView().sizeHint().height());
     connect(d->playStopButton, &QPushButton::clicked, this,
         &CustomizeVoicesWindowController::startStopPlayingSelection);
@@ -599,37 +599,40 @@ void CustomizeVoicesWindowControllerPrivate::selectionDidChange()
     q->tableViewSelectionDidChange();
 }
 
-void CustomizeVoicesWindowControllerPrivate::_updateRowDownloadStatus()
+QVariantList CustomizeVoicesWindowControllerPrivate::activeInstallations() const
 {
-    Q_Q(CustomizeVoicesWindowController);
-    const QVariantList records = manager().activeVoiceInstallations();
-    QMutexLocker locker(&lock);
-    for (const QVariant &entry : records) {
-        const QVariantMap record = entry.toMap();
-        // The record may name the full-size voice being fetched rather than the row's own.
-        int row = -1;
-        auto match = CZSpeechInstallationManager::RecordMatch::None;
-        for (int candidate = 0; candidate < currentlyDisplayedVoiceRows.size() && row < 0; ++candidate) {
-            const CZVoiceObjectPtr &voice = currentlyDisplayedVoiceRows.at(candidate)->voiceObject();
-            if (voice) {
-                match = CZSpeechInstallationManager::installationRecordMatch(record, *voice);
-                row = match == CZSpeechInstallationManager::RecordMatch::None ? -1 : candidate;
-            }
-        }
-        if (row < 0) {
+    return manager().activeVoiceInstallations();
+}
+
+int CustomizeVoicesWindowControllerPrivate::rowOfInstallationRecord(const QVariantMap &record)
+{
+    for (int row = 0; row < currentlyDisplayedVoiceRows.size(); ++row) {
+        const CZVoiceObjectPtr &voice = currentlyDisplayedVoiceRows.at(row)->voiceObject();
+        if (!voice) {
             continue;
         }
-        const VoiceTableRowPtr &displayed = currentlyDisplayedVoiceRows.at(row);
-        const CZVoiceObjectPtr &voice = displayed->voiceObject();
+        // The record may name the full-size voice being fetched rather than the row's own.
+        const auto match = CZSpeechInstallationManager::installationRecordMatch(record, *voice);
         if (match == CZSpeechInstallationManager::RecordMatch::FullSize) {
             std::static_pointer_cast<DownloadableVoice>(voice)->setDownloadFullSize(true);
         }
-        voice->setDownloadStatus(record.value(Protocol::ItemDownloadStatusKey).toLongLong());
-        voice->setDownloadPercentComplete(record.value(Protocol::ItemPercentCompleteKey).toDouble());
-        if (VoiceTableCellView *view = q->existingViewForRow(row)) {
-            _setRowStatusFieldView(view->downloadMessageTextField(), view->downloadVariantPopUpButton(),
-                voice, displayed->isSelected());
+        if (match != CZSpeechInstallationManager::RecordMatch::None) {
+            return row;
         }
+    }
+    return -1;
+}
+
+void CustomizeVoicesWindowControllerPrivate::showInstallationRecord(int row, const QVariantMap &record)
+{
+    Q_Q(CustomizeVoicesWindowController);
+    const VoiceTableRowPtr &displayed = currentlyDisplayedVoiceRows.at(row);
+    const CZVoiceObjectPtr &voice = displayed->voiceObject();
+    voice->setDownloadStatus(record.value(Protocol::ItemDownloadStatusKey).toLongLong());
+    voice->setDownloadPercentComplete(record.value(Protocol::ItemPercentCompleteKey).toDouble());
+    if (VoiceTableCellView *view = q->existingViewForRow(row)) {
+        _setRowStatusFieldView(view->downloadMessageTextField(), view->downloadVariantPopUpButton(), voice,
+            displayed->isSelected());
     }
 }
 
@@ -645,11 +648,6 @@ void CustomizeVoicesWindowControllerPrivate::willCommit()
         form.searchField->clear();
     }
     _updateDisplayedVoicesUsingFilterString(QString());
-}
-
-QString CustomizeVoicesWindowControllerPrivate::removalAlertTitle() const
-{
-    return texts().text(QStringLiteral("DeleteDisabledVoiceAlertTitleText"));
 }
 
 CustomizeSheetControllerPrivate::Decision CustomizeVoicesWindowControllerPrivate::decide()

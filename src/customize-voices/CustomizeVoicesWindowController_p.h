@@ -38,7 +38,6 @@ public:
     void _rebuildVoiceList();
     void _updateDisplayedVoicesUsingFilterString(const QString &filter);
     void _updateButtonStates();
-    void _updateRowDownloadStatus();
     void _propagateCheckboxSelection(CZVoiceRowCheckboxButton *sender);
     void _propagateDownloadCheckboxSelection(CZVoiceRowCheckboxButton *sender);
     void _propagateDownloadVariantSelection(QComboBox *sender, int index);
@@ -66,10 +65,11 @@ public:
     {
         _updateDisplayedVoicesUsingFilterString(filter);
     }
-    void updateRowDownloadStatus() override { _updateRowDownloadStatus(); }
+    [[nodiscard]] QVariantList activeInstallations() const override;
+    [[nodiscard]] int rowOfInstallationRecord(const QVariantMap &record) override;
+    void showInstallationRecord(int row, const QVariantMap &record) override;
     void selectionDidChange() override;
     [[nodiscard]] Decision decide() override;
-    [[nodiscard]] QString removalAlertTitle() const override;
     void stopActivity() override;
     void willPresent() override;
     void willCommit() override;

@@ -12,10 +12,10 @@ VoiceTableCellView::VoiceTableCellView(QWidget *parent)
         new CZVoiceRowCheckboxButton, new CZVoiceRowTextView, QStringLiteral("VoiceRow"), parent)
     , m_downloadCheckbox(new CZVoiceRowCheckboxButton)
 {
+    downloadVariantPopUpButton()->setSizeAdjustPolicy(QComboBox::AdjustToContents);
     m_downloadCheckbox->setObjectName(QStringLiteral("downloadCheckbox"));
     m_downloadCheckbox->hide();
     addTrailingControl(m_downloadCheckbox);
-    downloadVariantPopUpButton()->setSizeAdjustPolicy(QComboBox::AdjustToContents);
 }
 
 VoiceTableCellView::~VoiceTableCellView() = default;

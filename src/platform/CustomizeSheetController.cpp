@@ -51,6 +51,7 @@ void CustomizeSheetControllerPrivate::setUpForm(
 {
     Q_Q(CustomizeSheetController);
     form = parts;
+    formTexts = keys;
     model = rowsModel;
     window->setWindowTitle(texts().text(keys.title));
     form.explanationLabel->setText(texts().text(keys.explanation));
@@ -101,7 +102,7 @@ void CustomizeSheetControllerPrivate::present(QWidget *parentWindow, bool poll)
         downloadStatusUpdateTimer = new QTimer(q_ptr);
         downloadStatusUpdateTimer->setInterval(StatusPollMilliseconds);
         QObject::connect(
-            downloadStatusUpdateTimer, &QTimer::timeout, q_ptr, [this] { updateRowDownloadStatus(); });
+            downloadStatusUpdateTimer, &QTimer::timeout, q_ptr, [this] { _updateRowDownloadStatus(); });
         downloadStatusUpdateTimer->start();
     }
     form.selectedDownloadSizeTextField->clear();
@@ -176,7 +177,7 @@ void CustomizeSheetControllerPrivate::accept()
     Platform::AlertRequest alert;
     alert.icon = QIcon::fromTheme(QStringLiteral("preferences-desktop-text-to-speech"),
         window->style()->standardIcon(QStyle::SP_MessageBoxWarning));
-    alert.title = removalAlertTitle();
+    alert.title = texts().text(formTexts.removalAlertTitle);
     alert.buttons = {texts().text(QStringLiteral("DeleteDisabledItemAlertDeleteButtonText")),
         texts().text(QStringLiteral("Cancel")),
         texts().text(QStringLiteral("DeleteDisabledItemAlertKeepButtonText"))};
@@ -199,6 +200,18 @@ void CustomizeSheetControllerPrivate::cancel()
     stopObservingInstallations();
     close();
     endSheet(false);
+}
+
+void CustomizeSheetControllerPrivate::_updateRowDownloadStatus()
+{
+    const QVariantList records = activeInstallations();
+    QMutexLocker locker(&lock);
+    for (const QVariant &entry : records) {
+        const QVariantMap record = entry.toMap();
+        if (const int row = rowOfInstallationRecord(record); row >= 0) {
+            showInstallationRecord(row, record);
+        }
+    }
 }
 
 QString CustomizeSheetControllerPrivate::rowStatusText(

@@ -10,6 +10,7 @@
 #include <QRecursiveMutex>
 #include <QSet>
 #include <QString>
+#include <QVariantMap>
 
 #include <functional>
 
@@ -48,6 +49,8 @@ public:
         QString title;
         QString explanation;
         QString table;
+        /// The title of the alert that asks before removing unticked items.
+        QString removalAlertTitle;
     };
     /// What OK decided, and how to carry it out once the user agreed.
     struct Decision
@@ -73,6 +76,8 @@ public:
     void endSheet(bool accepted);
     void accept();
     void cancel();
+    /// Brings the displayed rows up to date with the installer's active installations.
+    void _updateRowDownloadStatus();
 
     /// The status line of an item row: waiting, downloading (with its percentage) or, for a ticked
     /// item that is not installed, required; empty otherwise.
@@ -92,11 +97,15 @@ public:
     /// Rebuilds the list of items (on showing and when an installation finished).
     virtual void rebuild() = 0;
     virtual void updateDisplayUsingFilterString(const QString &filter) = 0;
-    virtual void updateRowDownloadStatus() = 0;
+    /// The installer's records of the active installations of the sheet's kind.
+    [[nodiscard]] virtual QVariantList activeInstallations() const = 0;
+    /// The displayed row an installation record is about; -1 for none.
+    [[nodiscard]] virtual int rowOfInstallationRecord(const QVariantMap &record) = 0;
+    /// Takes the status and progress of @p record into item row @p row and its view.
+    virtual void showInstallationRecord(int row, const QVariantMap &record) = 0;
     virtual void selectionDidChange() = 0;
     /// Decides OK (under the lock) and stores the visibility.
     [[nodiscard]] virtual Decision decide() = 0;
-    [[nodiscard]] virtual QString removalAlertTitle() const = 0;
     /// Stops what the sheet is doing (a sample playing) before it ends.
     virtual void stopActivity() { }
     /// Runs once the items are rebuilt, before the sheet is shown.
@@ -109,6 +118,7 @@ public:
     CustomizeSheetController *const q_ptr;
     QDialog *window;
     Form form;
+    FormTexts formTexts;
     Platform::GroupedRowsModel *model = nullptr;
     Platform::VisibleRowViews *rowViews = nullptr;
     QPointer<QTimer> downloadStatusUpdateTimer;

@@ -44,6 +44,8 @@ void CustomizeSheetRowView::addTrailingControl(QWidget *control)
 {
     control->setParent(this);
     layout()->addWidget(control);
+    // Once more over the children, so the new control too is reached from the table, not by Tab.
+    setParts(tick(), nameLabel(), statusLabel());
 }
 
 } // namespace Cadenza

@@ -10,5 +10,7 @@ Q_LOGGING_CATEGORY(lcLocalization, "cadenza.localization", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcNotifications, "cadenza.notifications", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcPorts, "cadenza.ports", QtInfoMsg)
 Q_LOGGING_CATEGORY(lcInstallation, "cadenza.installation", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcTimers, "cadenza.timers", QtInfoMsg)
+Q_LOGGING_CATEGORY(lcAssertions, "cadenza.assertions", QtInfoMsg)
 
 } // namespace Cadenza::Platform

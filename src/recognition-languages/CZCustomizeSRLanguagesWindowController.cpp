@@ -57,7 +57,8 @@ CZCustomizeSRLanguagesWindowController::CZCustomizeSRLanguagesWindowController(Q
     d->setUpForm({ui.selectionTableView, ui.okButton, ui.cancelButton, ui.searchField,
                      ui.selectedDownloadSizeTextField, ui.noResultsFoundTextField, ui.explanationLabel},
         {QStringLiteral("SRLanguageCustomizationTitle"), QStringLiteral("SRLanguageCustomizationExplanation"),
-            QStringLiteral("SRLanguageCustomizationTable")},
+            QStringLiteral("SRLanguageCustomizationTable"),
+            QStringLiteral("DeleteDisabledLanguageAlertTitleText")},
         d->languageModel, CZSRLanguageTableCellView().sizeHint().height());
 }
 
@@ -291,34 +292,34 @@ void CZCustomizeSRLanguagesWindowControllerPrivate::_updateButtonStatesOnlyIfDow
     showSelectedDownloadSize(supportDownloads ? total : 0);
 }
 
-void CZCustomizeSRLanguagesWindowControllerPrivate::_updateRowDownloadStatus()
+QVariantList CZCustomizeSRLanguagesWindowControllerPrivate::activeInstallations() const
 {
-    Q_Q(CZCustomizeSRLanguagesWindowController);
-    const QVariantList records = manager().activeInstallations();
-    QMutexLocker locker(&lock);
-    for (const QVariant &entry : records) {
-        const QVariantMap record = entry.toMap();
-        const QString objectIdentifier = record.value(Protocol::ObjectIDKey).toString();
-        for (int row = 0; row < currentlyDisplayedRows.size(); ++row) {
-            const CZSRLanguageRowPtr &displayed = currentlyDisplayedRows.at(row);
-            const CZSRLanguageItemPtr item = displayed->srLanguageItem();
-            if (!item || !CZSpeechItem::isSameLocaleIdentifier(item->localeIdentifier(), objectIdentifier)) {
-                continue;
-            }
-            item->setDownloadStatus(record.value(Protocol::ItemDownloadStatusKey).toLongLong());
-            item->setDownloadPercentComplete(record.value(Protocol::ItemPercentCompleteKey).toDouble());
-            if (CZSRLanguageTableCellView *view = q->existingViewForRow(row)) {
-                _setRowStatusFieldView(view->downloadMessageTextField(), view->downloadVariantPopUpButton(),
-                    item, displayed->isSelected());
-            }
-            break;
-        }
-    }
+    return manager().activeInstallations();
 }
 
-QString CZCustomizeSRLanguagesWindowControllerPrivate::removalAlertTitle() const
+int CZCustomizeSRLanguagesWindowControllerPrivate::rowOfInstallationRecord(const QVariantMap &record)
 {
-    return texts().text(QStringLiteral("DeleteDisabledLanguageAlertTitleText"));
+    const QString objectIdentifier = record.value(Protocol::ObjectIDKey).toString();
+    for (int row = 0; row < currentlyDisplayedRows.size(); ++row) {
+        const CZSRLanguageItemPtr item = currentlyDisplayedRows.at(row)->srLanguageItem();
+        if (item && CZSpeechItem::isSameLocaleIdentifier(item->localeIdentifier(), objectIdentifier)) {
+            return row;
+        }
+    }
+    return -1;
+}
+
+void CZCustomizeSRLanguagesWindowControllerPrivate::showInstallationRecord(int row, const QVariantMap &record)
+{
+    Q_Q(CZCustomizeSRLanguagesWindowController);
+    const CZSRLanguageRowPtr &displayed = currentlyDisplayedRows.at(row);
+    const CZSRLanguageItemPtr item = displayed->srLanguageItem();
+    item->setDownloadStatus(record.value(Protocol::ItemDownloadStatusKey).toLongLong());
+    item->setDownloadPercentComplete(record.value(Protocol::ItemPercentCompleteKey).toDouble());
+    if (CZSRLanguageTableCellView *view = q->existingViewForRow(row)) {
+        _setRowStatusFieldView(view->downloadMessageTextField(), view->downloadVariantPopUpButton(), item,
+            displayed->isSelected());
+    }
 }
 
 CustomizeSheetControllerPrivate::Decision CZCustomizeSRLanguagesWindowControllerPrivate::decide()

@@ -24,7 +24,6 @@ public:
     void _updateButtonStatesOnlyIfDownloadRequired(bool onlyIfDownloadRequired);
     void _propagateCheckboxSelection(CZSRLanguageRowCheckboxButton *sender);
     void _propagateDownloadVariantSelection(QComboBox *sender, int index);
-    void _updateRowDownloadStatus();
     void _setRowStatusFieldView(QLabel *statusField, QComboBox *variantPopUpButton,
         const CZSRLanguageItemPtr &speechItem, bool isSelected);
     [[nodiscard]] int displayedRowOfLocale(const QString &localeIdentifier) const;
@@ -41,10 +40,11 @@ public:
     {
         _updateDisplayUsingFilterString(filter);
     }
-    void updateRowDownloadStatus() override { _updateRowDownloadStatus(); }
+    [[nodiscard]] QVariantList activeInstallations() const override;
+    [[nodiscard]] int rowOfInstallationRecord(const QVariantMap &record) override;
+    void showInstallationRecord(int row, const QVariantMap &record) override;
     void selectionDidChange() override { _updateButtonStatesOnlyIfDownloadRequired(false); }
     [[nodiscard]] Decision decide() override;
-    [[nodiscard]] QString removalAlertTitle() const override;
     void didPresent() override { _updateButtonStatesOnlyIfDownloadRequired(true); }
 
     SRLanguageSelectionModel *languageModel = nullptr;

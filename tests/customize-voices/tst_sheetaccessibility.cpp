@@ -203,7 +203,8 @@ private Q_SLOTS:
         QCOMPARE(QApplication::focusWidget(), table);
         // No control inside a row is a tab stop of its own.
         for (QWidget *inside : table->viewport()->findChildren<QWidget *>()) {
-            QVERIFY2(!(inside->focusPolicy() & Qt::TabFocus), qPrintable(inside->objectName()));
+            QVERIFY2(!(inside->focusPolicy() & Qt::TabFocus),
+                qPrintable(inside->objectName() + QLatin1Char(' ') + QLatin1String(inside->metaObject()->className())));
         }
     }
 
