@@ -204,7 +204,8 @@ private Q_SLOTS:
         // No control inside a row is a tab stop of its own.
         for (QWidget *inside : table->viewport()->findChildren<QWidget *>()) {
             QVERIFY2(!(inside->focusPolicy() & Qt::TabFocus),
-                qPrintable(inside->objectName() + QLatin1Char(' ') + QLatin1String(inside->metaObject()->className())));
+                qPrintable(inside->objectName() + QLatin1Char(' ')
+                    + QLatin1String(inside->metaObject()->className())));
         }
     }
 
