@@ -4,9 +4,9 @@
 #include "BenchTable.h"
 #include "BenchWorld.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "installation/InstallerProtocol.h"
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QCoreApplication>
 #include <QCryptographicHash>

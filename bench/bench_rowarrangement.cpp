@@ -3,12 +3,12 @@
 
 #include "BenchTable.h"
 
-#include "customize-voices/VoiceTableRow.h"
-#include "platform/FakeSpeechSynthesisService.h"
-#include "platform/FakeUserLocaleService.h"
-#include "platform/InProcessNotificationCenter.h"
-#include "platform/MemoryPreferencesStore.h"
-#include "platform/Services.h"
+#include "core/rows/VoiceTableRow.h"
+#include "core/services/FakeSpeechSynthesisService.h"
+#include "core/services/FakeUserLocaleService.h"
+#include "core/services/InProcessNotificationCenter.h"
+#include "core/services/MemoryPreferencesStore.h"
+#include "core/services/Services.h"
 
 #include <QCollator>
 #include <QCoreApplication>

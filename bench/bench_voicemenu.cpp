@@ -7,16 +7,16 @@
 
 #include "BenchTable.h"
 
-#include "customize-voices/CustomizeVoicesWindowController.h"
-#include "platform/FakeMessagePortService.h"
-#include "platform/FakeSpeechSynthesisService.h"
-#include "platform/FakeUserLocaleService.h"
-#include "platform/InProcessNotificationCenter.h"
-#include "platform/MemoryPreferencesStore.h"
-#include "platform/Services.h"
-#include "voice-popup/CZVoicePopUpButton.h"
-#include "voice-popup/CZVoicePopUpButton_p.h"
-#include "voices/CZVoiceObject.h"
+#include "core/services/FakeMessagePortService.h"
+#include "core/services/FakeSpeechSynthesisService.h"
+#include "core/services/FakeUserLocaleService.h"
+#include "core/services/InProcessNotificationCenter.h"
+#include "core/services/MemoryPreferencesStore.h"
+#include "core/services/Services.h"
+#include "core/voices/CZVoiceObject.h"
+#include "widgets/customize-voices/CustomizeVoicesWindowController.h"
+#include "widgets/voice-popup/CZVoicePopUpButton.h"
+#include "widgets/voice-popup/CZVoicePopUpButton_p.h"
 
 #include <QApplication>
 #include <QCollator>

@@ -4,8 +4,8 @@
 #include "AudioSender.h"
 #include "sd_cadenza_logging.h"
 
-#include "platform/WaveFile.h"
-#include "voices/SpeechSynthesizer.h"
+#include "core/formats/WaveFile.h"
+#include "core/voices/SpeechSynthesizer.h"
 
 #include <QDir>
 #include <QFile>

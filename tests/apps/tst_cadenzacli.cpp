@@ -1,12 +1,12 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
-#include "installation/InstallerProtocol.h"
-#include "platform/FilePreferencesStore.h"
-#include "platform/Paths.h"
-#include "platform/PropertyList.h"
-#include "platform/SpeechNames.h"
-#include "platform/WaveFile.h"
+#include "core/SpeechNames.h"
+#include "core/files/Paths.h"
+#include "core/formats/PropertyList.h"
+#include "core/formats/WaveFile.h"
+#include "core/services/FilePreferencesStore.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QDir>
 #include <QFile>

@@ -4,8 +4,8 @@
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "platform/Paths.h"
+#include "core/files/Paths.h"
+#include "core/installation/CZSpeechInstallationManager.h"
 
 #include <QDir>
 #include <QElapsedTimer>

@@ -22,7 +22,7 @@ check_staged() { # ROOT PREFIX: files were installed into ROOT and will run from
     echo "$outside" >&2
     exit 1
   fi
-  for f in lib/cmake/Cadenza/CadenzaConfig.cmake include/cadenza/voice-popup/CZVoicePopUpButton.h \
+  for f in lib/cmake/Cadenza/CadenzaConfig.cmake include/cadenza/widgets/voice-popup/CZVoicePopUpButton.h \
            include/cadenza/cadenza_export.h bin/quillond bin/cadenza bin/cadenza-settings \
            lib/systemd/user/quillond.service lib/systemd/user/quillond.socket \
            share/applications/org.cadenza.Settings.desktop share/metainfo/org.cadenza.Settings.metainfo.xml \
@@ -123,7 +123,7 @@ add_executable(helper-path main.cpp)
 target_link_libraries(helper-path PRIVATE Cadenza::Core)
 CMAKE
 cat >"$work/helper-path/main.cpp" <<'CPP'
-#include <platform/AdministratorService.h>
+#include <core/services/AdministratorService.h>
 #include <cstdio>
 int main() { std::puts(qPrintable(Cadenza::Platform::PolkitAdministratorService::helperPath())); }
 CPP
