@@ -1,14 +1,13 @@
 #include "Download.h"
 
+#include "quillond_logging.h"
+
 #include <QFutureWatcher>
-#include <QLoggingCategory>
 #include <QNetworkAccessManager>
 #include <QNetworkReply>
 #include <QNetworkRequest>
 #include <QThread>
 #include <QtConcurrent/QtConcurrentRun>
-
-Q_LOGGING_CATEGORY(lcDownload, "quillond.download", QtInfoMsg)
 
 namespace Quillond {
 

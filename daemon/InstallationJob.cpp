@@ -5,12 +5,12 @@
 
 #include "protocol/InstallerProtocol.h"
 #include "protocol/KeyedArchive.h"
+#include "quillond_logging.h"
 
 #include <QCryptographicHash>
 #include <QDateTime>
 #include <QDir>
 #include <QFile>
-#include <QLoggingCategory>
 #include <QStorageInfo>
 #include <QTemporaryDir>
 #include <QtConcurrent/QtConcurrentRun>
@@ -22,8 +22,6 @@
 #include <linux/fs.h>
 #include <sys/syscall.h>
 #include <unistd.h>
-
-Q_LOGGING_CATEGORY(lcJob, "quillond.installation", QtInfoMsg)
 
 namespace {
 // Fault tests set QUILLOND_STALL_BEFORE to "verifying", "unpacking" or "renaming" to hold every job at

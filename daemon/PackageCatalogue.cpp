@@ -1,11 +1,9 @@
 #include "PackageCatalogue.h"
 
 #include "core/formats/PropertyList.h"
+#include "quillond_logging.h"
 
-#include <QLoggingCategory>
 #include <QRegularExpression>
-
-Q_LOGGING_CATEGORY(lcCatalogue, "quillond.catalogue", QtInfoMsg)
 
 namespace Quillond {
 

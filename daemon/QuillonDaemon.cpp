@@ -10,11 +10,9 @@
 #include "protocol/InstallerProtocol.h"
 #include "protocol/KeyedArchive.h"
 #include "protocol/SecureArchiving.h"
+#include "quillond_logging.h"
 
 #include <QDir>
-#include <QLoggingCategory>
-
-Q_LOGGING_CATEGORY(lcDaemon, "quillond", QtInfoMsg)
 
 namespace Quillond {
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "DictationService.h"
 
+#include "cadenza_dictation_logging.h"
 #include "core/dictation/Transcriber.h"
 #include "core/files/Paths.h"
 #include "core/formats/AudioFileReader.h"
@@ -101,7 +102,7 @@ DictationService::DictationService(int idleExitSeconds, QObject *parent)
             touch(); // still loading or transcribing
             return;
         }
-        qInfo("cadenza-dictation: idle for %d s, quitting", m_idleExitSeconds);
+        qCInfo(lcDictationService, "cadenza-dictation: idle for %d s, quitting", m_idleExitSeconds);
         QCoreApplication::quit();
     });
     touch();
@@ -182,7 +183,7 @@ void DictationService::preHeatInBackground(const QString &locale, bool reload)
         QString canonical;
         QString error;
         if (!models->get(locale, reload, &canonical, &error)) {
-            qWarning("cadenza-dictation: %s", qPrintable(error));
+            qCWarning(lcDictationService, "cadenza-dictation: %s", qPrintable(error));
             return;
         }
         QMetaObject::invokeMethod(this, [this, canonical] { post(PreHeatNotification, canonical); });

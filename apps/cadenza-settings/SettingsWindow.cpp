@@ -1,7 +1,9 @@
 #include "SettingsWindow.h"
 
 #include "TryDictationArea.h"
+#include "cadenza_settings_logging.h"
 
+#include "core/SpeechNames.h"
 #include "core/locale/LocalizationTable.h"
 #include "core/recognition-items/CZSRLanguageItem.h"
 #include "core/services/DistributedNotificationCenter.h"
@@ -33,6 +35,9 @@ QString text(const char *key)
 {
     return Platform::LocalizationTable::shared().text(QLatin1String(key));
 }
+
+// The entries of the "offer" list, in the order they are added.
+enum LocaleList { InstalledRecognizers, NetworkService, OfflineOnly };
 } // namespace
 
 SettingsWindow::SettingsWindow(QWidget *parent)
@@ -148,12 +153,13 @@ void SettingsWindow::rebuildLanguages()
     const QStringList offline {QStringLiteral("en_US"), QStringLiteral("de_DE")};
     const QString chosen = m_languagePopUp->previouslyChosenLocaleIdentifier();
     switch (m_localeLists->currentIndex()) {
-    case 1:
+    case NetworkService:
         m_languagePopUp->buildPopUpButtonAndSelectLocaleIdentifier(chosen, network, offline);
         break;
-    case 2:
+    case OfflineOnly:
         m_languagePopUp->buildPopUpButtonAndSelectLocaleIdentifier(chosen, std::nullopt, offline);
         break;
+    case InstalledRecognizers:
     default:
         m_languagePopUp->buildPopUpButtonAndSelectLocaleIdentifier(chosen, std::nullopt, std::nullopt);
         break;
@@ -168,20 +174,19 @@ void SettingsWindow::systemVoiceChosen()
         return;
     }
     // The voice is stored by its creator and number, as the speech service reads it.
-    const QString domain = QStringLiteral("com.vendra.speech.voice.prefs");
+    const QString &domain = SpeechNames::VoicePreferencesDomain;
     Platform::PreferencesStore &preferences = Platform::Services::preferences();
     preferences.setValue(
-        QStringLiteral("SelectedVoiceCreator"), attributes->value(QStringLiteral("VoiceCreator")), domain);
+        SpeechNames::SelectedVoiceCreatorKey, attributes->value(QStringLiteral("VoiceCreator")), domain);
     preferences.setValue(
-        QStringLiteral("SelectedVoiceID"), attributes->value(QStringLiteral("VoiceID")), domain);
+        SpeechNames::SelectedVoiceIDKey, attributes->value(QStringLiteral("VoiceID")), domain);
     preferences.setValue(
-        QStringLiteral("SelectedVoiceName"), attributes->value(QStringLiteral("VoiceName")), domain);
+        SpeechNames::SelectedVoiceNameKey, attributes->value(QStringLiteral("VoiceName")), domain);
     if (!preferences.synchronize(domain)) {
-        qWarning("cadenza-settings: the system voice could not be saved");
+        qCWarning(lcSettings, "cadenza-settings: the system voice could not be saved");
         return;
     }
-    Platform::Services::notifications().postNotification(
-        QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"));
+    Platform::Services::notifications().postNotification(SpeechNames::DefaultVoiceChangedNotification);
 }
 
 void SettingsWindow::openVoiceSettingsWindow()

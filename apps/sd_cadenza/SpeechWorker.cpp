@@ -2,6 +2,7 @@
 #include "SpeechWorker.h"
 
 #include "AudioSender.h"
+#include "sd_cadenza_logging.h"
 
 #include "core/engines/SpeechEngines.h"
 #include "core/services/Services.h"
@@ -213,7 +214,7 @@ QByteArray SpeechWorker::speak(const SpeechJob &job)
     const auto fail = [&](const QString &error) {
         // A voice removed while speaking ends up here: the message ends, the next one chooses its
         // voice again.
-        qWarning("sd_cadenza: cannot speak: %s", qPrintable(error));
+        qCWarning(lcModule, "sd_cadenza: cannot speak: %s", qPrintable(error));
         ending = "703 STOP\n";
         m_interrupt = Interrupt::Stop;
     };

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "VoiceLister.h"
 
+#include "core/SpeechNames.h"
 #include "core/formats/Locale.h"
 #include "core/formats/VoiceDescription.h"
 #include "core/services/PreferencesStore.h"
@@ -57,13 +58,15 @@ QString qualitySuffix(const QString &identifier)
 bool hasSelectedVoice(SpeechSynthesisService &service)
 {
     PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(SpeechSynthesisService::PreferencesDomain);
+    (void)preferences.synchronize(Cadenza::SpeechNames::VoicePreferencesDomain);
     bool creatorOk = false;
-    const int creator
-        = preferences.value(QStringLiteral("SelectedVoiceCreator"), SpeechSynthesisService::PreferencesDomain)
-              .toInt(&creatorOk);
+    const int creator = preferences
+                            .value(Cadenza::SpeechNames::SelectedVoiceCreatorKey,
+                                Cadenza::SpeechNames::VoicePreferencesDomain)
+                            .toInt(&creatorOk);
     const int id
-        = preferences.value(QStringLiteral("SelectedVoiceID"), SpeechSynthesisService::PreferencesDomain)
+        = preferences
+              .value(Cadenza::SpeechNames::SelectedVoiceIDKey, Cadenza::SpeechNames::VoicePreferencesDomain)
               .toInt();
     return creatorOk && !service.voiceIdentifierForSpec(creator, id).isEmpty();
 }

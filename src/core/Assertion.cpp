@@ -1,5 +1,7 @@
 #include "Assertion.h"
 
+#include "cadenzacore_logging.h"
+
 #include <QLoggingCategory>
 
 namespace Cadenza::Platform {
@@ -23,7 +25,7 @@ AssertionFailure::AssertionFailure(
 void raiseAssertion(const QString &function, const QString &file, int line, const QString &message)
 {
     AssertionFailure failure(function, file, line, message);
-    qCritical("%s", failure.what());
+    qCCritical(lcAssertions, "%s", failure.what());
     throw failure;
 }
 

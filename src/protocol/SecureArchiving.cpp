@@ -1,8 +1,7 @@
 #include "SecureArchiving.h"
 
+#include "cadenzaprotocol_logging.h"
 #include "protocol/KeyedArchive.h"
-
-#include <QLoggingCategory>
 
 #include <QCborStreamReader>
 
@@ -11,9 +10,6 @@ namespace Cadenza {
 using Platform::ArchiveClass;
 using Platform::ArchiveClasses;
 using Platform::KeyedArchive;
-
-// Archives come from another process: what is left out is logged under the protocol's own category.
-Q_LOGGING_CATEGORY(lcArchiving, "cadenza.protocol", QtInfoMsg)
 
 QByteArray CZEncodeSecureObject(const QVariant &object)
 {

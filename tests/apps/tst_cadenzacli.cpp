@@ -1,10 +1,12 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/formats/WaveFile.h"
 #include "core/services/FilePreferencesStore.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QDir>
 #include <QFile>
@@ -275,16 +277,19 @@ private Q_SLOTS:
             const QString identifier = value.toObject().value(QStringLiteral("identifier")).toString();
             status.insert(identifier, value.toObject().value(QStringLiteral("status")).toInt());
         }
-        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.Orin")), 1);
-        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.tobias.compact")), 2);
-        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.compact")), 2);
+        QCOMPARE(status.value(Cadenza::SpeechNames::OrinIdentifier),
+            int(Cadenza::InstallerProtocol::UpgradeAvailableStatus));
+        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.tobias.compact")),
+            int(Cadenza::InstallerProtocol::NotInstalledStatus));
+        QCOMPARE(status.value(QStringLiteral("com.vendra.speech.synthesis.voice.ingrid.compact")),
+            int(Cadenza::InstallerProtocol::NotInstalledStatus));
         // Tobias's premium quality is the full size of his compact entry, not a voice of its own; the
         // voices of other languages have no premium quality at all.
         QVERIFY(!status.contains(QStringLiteral("com.vendra.speech.synthesis.voice.tobias.premium")));
         for (auto it = status.cbegin(); it != status.cend(); ++it) {
             QVERIFY2(!it.key().endsWith(QStringLiteral(".premium")), qPrintable(it.key()));
         }
-        QCOMPARE(status.value(QStringLiteral("en_US")), 2);
+        QCOMPARE(status.value(QStringLiteral("en_US")), int(Cadenza::InstallerProtocol::NotInstalledStatus));
         QVERIFY(
             !status.contains(QStringLiteral("com.vendra.speech.synthesis.voice.maren.premium"))); // installed
 
@@ -302,7 +307,7 @@ private Q_SLOTS:
         Cadenza::Platform::FilePreferencesStore preferences;
         const QVariantMap log = preferences
                                     .value(QStringLiteral("SpeechDataInstallationLog"),
-                                        QStringLiteral("com.vendra.speech.voice.prefs"))
+                                        Cadenza::SpeechNames::VoicePreferencesDomain)
                                     .toMap();
         QVERIFY(log.value(QStringLiteral("VOICEID:com.vendra.speech.synthesis.voice.tobias.premium"))
                     .toMap()

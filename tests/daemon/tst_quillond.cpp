@@ -1,12 +1,12 @@
 #include "QuillondProcess.h"
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
-#include "core/formats/WaveFile.h"
-#include "core/services/BundleSpeechSynthesisService.h"
-
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
+#include "core/formats/WaveFile.h"
 #include "core/installation/CZSpeechInstallationManager.h"
+#include "core/services/BundleSpeechSynthesisService.h"
 #include "core/services/DistributedNotificationCenter.h"
 #include "core/services/Services.h"
 #include "core/services/UnixMessagePortService.h"
@@ -222,7 +222,7 @@ private Q_SLOTS:
         QVERIFY(server.listen());
         server.dropNextTransferAfter(1024 * 1024 + 17);
         startDaemon({QStringLiteral("--repository"), server.baseUrl().toString()});
-        const QString voice = QStringLiteral("com.vendra.speech.synthesis.voice.Orin");
+        const QString voice = Cadenza::SpeechNames::OrinIdentifier;
         QVERIFY(m_manager->_requestInstallation(
             QStringLiteral("VOICEID:") + voice, QStringLiteral("Orin"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion, 30000));

@@ -4,6 +4,7 @@
 #include "QuillondProcess.h"
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/services/BundleSpeechSynthesisService.h"
 #include "core/services/FilePreferencesStore.h"
@@ -171,7 +172,7 @@ private Q_SLOTS:
             TestEnvironment::voiceAttributes(Good, QStringLiteral("Good Compact"), QStringLiteral("en_US")));
         const QString folder = Paths::configFolder();
         FilePreferencesStore store(folder);
-        const QString domain = QStringLiteral("com.vendra.speech.voice.prefs");
+        const QString domain = Cadenza::SpeechNames::VoicePreferencesDomain;
         writeFile(store.filePath(domain),
             plist("<dict><key>VisibleIdentifiers</key><string>everything</string>"
                   "<key>SelectedVoiceCreator</key><string>abc</string><key>SelectedVoiceID</key><array/>"

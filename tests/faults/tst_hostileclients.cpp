@@ -5,6 +5,7 @@
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
 
+#include "core/SpeechNames.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/services/UnixMessagePortService.h"
 #include "protocol/InstallerProtocol.h"
@@ -97,8 +98,9 @@ private Q_SLOTS:
         QTRY_COMPARE(noisy->state(), QLocalSocket::UnconnectedState);
         QTRY_COMPARE(huge->state(), QLocalSocket::UnconnectedState);
         // And the daemon still takes work.
-        QVERIFY(manager._requestInstallation(QStringLiteral("VOICEID:com.vendra.speech.synthesis.voice.Orin"),
-            QStringLiteral("Orin"), 709, QStringLiteral("com.vendra.speech.synthesis.voice.Orin"), 0));
+        QVERIFY(manager._requestInstallation(
+            InstallerProtocol::VoiceTagPrefix + Cadenza::SpeechNames::OrinIdentifier, QStringLiteral("Orin"),
+            709, Cadenza::SpeechNames::OrinIdentifier, 0));
         QTRY_COMPARE(manager.activeInstallations().size(), 2);
     }
 };

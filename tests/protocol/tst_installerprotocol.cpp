@@ -85,7 +85,7 @@ private Q_SLOTS:
             = CZDecodeSecureDictionary(daemon.messages().at(1).second).value_or(QVariantMap());
         QCOMPARE(daemon.messages().at(0).first, qint32(StartInstallingMessage));
         QCOMPARE(first.size(), 8);
-        QCOMPARE(first.value(ItemDownloadStatusKey).toLongLong(), 4);
+        QCOMPARE(first.value(ItemDownloadStatusKey).toLongLong(), qint64(WaitingStatus));
         QCOMPARE(first.value(ItemByteSizeKey).toULongLong(), 1234u);
         QCOMPARE(first.value(ClientProcessIDKey).toLongLong(), QCoreApplication::applicationPid());
         static const QRegularExpression name(QStringLiteral("^com\\.vendra\\.speech\\.quillond-(\\d+)$"));
@@ -152,7 +152,7 @@ private Q_SLOTS:
         daemon.setAnswer(CZEncodeSecureObject(record)); // a dictionary, not an array
         QVERIFY(m_manager->activeInstallations().isEmpty());
         daemon.setAnswer(std::nullopt);
-        QTest::ignoreMessage(QtWarningMsg, "client got NULL return data\n");
+        QTest::ignoreMessage(QtWarningMsg, "client got NULL return data");
         QVERIFY(m_manager->activeInstallations().isEmpty());
     }
 
@@ -202,9 +202,9 @@ private Q_SLOTS:
     {
         Testing::FakeInstallerDaemon daemon(*m_ports);
         m_ports->setSendStatus(Platform::MessagePortStatus::SendTimeout);
-        QTest::ignoreMessage(QtWarningMsg, "failed to send request 2: -1\n");
+        QTest::ignoreMessage(QtWarningMsg, "failed to send request 2: -1");
         m_manager->cancelAllInstallations();
-        QTest::ignoreMessage(QtWarningMsg, "failed to send request 3: -1\n");
+        QTest::ignoreMessage(QtWarningMsg, "failed to send request 3: -1");
         QVERIFY(m_manager->activeInstallations().isEmpty());
     }
 

@@ -9,6 +9,7 @@
 #include "SsmlText.h"
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/services/PreferencesStore.h"
@@ -589,8 +590,8 @@ private Q_SLOTS:
 
         // Nothing selected: the language's best voice for the speech language (en_US here).
         Services::preferences().setValue(SpeechSynthesisService::SpeechLanguageKey, QStringLiteral("en_US"),
-            SpeechSynthesisService::PreferencesDomain);
-        QVERIFY(Services::preferences().synchronize(SpeechSynthesisService::PreferencesDomain));
+            Cadenza::SpeechNames::VoicePreferencesDomain);
+        QVERIFY(Services::preferences().synchronize(Cadenza::SpeechNames::VoicePreferencesDomain));
         check(pitchOf("synthesis_voice=NULL\nlanguage=en\nvoice=female1\n"), false);
         // The voice type chooses among the voices of the language.
         check(pitchOf("voice=male1\n"), true);
@@ -598,10 +599,11 @@ private Q_SLOTS:
 
         // The user picks Bram: the module's default for English follows, without a restart.
         PreferencesStore &preferences = Services::preferences();
+        preferences.setValue(Cadenza::SpeechNames::SelectedVoiceCreatorKey, Creator,
+            Cadenza::SpeechNames::VoicePreferencesDomain);
         preferences.setValue(
-            QStringLiteral("SelectedVoiceCreator"), Creator, SpeechSynthesisService::PreferencesDomain);
-        preferences.setValue(QStringLiteral("SelectedVoiceID"), 2, SpeechSynthesisService::PreferencesDomain);
-        QVERIFY(preferences.synchronize(SpeechSynthesisService::PreferencesDomain));
+            Cadenza::SpeechNames::SelectedVoiceIDKey, 2, Cadenza::SpeechNames::VoicePreferencesDomain);
+        QVERIFY(preferences.synchronize(Cadenza::SpeechNames::VoicePreferencesDomain));
         check(pitchOf("language=en\nvoice=female1\n"), true);
         // A name that is no voice: the default again.
         check(pitchOf("synthesis_voice=Nobody\n"), true);

@@ -4,7 +4,7 @@
 #include "EnginePlugins_p.h"
 #include "RecognitionEngine.h"
 #include "cadenza-config.h"
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 
 namespace Cadenza::Platform {
 

@@ -3,7 +3,7 @@
 #include "protocol/InstallerProtocol.h"
 #include "protocol/SecureArchiving.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 #include "core/services/MessagePort.h"
 #include "core/services/Services.h"
 
@@ -117,11 +117,11 @@ std::optional<QByteArray> CZSpeechInstallationManager::_sendMessage(
     const auto result = _serverPortRef->sendRequest(messageId, data, SendTimeout, receiveTimeout, withReply);
     m_lastSendStatus = result.status;
     if (result.status != Platform::MessagePortStatus::Success) {
-        qCWarning(lcInstallation, "failed to send request %d: %d\n", int(messageId), result.status);
+        qCWarning(lcInstallation, "failed to send request %d: %d", int(messageId), result.status);
         return std::nullopt;
     }
     if (withReply && !result.reply) {
-        qCWarning(lcInstallation, "client got NULL return data\n");
+        qCWarning(lcInstallation, "client got NULL return data");
     }
     return result.reply;
 }

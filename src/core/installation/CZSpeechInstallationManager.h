@@ -64,11 +64,8 @@ public:
     explicit CZSpeechInstallationManager(QObject *parent = nullptr);
     ~CZSpeechInstallationManager() override;
 
-    /// Where the default voice lives, and the default voice's identifier.
-    static const QString DefaultVoiceIdentifier;
+    /// The key of the installation log in both preference domains (see SpeechNames).
     static const QString InstallationLogKey; ///< "SpeechDataInstallationLog"
-    static const QString VoicePreferencesDomain;
-    static const QString RecognitionPreferencesDomain;
 
     [[nodiscard]] std::shared_ptr<CZSpeechInstallationManagerDelegate> delegate() const;
     void setDelegate(std::shared_ptr<CZSpeechInstallationManagerDelegate> delegate);

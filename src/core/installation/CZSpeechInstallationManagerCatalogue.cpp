@@ -4,7 +4,8 @@
 
 #include "protocol/InstallerProtocol.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/formats/VoiceDescription.h"
@@ -27,13 +28,7 @@ namespace Cadenza {
 using namespace InstallerProtocol;
 using Platform::Services;
 
-const QString CZSpeechInstallationManager::DefaultVoiceIdentifier
-    = QStringLiteral("com.vendra.speech.synthesis.voice.Orin");
 const QString CZSpeechInstallationManager::InstallationLogKey = QStringLiteral("SpeechDataInstallationLog");
-const QString CZSpeechInstallationManager::VoicePreferencesDomain
-    = QStringLiteral("com.vendra.speech.voice.prefs");
-const QString CZSpeechInstallationManager::RecognitionPreferencesDomain
-    = QStringLiteral("com.vendra.speech.recognition.VendraSpeechRecognition.prefs");
 
 namespace {
 
@@ -91,8 +86,8 @@ QVariantMap catalogueSection(const QString &key)
 
 QString domainForTag(const QString &tag)
 {
-    return tag.startsWith(VoiceTagPrefix) ? CZSpeechInstallationManager::VoicePreferencesDomain
-                                          : CZSpeechInstallationManager::RecognitionPreferencesDomain;
+    return tag.startsWith(VoiceTagPrefix) ? SpeechNames::VoicePreferencesDomain
+                                          : SpeechNames::RecognitionPreferencesDomain;
 }
 
 } // namespace
@@ -160,7 +155,7 @@ QList<DownloadableVoicePtr> CZSpeechInstallationManager::downloadableVoices()
         const auto [found, match] = installationRecordForVoice(records, *voice);
         const bool hasRecord = match != RecordMatch::None;
         const QVariantMap *record = &found;
-        if (identifier != DefaultVoiceIdentifier) {
+        if (identifier != SpeechNames::OrinIdentifier) {
             // Installed, or installed at full size: nothing left to offer.
             if (installed.contains(identifier)
                 || (!voice->fullSizeBundleIdentifier().isEmpty()
@@ -249,7 +244,7 @@ DownloadableVoicePtr CZSpeechInstallationManager::downloadableVoiceUpgradeForVoi
     for (const auto &candidate : fromDownloadableVoices) {
         const QString candidateIdentifier = candidate->identifier();
         if (candidateIdentifier == identifier) {
-            if (identifier == DefaultVoiceIdentifier) {
+            if (identifier == SpeechNames::OrinIdentifier) {
                 return candidate;
             }
             continue;
@@ -275,8 +270,8 @@ namespace {
 bool gateBlocks(const QString &key)
 {
     Platform::PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(CZSpeechInstallationManager::RecognitionPreferencesDomain);
-    const QVariant value = preferences.value(key, CZSpeechInstallationManager::RecognitionPreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::RecognitionPreferencesDomain);
+    const QVariant value = preferences.value(key, SpeechNames::RecognitionPreferencesDomain);
     return SpeechItemPrivate::isNumber(value) && (value.toLongLong() & 0xFF) == 0;
 }
 } // namespace
@@ -394,7 +389,7 @@ std::optional<SpeechBundle> CZSpeechInstallationManager::bundleForRemovableVoice
         }
     }
     std::optional<SpeechBundle> bundle;
-    if (identifier == DefaultVoiceIdentifier) {
+    if (identifier == SpeechNames::OrinIdentifier) {
         const auto installed = Services::speechSynthesis().voice(identifier);
         if (!installed || installed->bundlePath.isEmpty()) {
             return std::nullopt;
@@ -466,7 +461,7 @@ QString CZSpeechInstallationManager::onDiskVersionForBundlePath(const QString &b
 
 std::optional<QVariantMap> CZSpeechInstallationManager::installationLogEntryForTag(const QString &tag)
 {
-    return installationLogEntryForTag(tag, RecognitionPreferencesDomain);
+    return installationLogEntryForTag(tag, SpeechNames::RecognitionPreferencesDomain);
 }
 
 std::optional<QVariantMap> CZSpeechInstallationManager::installationLogEntryForTag(

@@ -3,8 +3,7 @@
 
 #include "CZSpeechInstallationManager.h"
 
-#include "protocol/InstallerProtocol.h"
-
+#include "core/SpeechNames.h"
 #include "core/formats/VoiceDescription.h"
 #include "core/recognition-items/CZSRLanguageItem.h"
 #include "core/services/PowerSourcesInfo.h"
@@ -13,6 +12,7 @@
 #include "core/services/SpeechSynthesisService.h"
 #include "core/speech-items/CZSpeechItem_p.h"
 #include "core/voices/DownloadableVoice.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QDateTime>
 
@@ -61,13 +61,13 @@ void CZSpeechInstallationManager::markDownloadableVoiceObject(
         return;
     }
     Platform::PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(VoicePreferencesDomain);
-    QVariantMap log = preferences.value(InstallationLogKey, VoicePreferencesDomain).toMap();
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
+    QVariantMap log = preferences.value(InstallationLogKey, SpeechNames::VoicePreferencesDomain).toMap();
     QVariantMap entry = log.value(tag).toMap();
     entry.insert(QStringLiteral("AutoAttemptProhibited"), withAutoDownloadProhibitFlag);
     log.insert(tag, entry);
-    preferences.setValue(InstallationLogKey, log, VoicePreferencesDomain);
-    (void)preferences.synchronize(VoicePreferencesDomain);
+    preferences.setValue(InstallationLogKey, log, SpeechNames::VoicePreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
 }
 
 bool CZSpeechInstallationManager::isAutoDownloadProhibitedForDownloadableVoiceObject(
@@ -76,7 +76,7 @@ bool CZSpeechInstallationManager::isAutoDownloadProhibitedForDownloadableVoiceOb
     if (voice.tagName().isEmpty()) {
         return false;
     }
-    const auto entry = installationLogEntryForTag(voice.tagName(), VoicePreferencesDomain);
+    const auto entry = installationLogEntryForTag(voice.tagName(), SpeechNames::VoicePreferencesDomain);
     if (!entry) {
         return false;
     }
@@ -146,7 +146,7 @@ bool CZSpeechInstallationManager::startDownloadingHighestQualityIfNecessaryForVo
     }
     const QString tag = upgrade->fullSizeBundleIdentifier() == voiceIdentifier ? upgrade->fullSizeTagName()
                                                                                : upgrade->tagName();
-    if (const auto entry = installationLogEntryForTag(tag, VoicePreferencesDomain)) {
+    if (const auto entry = installationLogEntryForTag(tag, SpeechNames::VoicePreferencesDomain)) {
         if (entry->contains(QStringLiteral("RemovalDate"))) {
             return false; // the user removed it
         }

@@ -1,8 +1,8 @@
 #include "LocaleDisplayName.h"
 #include "LocaleDisplayName_p.h"
 
+#include "cadenzacore_logging.h"
 #include "core/Assertion.h"
-#include "core/Logging.h"
 #include "core/locale/LocalizationTable.h"
 
 #include <QHash>

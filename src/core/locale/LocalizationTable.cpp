@@ -1,6 +1,6 @@
 #include "LocalizationTable.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 #include "core/formats/Locale.h"
 #include "core/services/Services.h"
 #include "core/services/UserLocaleService.h"

@@ -1,5 +1,6 @@
 #include "CZSRLanguageItem.h"
 
+#include "core/SpeechNames.h"
 #include "core/services/DistributedNotificationCenter.h"
 #include "core/services/PreferencesStore.h"
 #include "core/services/RecognitionService.h"
@@ -10,11 +11,7 @@ namespace Cadenza {
 
 using Platform::Services;
 
-const QString CZSRLanguageItem::PreferencesDomain
-    = QStringLiteral("com.vendra.speech.recognition.VendraSpeechRecognition.prefs");
 const QString CZSRLanguageItem::VisibleLocalesKey = QStringLiteral("VisibleSRLocaleIdentifiers");
-const QString CZSRLanguageItem::DefaultLanguageChangedNotification
-    = QStringLiteral("com.vendra.speech.DefaultSRLanguageChangedNotification");
 
 namespace {
 // Looking up a tag builds the downloadable items, which look up their own tags when the catalogue
@@ -154,8 +151,8 @@ QString CZSRLanguageItem::preferredDictationLocaleIdentifierFromAvaiableLocaleId
 std::optional<QVariantMap> CZSRLanguageItem::visibleSRLanguageItemsTable()
 {
     Platform::PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(PreferencesDomain);
-    const QVariant table = preferences.value(VisibleLocalesKey, PreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::RecognitionPreferencesDomain);
+    const QVariant table = preferences.value(VisibleLocalesKey, SpeechNames::RecognitionPreferencesDomain);
     if (table.typeId() != QMetaType::QVariantMap) {
         return std::nullopt;
     }
@@ -165,9 +162,9 @@ std::optional<QVariantMap> CZSRLanguageItem::visibleSRLanguageItemsTable()
 void CZSRLanguageItem::setVisibleSRLanguageItemsTable(const QVariantMap &table)
 {
     Platform::PreferencesStore &preferences = Services::preferences();
-    preferences.setValue(VisibleLocalesKey, table, PreferencesDomain);
-    (void)preferences.synchronize(PreferencesDomain);
-    Services::notifications().postNotification(DefaultLanguageChangedNotification);
+    preferences.setValue(VisibleLocalesKey, table, SpeechNames::RecognitionPreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::RecognitionPreferencesDomain);
+    Services::notifications().postNotification(SpeechNames::DefaultSRLanguageChangedNotification);
 }
 
 qint64 CZSRLanguageItem::visibiltyValueForLocaleIdentifier(const QString &localeIdentifier, bool *entryExists)

@@ -17,9 +17,8 @@ using CZSRLanguageItemPtr = std::shared_ptr<CZSRLanguageItem>;
 class CADENZACORE_EXPORT CZSRLanguageItem : public CZSpeechItem
 {
 public:
-    static const QString PreferencesDomain;
+    /// The key of the visibility table in SpeechNames::RecognitionPreferencesDomain.
     static const QString VisibleLocalesKey;
-    static const QString DefaultLanguageChangedNotification;
 
     [[nodiscard]] static CZSRLanguageItemPtr initWithLocaleIdentifier(const QString &localeIdentifier);
     /// nullptr when @p properties is not a dictionary.

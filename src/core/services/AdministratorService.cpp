@@ -1,7 +1,7 @@
 #include "AdministratorService.h"
 
 #include "BundleRemoval.h"
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 
 #include "cadenza-config.h"
 

@@ -2,7 +2,8 @@
 
 #include "PreferencesStore.h"
 #include "Services.h"
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
+#include "core/SpeechNames.h"
 #include "core/engines/SpeechEngine.h"
 #include "core/engines/SpeechEngines.h"
 #include "core/files/Paths.h"
@@ -302,7 +303,7 @@ quint64 BundleSpeechSynthesisService::voicesGeneration() const
 std::optional<QString> BundleSpeechSynthesisService::speechLanguageLocale()
 {
     // value() reads the domain again when its file changed.
-    const QVariant stored = Services::preferences().value(SpeechLanguageKey, PreferencesDomain);
+    const QVariant stored = Services::preferences().value(SpeechLanguageKey, SpeechNames::VoicePreferencesDomain);
     if (stored.typeId() != QMetaType::QString) {
         return std::nullopt;
     }

@@ -1,6 +1,6 @@
 #include "DBusNotificationCenter.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 #include "protocol/KeyedArchive.h"
 
 #include <QDBusMessage>

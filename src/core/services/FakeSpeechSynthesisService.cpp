@@ -1,6 +1,6 @@
 #include "FakeSpeechSynthesisService.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 #include "core/formats/WaveFile.h"
 
 #include <QTimer>

@@ -2,7 +2,7 @@
 
 #include "core/files/FileLock.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 #include "core/files/OutputFile.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"

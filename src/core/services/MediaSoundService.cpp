@@ -1,6 +1,6 @@
 #include "MediaSoundService.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 
 #include <QAudioDevice>
 #include <QAudioOutput>

@@ -1,6 +1,6 @@
 #include "RecognitionService.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 #include "core/engines/RecognitionEngines.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"

@@ -3,15 +3,13 @@
 #include "PreferencesStore.h"
 #include "Services.h"
 #include "UserLocaleService.h"
+#include "core/SpeechNames.h"
 #include "core/formats/Locale.h"
 
 #include <QHash>
 
 namespace Cadenza::Platform {
 
-const QString SpeechSynthesisService::FallbackVoiceIdentifier
-    = QStringLiteral("com.vendra.speech.synthesis.voice.Orin");
-const QString SpeechSynthesisService::PreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
 const QString SpeechSynthesisService::SpeechLanguageKey = QStringLiteral("SpeechLanguageLocale");
 
 namespace {
@@ -151,12 +149,12 @@ QString SpeechSynthesisService::defaultVoice()
 {
     const QStringList available = availableVoices();
     PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(PreferencesDomain);
-    const auto creator
-        = storedInteger(preferences.value(QStringLiteral("SelectedVoiceCreator"), PreferencesDomain));
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
+    const auto creator = storedInteger(
+        preferences.value(SpeechNames::SelectedVoiceCreatorKey, SpeechNames::VoicePreferencesDomain));
     if (creator) {
-        const auto id
-            = storedInteger(preferences.value(QStringLiteral("SelectedVoiceID"), PreferencesDomain));
+        const auto id = storedInteger(
+            preferences.value(SpeechNames::SelectedVoiceIDKey, SpeechNames::VoicePreferencesDomain));
         const QString selected = voiceIdentifierForSpec(*creator, id.value_or(0));
         if (!selected.isEmpty()) {
             const QString base = VoiceDescription::baseIdentifierOf(selected);
@@ -235,8 +233,8 @@ QString SpeechSynthesisService::preferredVoiceForLocale(
     if (!best.isEmpty()) {
         return best;
     }
-    if (identifiers.contains(FallbackVoiceIdentifier)) {
-        return FallbackVoiceIdentifier;
+    if (identifiers.contains(SpeechNames::OrinIdentifier)) {
+        return SpeechNames::OrinIdentifier;
     }
     return identifiers.first();
 }

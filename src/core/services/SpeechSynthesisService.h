@@ -38,10 +38,7 @@ class CADENZACORE_EXPORT SpeechSynthesisService : public QObject
 public:
     static inline const QString &DefaultVoiceGroup = VoiceGroup::Default;
     static inline const QString &CompactVoiceGroup = VoiceGroup::Compact;
-    /// The voice that stands in when nothing else fits.
-    static const QString FallbackVoiceIdentifier;
-    /// Preference domain and keys that hold the user's voice choice.
-    static const QString PreferencesDomain;
+    /// Preference key (in SpeechNames::VoicePreferencesDomain) of the speech language.
     static const QString SpeechLanguageKey;
 
     explicit SpeechSynthesisService(QObject *parent = nullptr);

@@ -1,6 +1,6 @@
 #include "UnixMessagePortService.h"
 
-#include "core/Logging.h"
+#include "cadenzacore_logging.h"
 #include "core/files/Paths.h"
 #include "protocol/MessageFrame.h"
 

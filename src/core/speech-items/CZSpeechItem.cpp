@@ -1,8 +1,8 @@
 #include "CZSpeechItem.h"
 #include "CZSpeechItem_p.h"
 
+#include "cadenzacore_logging.h"
 #include "core/Assertion.h"
-#include "core/Logging.h"
 #include "core/formats/PropertyList.h"
 #include "core/locale/LocaleDisplayName.h"
 #include "core/locale/LocalizationTable.h"
@@ -379,7 +379,7 @@ QString CZSpeechItem::languageDisplayString() const
     }
     // A row without a language name would be blank: stopping makes the broken data visible.
     const QStringList preferred = Platform::Services::userLocale().preferredLanguages();
-    qCritical("%s",
+    qCCritical(Platform::lcLocale, "%s",
         qPrintable(QStringLiteral("Language display name is nil for locale: %1, lang: %2, for curLocale: %3, "
                                   "autoCurLocale: %4, prefLangs: %5.")
                        .arg(localeIdentifier(), language, _conversionLocale().identifier(),

@@ -1,6 +1,7 @@
 #include "CZPowerSavvyTimer.h"
 
 #include "CZSystemBehaviorManager.h"
+#include "cadenzacore_logging.h"
 
 #include <QLoggingCategory>
 #include <QMetaObject>
@@ -53,7 +54,8 @@ void CZPowerSavvyTimer::_target_(Platform::RunLoopTimer *firing)
     if (_target) {
         if (!QMetaObject::invokeMethod(_target, _selector.constData(), Qt::DirectConnection,
                 Q_ARG(Cadenza::Platform::RunLoopTimer *, firing))) {
-            qWarning("CZPowerSavvyTimer: %s has no invokable %s(Cadenza::Platform::RunLoopTimer*)",
+            qCWarning(Platform::lcTimers,
+                "CZPowerSavvyTimer: %s has no invokable %s(Cadenza::Platform::RunLoopTimer*)",
                 _target->metaObject()->className(), _selector.constData());
         }
     }

@@ -1,6 +1,7 @@
 #include "CZVoiceObject.h"
 
 #include "core/Assertion.h"
+#include "core/SpeechNames.h"
 #include "core/formats/Locale.h"
 #include "core/formats/VoiceDescription.h"
 #include "core/locale/LocaleDisplayName.h"
@@ -23,10 +24,7 @@ using Platform::Locale;
 using Platform::Services;
 namespace VoiceAttribute = Platform::VoiceAttribute;
 
-const QString CZVoiceObject::PreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
 const QString CZVoiceObject::VisibleIdentifiersKey = QStringLiteral("VisibleIdentifiers");
-const QString CZVoiceObject::DefaultVoiceChangedNotification
-    = QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification");
 
 CZVoiceObject::~CZVoiceObject() = default;
 
@@ -286,8 +284,8 @@ bool CZVoiceObject::isSameLangaugeFromLocaleIdentifier(
 std::optional<QVariantMap> CZVoiceObject::visibleVoicesTable()
 {
     Platform::PreferencesStore &preferences = Services::preferences();
-    (void)preferences.synchronize(PreferencesDomain);
-    const QVariant table = preferences.value(VisibleIdentifiersKey, PreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
+    const QVariant table = preferences.value(VisibleIdentifiersKey, SpeechNames::VoicePreferencesDomain);
     if (table.typeId() != QMetaType::QVariantMap) {
         return std::nullopt;
     }
@@ -297,9 +295,9 @@ std::optional<QVariantMap> CZVoiceObject::visibleVoicesTable()
 void CZVoiceObject::setVisibleVoicesTable(const QVariantMap &table)
 {
     Platform::PreferencesStore &preferences = Services::preferences();
-    preferences.setValue(VisibleIdentifiersKey, table, PreferencesDomain);
-    (void)preferences.synchronize(PreferencesDomain);
-    Services::notifications().postNotification(DefaultVoiceChangedNotification);
+    preferences.setValue(VisibleIdentifiersKey, table, SpeechNames::VoicePreferencesDomain);
+    (void)preferences.synchronize(SpeechNames::VoicePreferencesDomain);
+    Services::notifications().postNotification(SpeechNames::DefaultVoiceChangedNotification);
 }
 
 QList<CZVoiceObjectPtr> CZVoiceObject::visibleVoicesForLocaleIdentifier(

@@ -19,17 +19,14 @@ using CZVoiceObjectPtr = std::shared_ptr<CZVoiceObject>;
  * One speech voice: a copy of its attributes from the speech synthesis service, the user's
  * visibility choice, and its download state.
  *
- * The class side keeps the locale rules, the visibility table "VisibleIdentifiers" of the domain
- * "com.vendra.speech.voice.prefs", and the filter behind every voice menu.
+ * The class side keeps the locale rules, the visibility table "VisibleIdentifiers" of the voice
+ * preference domain (SpeechNames::VoicePreferencesDomain), and the filter behind every voice menu.
  */
 class CADENZACORE_EXPORT CZVoiceObject
 {
 public:
-    /// The preference domain and key of the visibility table.
-    static const QString PreferencesDomain;
+    /// The key of the visibility table in SpeechNames::VoicePreferencesDomain.
     static const QString VisibleIdentifiersKey;
-    /// Posted when the visibility table or the default voice changed.
-    static const QString DefaultVoiceChangedNotification;
 
     virtual ~CZVoiceObject();
 

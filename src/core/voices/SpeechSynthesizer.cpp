@@ -1,5 +1,6 @@
 #include "SpeechSynthesizer.h"
 
+#include "core/SpeechNames.h"
 #include "core/services/PreferencesStore.h"
 #include "core/services/Services.h"
 #include "core/services/SpeechSynthesisService.h"
@@ -21,7 +22,6 @@ const QString kVoiceSettingsCustomRelativeRateKey = QStringLiteral("CustomRelati
 const QString kVoiceSettingsCustomVolumeKey = QStringLiteral("CustomVolume");
 
 namespace {
-const QString VoicePreferencesDomain = QStringLiteral("com.vendra.speech.voice.prefs");
 constexpr double FixedOne = 65536.0;
 
 qint64 nextChannelHandle()
@@ -240,9 +240,9 @@ QString SpeechSynthesizer::defaultVoiceFromAllVoices()
     // Every value() reads the domain again when its file changed, so no synchronize() first.
     Platform::PreferencesStore &preferences = Services::preferences();
     const QVariant creator
-        = preferences.value(QStringLiteral("SelectedVoiceCreator"), VoicePreferencesDomain);
+        = preferences.value(SpeechNames::SelectedVoiceCreatorKey, SpeechNames::VoicePreferencesDomain);
     const QVariant id = SpeechItemPrivate::isNumber(creator)
-        ? preferences.value(QStringLiteral("SelectedVoiceID"), VoicePreferencesDomain)
+        ? preferences.value(SpeechNames::SelectedVoiceIDKey, SpeechNames::VoicePreferencesDomain)
         : QVariant();
     SpeechSynthesisService &service = Services::speechSynthesis();
     const QString locale = service.speechLanguageLocale().value_or(QString());

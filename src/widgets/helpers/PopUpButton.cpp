@@ -1,10 +1,8 @@
 #include "PopUpButton.h"
 
 #include <QAbstractItemView>
-#include <QAccessible>
 #include <QCoreApplication>
 #include <QKeyEvent>
-#include <QLabel>
 #include <QWheelEvent>
 
 namespace Cadenza::Platform {
@@ -14,18 +12,6 @@ PopUpButton::PopUpButton(QWidget *parent)
 { }
 
 PopUpButton::~PopUpButton() = default;
-
-void PopUpButton::showStatusLine(QLabel *field, const QString &line)
-{
-    if (field && field->text() != line) {
-        field->setText(line);
-        QAccessibleEvent event(field, QAccessible::NameChanged);
-        QAccessible::updateAccessibility(&event);
-    }
-    if (accessibleDescription() != line) {
-        setAccessibleDescription(line); // tells assistive technology itself
-    }
-}
 
 void PopUpButton::keyPressEvent(QKeyEvent *event)
 {

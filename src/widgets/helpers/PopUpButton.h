@@ -5,8 +5,6 @@
 
 #include <QComboBox>
 
-class QLabel;
-
 namespace Cadenza::Platform {
 
 /**
@@ -24,13 +22,6 @@ public:
     ~PopUpButton() override;
 
 protected:
-    /**
-     * Shows @p line in the status @p field (null: none) and makes it this pop-up's description; when it
-     * changed, assistive technology is told, so a screen reader hears "Downloading Femke, 40 %" on the
-     * pop-up and on the field.
-     */
-    void showStatusLine(QLabel *field, const QString &line);
-
     void keyPressEvent(QKeyEvent *event) override;
     void wheelEvent(QWheelEvent *event) override;
 };

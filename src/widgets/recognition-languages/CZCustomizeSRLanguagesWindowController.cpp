@@ -1,15 +1,14 @@
 #include "CZCustomizeSRLanguagesWindowController.h"
 
+#include "CZCustomizeSRLanguagesWindowController_p.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/locale/LocalizationTable.h"
 #include "core/services/DistributedNotificationCenter.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem.h"
 #include "protocol/InstallerProtocol.h"
-#include "widgets/helpers/Alert.h"
 #include "widgets/helpers/RowView.h"
 #include "widgets/helpers/SizeVariants.h"
-#include "widgets/helpers/VisibleRowViews.h"
 #include "widgets/recognition-languages/CZSRLanguageRowCheckboxButton.h"
 #include "widgets/recognition-languages/CZSRLanguageRowTextView.h"
 #include "widgets/recognition-languages/CZSRLanguageTableCellView.h"
@@ -19,23 +18,16 @@
 
 #include <QComboBox>
 #include <QDialog>
-#include <QHeaderView>
 #include <QLabel>
 #include <QLineEdit>
-#include <QLocale>
 #include <QPushButton>
-#include <QStyle>
 #include <QTableView>
-#include <QTimer>
-#include <QToolButton>
-
-#include <cmath>
 
 namespace Cadenza {
 
 namespace {
+namespace Protocol = InstallerProtocol;
 const QString DoCancelListeningNotification = QStringLiteral("DictationIMObservationDoCancelListening");
-constexpr int StatusPollMilliseconds = 2000;
 
 const Platform::LocalizationTable &texts()
 {
@@ -48,145 +40,54 @@ CZSpeechInstallationManager &manager()
 }
 } // namespace
 
+CZCustomizeSRLanguagesWindowControllerPrivate::CZCustomizeSRLanguagesWindowControllerPrivate(
+    CZCustomizeSRLanguagesWindowController *q)
+    : CustomizeSheetControllerPrivate(q)
+{ }
+
+CZCustomizeSRLanguagesWindowControllerPrivate::~CZCustomizeSRLanguagesWindowControllerPrivate() = default;
+
 CZCustomizeSRLanguagesWindowController::CZCustomizeSRLanguagesWindowController(QObject *parent)
-    : QObject(parent)
-    , m_window(new QDialog)
-    , m_model(new SRLanguageSelectionModel(this))
+    : CustomizeSheetController(std::make_unique<CZCustomizeSRLanguagesWindowControllerPrivate>(this), parent)
 {
+    Q_D(CZCustomizeSRLanguagesWindowController);
     Ui::SRLanguageCustomization ui;
-    ui.setupUi(m_window);
-    m_selectionTableView = ui.selectionTableView;
-    m_okButton = ui.okButton;
-    m_cancelButton = ui.cancelButton;
-    m_searchField = ui.searchField;
-    m_selectedDownloadSizeTextField = ui.selectedDownloadSizeTextField;
-    m_noResultsFoundTextField = ui.noResultsFoundTextField;
-
-    m_window->setWindowTitle(texts().text(QStringLiteral("SRLanguageCustomizationTitle")));
-    ui.explanationLabel->setText(texts().text(QStringLiteral("SRLanguageCustomizationExplanation")));
-    m_searchField->setPlaceholderText(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
-    m_searchField->setAccessibleName(texts().text(QStringLiteral("VoiceCustomizationSearchPlaceholder")));
-    // The field's clear button is a control of its own.
-    for (QToolButton *clear : m_searchField->findChildren<QToolButton *>()) {
-        clear->setAccessibleName(texts().text(QStringLiteral("SearchClearButtonName")));
-    }
-    m_noResultsFoundTextField->setText(texts().text(QStringLiteral("VoiceCustomizationNoResults")));
-    m_okButton->setText(texts().text(QStringLiteral("OK")));
-    m_cancelButton->setText(texts().text(QStringLiteral("Cancel")));
-    m_selectionTableView->setAccessibleName(texts().text(QStringLiteral("SRLanguageCustomizationTable")));
-
-    m_model->setColumnTitle(m_selectionTableView->accessibleName());
-    m_selectionTableView->setModel(m_model);
-    m_selectionTableView->verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
-    m_selectionTableView->verticalHeader()->setDefaultSectionSize(
-        CZSRLanguageTableCellView().sizeHint().height());
-    m_rowViews = new Platform::VisibleRowViews(
-        m_selectionTableView,
-        [this](int row, QWidget *spare) -> QWidget * {
-            return viewForRow(row, qobject_cast<CZSRLanguageTableCellView *>(spare));
-        },
-        this);
-
-    connect(
-        m_okButton, &QPushButton::clicked, this, &CZCustomizeSRLanguagesWindowController::acceptSelection);
-    connect(m_cancelButton, &QPushButton::clicked, this,
-        &CZCustomizeSRLanguagesWindowController::cancelSelection);
-    connect(m_searchField, &QLineEdit::textChanged, this,
-        &CZCustomizeSRLanguagesWindowController::searchFieldChanged);
-    connect(m_selectionTableView->selectionModel(), &QItemSelectionModel::selectionChanged, this,
-        [this] { _updateButtonStatesOnlyIfDownloadRequired(false); });
-    connect(m_window, &QDialog::rejected, this, [this] {
-        if (m_downloadStatusUpdateTimer || m_installationObservation) {
-            cancelSelection();
-        }
-    });
+    ui.setupUi(d->window);
+    d->languageModel = new SRLanguageSelectionModel(this);
+    d->setUpForm({ui.selectionTableView, ui.okButton, ui.cancelButton, ui.searchField,
+                     ui.selectedDownloadSizeTextField, ui.noResultsFoundTextField, ui.explanationLabel},
+        {QStringLiteral("SRLanguageCustomizationTitle"), QStringLiteral("SRLanguageCustomizationExplanation"),
+            QStringLiteral("SRLanguageCustomizationTable"),
+            QStringLiteral("DeleteDisabledLanguageAlertTitleText")},
+        d->languageModel, CZSRLanguageTableCellView().sizeHint().height());
 }
 
-CZCustomizeSRLanguagesWindowController::~CZCustomizeSRLanguagesWindowController()
-{
-    delete m_rowViews; // before the table it works on
-    delete m_window;
-}
+CZCustomizeSRLanguagesWindowController::~CZCustomizeSRLanguagesWindowController() = default;
 
 QList<CZSRLanguageRowPtr> CZCustomizeSRLanguagesWindowController::currentlyDisplayedRows()
 {
-    QMutexLocker locker(&m_lock);
-    return m_currentlyDisplayedRows;
-}
-
-bool CZCustomizeSRLanguagesWindowController::isDownloadStatusPolling() const
-{
-    return m_downloadStatusUpdateTimer && m_downloadStatusUpdateTimer->isActive();
+    Q_D(CZCustomizeSRLanguagesWindowController);
+    QMutexLocker locker(&d->lock);
+    return d->currentlyDisplayedRows;
 }
 
 void CZCustomizeSRLanguagesWindowController::showSheetForWindow(QWidget *window,
     const std::optional<QStringList> &networkSupportedLocaleIdentifiers,
     const QString &requiredLocaleIdentifier, bool supportDownloads)
 {
-    m_networkBasedLocaleIdentifiers = networkSupportedLocaleIdentifiers;
-    m_requiredLocaleIdentifier = requiredLocaleIdentifier;
-    m_markedForDeletionSet.clear();
-    m_supportDownloads = supportDownloads;
-    {
-        const QSignalBlocker blocker(m_searchField);
-        m_searchField->clear();
-    }
-    m_searchField->setFocus();
-    _rebuildList();
-    delete m_downloadStatusUpdateTimer.data();
-    if (supportDownloads) {
-        m_downloadStatusUpdateTimer = new QTimer(this);
-        m_downloadStatusUpdateTimer->setInterval(StatusPollMilliseconds);
-        connect(m_downloadStatusUpdateTimer, &QTimer::timeout, this,
-            &CZCustomizeSRLanguagesWindowController::_updateRowDownloadStatus);
-        m_downloadStatusUpdateTimer->start();
-    }
-    m_selectedDownloadSizeTextField->clear();
-    m_selectionTableView->scrollToTop();
-    if (window) {
-        m_window->setParent(window->window(), m_window->windowFlags());
-    }
-    m_window->setWindowModality(window ? Qt::WindowModal : Qt::ApplicationModal);
-    m_window->show();
-    m_rowViews->sync();
-    disconnect(m_installationObservation);
-    m_installationObservation = connect(&Platform::Services::notifications(),
-        &Platform::DistributedNotificationCenter::notificationPosted, this, [this](const QString &name) {
-            if (name == InstallerProtocol::FinishedInstallationNotification) {
-                _rebuildList();
-            }
-        });
-    _updateButtonStatesOnlyIfDownloadRequired(true);
-    if (window) {
-        window->window()->raise();
-    }
+    Q_D(CZCustomizeSRLanguagesWindowController);
+    d->networkBasedLocaleIdentifiers = networkSupportedLocaleIdentifiers;
+    d->requiredLocaleIdentifier = requiredLocaleIdentifier;
+    d->supportDownloads = supportDownloads;
+    d->present(window, supportDownloads);
 }
 
-void CZCustomizeSRLanguagesWindowController::close()
-{
-    if (m_downloadStatusUpdateTimer) {
-        m_downloadStatusUpdateTimer->stop();
-        m_downloadStatusUpdateTimer->deleteLater();
-        m_downloadStatusUpdateTimer = nullptr;
-    }
-    m_window->hide();
-}
-
-void CZCustomizeSRLanguagesWindowController::endSheet(bool accepted)
-{
-    if (m_window->parentWidget()) {
-        // Back to a window of its own, so the client's window can go without taking the sheet along.
-        m_window->setParent(nullptr, m_window->windowFlags());
-    }
-    Q_EMIT sheetEnded(accepted);
-}
-
-void CZCustomizeSRLanguagesWindowController::_rebuildList()
+void CZCustomizeSRLanguagesWindowControllerPrivate::_rebuildList()
 {
     QList<CZSRLanguageItemPtr> downloadables = manager().downloadableSRLanguageItems();
     auto markOfflineOnly = [this](const CZSRLanguageItemPtr &item) {
-        item->setOfflineDictationOnly(m_networkBasedLocaleIdentifiers
-            && !CZSpeechItem::isLocaleIdentifier(item->localeIdentifier(), *m_networkBasedLocaleIdentifiers));
+        item->setOfflineDictationOnly(networkBasedLocaleIdentifiers
+            && !CZSpeechItem::isLocaleIdentifier(item->localeIdentifier(), *networkBasedLocaleIdentifiers));
     };
     for (const CZSRLanguageItemPtr &item : std::as_const(downloadables)) {
         markOfflineOnly(item);
@@ -196,89 +97,76 @@ void CZCustomizeSRLanguagesWindowController::_rebuildList()
         const QList<CZSRLanguageItemPtr> candidates = downloadables;
         if (const CZSpeechItemPtr upgrade
             = manager().downloadableSpeechItemUpgradeForExistingSpeechItem(installed, candidates)) {
-            installed->setDownloadStatus(1);
+            installed->setDownloadStatus(Protocol::UpgradeAvailableStatus);
             downloadables.removeIf([&](const CZSRLanguageItemPtr &item) { return item == upgrade; });
         }
         markOfflineOnly(installed);
         items.append(installed);
     }
     items.append(downloadables);
-    if (!m_requiredLocaleIdentifier.isEmpty()) {
+    if (!requiredLocaleIdentifier.isEmpty()) {
         for (const CZSRLanguageItemPtr &item : std::as_const(items)) {
-            if (CZSpeechItem::isSameLocaleIdentifier(item->localeIdentifier(), m_requiredLocaleIdentifier)) {
+            if (CZSpeechItem::isSameLocaleIdentifier(item->localeIdentifier(), requiredLocaleIdentifier)) {
                 item->setVisibility(1); // the pop-up's language stays listed
                 break;
             }
         }
     }
-    m_allObjects = items;
-    _updateDisplayUsingFilterString(m_searchField->text());
+    allObjects = items;
+    _updateDisplayUsingFilterString(form.searchField->text());
 }
 
-void CZCustomizeSRLanguagesWindowController::_updateDisplayUsingFilterString(const QString &filter)
+void CZCustomizeSRLanguagesWindowControllerPrivate::_updateDisplayUsingFilterString(const QString &filter)
 {
-    const bool languageCodeOnly = std::none_of(m_allObjects.cbegin(), m_allObjects.cend(),
+    const bool languageCodeOnly = std::none_of(allObjects.cbegin(), allObjects.cend(),
         [](const CZSRLanguageItemPtr &item) { return item->doesMatchSystemLocale(); });
-    QMutexLocker locker(&m_lock);
+    QMutexLocker locker(&lock);
     QList<CZSRLanguageItemPtr> shown;
-    for (const CZSRLanguageItemPtr &item : std::as_const(m_allObjects)) {
+    for (const CZSRLanguageItemPtr &item : std::as_const(allObjects)) {
         if (filter.isEmpty() || item->matchesSearchString(filter)) {
             shown.append(item);
         }
     }
-    m_currentlyDisplayedRows
+    currentlyDisplayedRows
         = CZSRLanguageRow::arrangedRowsFromSRLanguageItems(shown, true, languageCodeOnly, true);
-    m_model->setRows(m_currentlyDisplayedRows);
-    m_noResultsFoundTextField->setVisible(m_currentlyDisplayedRows.isEmpty());
-    // Said while the search field has the focus, so a screen reader hears that nothing matched.
-    m_searchField->setAccessibleDescription(
-        m_currentlyDisplayedRows.isEmpty() ? m_noResultsFoundTextField->text() : QString());
-}
-
-void CZCustomizeSRLanguagesWindowController::searchFieldChanged()
-{
-    _updateDisplayUsingFilterString(m_searchField->text());
-}
-
-int CZCustomizeSRLanguagesWindowController::numberOfRowsInTableView() const
-{
-    QMutexLocker locker(&m_lock);
-    return int(m_currentlyDisplayedRows.size());
-}
-
-bool CZCustomizeSRLanguagesWindowController::shouldSelectRow(int row) const
-{
-    QMutexLocker locker(&m_lock);
-    return row >= 0 && row < m_currentlyDisplayedRows.size()
-        && !m_currentlyDisplayedRows.at(row)->isGroupRow();
+    languageModel->setRows(currentlyDisplayedRows);
+    showWhetherAnythingMatched(!currentlyDisplayedRows.isEmpty());
 }
 
 CZSRLanguageTableCellView *CZCustomizeSRLanguagesWindowController::existingViewForRow(int row) const
 {
-    return qobject_cast<CZSRLanguageTableCellView *>(m_rowViews->viewForRow(row));
+    Q_D(const CZCustomizeSRLanguagesWindowController);
+    return qobject_cast<CZSRLanguageTableCellView *>(d->existingViewForRow(row));
 }
 
 CZSRLanguageTableCellView *CZCustomizeSRLanguagesWindowController::viewForRow(
     int row, CZSRLanguageTableCellView *spare)
 {
-    QMutexLocker locker(&m_lock);
-    if (row < 0 || row >= m_currentlyDisplayedRows.size() || m_currentlyDisplayedRows.at(row)->isGroupRow()) {
+    Q_D(CZCustomizeSRLanguagesWindowController);
+    return static_cast<CZSRLanguageTableCellView *>(d->viewForRow(row, spare));
+}
+
+QWidget *CZCustomizeSRLanguagesWindowControllerPrivate::viewForRow(int row, QWidget *spare)
+{
+    Q_Q(CZCustomizeSRLanguagesWindowController);
+    QMutexLocker locker(&lock);
+    if (row < 0 || row >= currentlyDisplayedRows.size() || currentlyDisplayedRows.at(row)->isGroupRow()) {
         return nullptr; // headings are drawn by the table itself
     }
-    const CZSRLanguageRowPtr &entry = m_currentlyDisplayedRows.at(row);
+    const CZSRLanguageRowPtr &entry = currentlyDisplayedRows.at(row);
     const CZSRLanguageItemPtr item = entry->srLanguageItem();
-    CZSRLanguageTableCellView *view = spare;
+    auto *view = qobject_cast<CZSRLanguageTableCellView *>(spare);
     if (!view) {
         view = new CZSRLanguageTableCellView;
-        connect(view->activeCheckbox(), &QAbstractButton::clicked, this,
+        QObject::connect(view->activeCheckbox(), &QAbstractButton::clicked, q,
             [this, box = view->activeCheckbox()] { _propagateCheckboxSelection(box); });
-        connect(view->downloadVariantPopUpButton(), &QComboBox::activated, this,
+        QObject::connect(view->downloadVariantPopUpButton(), &QComboBox::activated, q,
             [this, sizes = view->downloadVariantPopUpButton()](
                 int index) { _propagateDownloadVariantSelection(sizes, index); });
     }
     const qint64 status = item->downloadStatus();
-    const bool fetching = status == 3 || status == 4;
-    const bool greyed = m_supportDownloads ? fetching : item->offlineDictationOnly();
+    const bool fetching = status == Protocol::DownloadingStatus || status == Protocol::WaitingStatus;
+    const bool greyed = supportDownloads ? fetching : item->offlineDictationOnly();
     view->textField()->setText(item->countryDisplayString());
     view->textField()->setEnabled(!greyed);
     view->activeCheckbox()->setChecked(entry->isSelected());
@@ -297,51 +185,33 @@ CZSRLanguageTableCellView *CZCustomizeSRLanguagesWindowController::viewForRow(
     return view;
 }
 
-void CZCustomizeSRLanguagesWindowController::_setRowStatusFieldView(QLabel *statusField,
+void CZCustomizeSRLanguagesWindowControllerPrivate::_setRowStatusFieldView(QLabel *statusField,
     QComboBox *variantPopUpButton, const CZSRLanguageItemPtr &speechItem, bool isSelected)
 {
     variantPopUpButton->hide();
-    if (!m_supportDownloads) {
+    if (!supportDownloads) {
         const bool offlineOnly = speechItem->offlineDictationOnly();
         statusField->setVisible(offlineOnly);
         statusField->setText(
             offlineOnly ? texts().text(QStringLiteral("DownloadStatusTextOfflineDictationOnly")) : QString());
         return;
     }
-    QString text;
-    switch (speechItem->downloadStatus()) {
-    case 4:
-        text = texts().text(QStringLiteral("DownloadStatusTextPendingItemFormat"));
-        break;
-    case 3: {
-        const qint64 percent = qint64(std::trunc(speechItem->downloadPercentComplete()));
-        text = texts().format(percent > 0
-                ? QStringLiteral("DownloadStatusTextInProgressWithPercentCompleteFormat")
-                : QStringLiteral("DownloadStatusTextInProgressFormat"),
-            {CZSpeechItem::displayStringForPercent(percent)});
-        break;
-    }
-    case 2:
-        if (isSelected) {
-            text = texts().text(QStringLiteral("DownloadStatusTextRequiredItemFormat"));
-            if (!speechItem->fullSizeBundleIdentifier().isEmpty()) {
-                Platform::SizeVariants::show(variantPopUpButton, speechItem->localeIdentifier(),
-                    speechItem->byteSize(), speechItem->fullSizeByteSize(), speechItem->downloadFullSize());
-            }
-        }
-        break;
-    default:
-        break;
+    const qint64 status = speechItem->downloadStatus();
+    if (status == Protocol::NotInstalledStatus && isSelected
+        && !speechItem->fullSizeBundleIdentifier().isEmpty()) {
+        Platform::SizeVariants::show(variantPopUpButton, speechItem->localeIdentifier(),
+            speechItem->byteSize(), speechItem->fullSizeByteSize(), speechItem->downloadFullSize());
     }
     statusField->show();
-    Platform::RowView::setStatusText(statusField, text);
+    Platform::RowView::setStatusText(
+        statusField, rowStatusText(status, speechItem->downloadPercentComplete(), isSelected));
 }
 
-int CZCustomizeSRLanguagesWindowController::displayedRowOfLocale(const QString &localeIdentifier) const
+int CZCustomizeSRLanguagesWindowControllerPrivate::displayedRowOfLocale(const QString &localeIdentifier) const
 {
-    QMutexLocker locker(&m_lock);
-    for (int row = 0; row < m_currentlyDisplayedRows.size(); ++row) {
-        const CZSRLanguageItemPtr item = m_currentlyDisplayedRows.at(row)->srLanguageItem();
+    QMutexLocker locker(&lock);
+    for (int row = 0; row < currentlyDisplayedRows.size(); ++row) {
+        const CZSRLanguageItemPtr item = currentlyDisplayedRows.at(row)->srLanguageItem();
         if (item && item->localeIdentifier() == localeIdentifier) {
             return row;
         }
@@ -349,64 +219,67 @@ int CZCustomizeSRLanguagesWindowController::displayedRowOfLocale(const QString &
     return -1;
 }
 
-void CZCustomizeSRLanguagesWindowController::_propagateCheckboxSelection(
+void CZCustomizeSRLanguagesWindowControllerPrivate::_propagateCheckboxSelection(
     CZSRLanguageRowCheckboxButton *sender)
 {
+    Q_Q(CZCustomizeSRLanguagesWindowController);
     {
-        QMutexLocker locker(&m_lock);
+        QMutexLocker locker(&lock);
         const int row = displayedRowOfLocale(sender->localeIdentifier());
         if (row >= 0) {
-            const CZSRLanguageRowPtr entry = m_currentlyDisplayedRows.at(row);
+            const CZSRLanguageRowPtr entry = currentlyDisplayedRows.at(row);
             const bool ticked = sender->isChecked();
             entry->setSelected(ticked);
             const CZSRLanguageItemPtr item = entry->srLanguageItem();
-            if (item->downloadStatus() == 2) {
-                if (CZSRLanguageTableCellView *view = existingViewForRow(row)) {
+            if (item->downloadStatus() == Protocol::NotInstalledStatus) {
+                if (CZSRLanguageTableCellView *view = q->existingViewForRow(row)) {
                     _setRowStatusFieldView(
                         view->downloadMessageTextField(), view->downloadVariantPopUpButton(), item, ticked);
                 }
-            } else if (item->downloadStatus() == 0) {
+            } else if (item->downloadStatus() == Protocol::InstalledStatus) {
                 if (ticked) {
-                    m_markedForDeletionSet.remove(item->localeIdentifier());
+                    markedForDeletionSet.remove(item->localeIdentifier());
                 } else if (manager().bundleForRemovableLanguage(*item, nullptr)) {
-                    m_markedForDeletionSet.insert(item->localeIdentifier());
+                    markedForDeletionSet.insert(item->localeIdentifier());
                 }
             }
-            m_selectionTableView->setFocus();
-            m_selectionTableView->selectRow(row);
-            m_okButton->setEnabled(true);
+            form.table->setFocus();
+            form.table->selectRow(row);
+            form.okButton->setEnabled(true);
         }
     }
     _updateButtonStatesOnlyIfDownloadRequired(false);
 }
 
-void CZCustomizeSRLanguagesWindowController::_propagateDownloadVariantSelection(QComboBox *sender, int index)
+void CZCustomizeSRLanguagesWindowControllerPrivate::_propagateDownloadVariantSelection(
+    QComboBox *sender, int index)
 {
     {
-        QMutexLocker locker(&m_lock);
+        QMutexLocker locker(&lock);
         const int row = displayedRowOfLocale(Platform::SizeVariants::identifier(sender, index));
         if (row >= 0) {
-            m_currentlyDisplayedRows.at(row)->srLanguageItem()->setDownloadFullSize(
+            currentlyDisplayedRows.at(row)->srLanguageItem()->setDownloadFullSize(
                 sender->itemData(index).toInt() > 0);
             sender->setCurrentIndex(index);
-            m_selectionTableView->setFocus();
-            m_selectionTableView->selectRow(row);
-            m_okButton->setEnabled(true);
+            form.table->setFocus();
+            form.table->selectRow(row);
+            form.okButton->setEnabled(true);
         }
     }
     _updateButtonStatesOnlyIfDownloadRequired(false);
 }
 
-void CZCustomizeSRLanguagesWindowController::_updateButtonStatesOnlyIfDownloadRequired(
+void CZCustomizeSRLanguagesWindowControllerPrivate::_updateButtonStatesOnlyIfDownloadRequired(
     bool onlyIfDownloadRequired)
 {
     quint64 total = 0;
     bool downloadRequired = false;
     {
-        QMutexLocker locker(&m_lock);
-        for (const CZSRLanguageRowPtr &row : std::as_const(m_currentlyDisplayedRows)) {
+        QMutexLocker locker(&lock);
+        for (const CZSRLanguageRowPtr &row : std::as_const(currentlyDisplayedRows)) {
             const CZSRLanguageItemPtr item = row->srLanguageItem();
-            if (row->isGroupRow() || !item || !row->isSelected() || item->downloadStatus() != 2) {
+            if (row->isGroupRow() || !item || !row->isSelected()
+                || item->downloadStatus() != Protocol::NotInstalledStatus) {
                 continue;
             }
             downloadRequired = true;
@@ -414,114 +287,104 @@ void CZCustomizeSRLanguagesWindowController::_updateButtonStatesOnlyIfDownloadRe
         }
     }
     if (onlyIfDownloadRequired && downloadRequired) {
-        m_okButton->setEnabled(true); // never disabled here
+        form.okButton->setEnabled(true); // never disabled here
     }
-    m_selectedDownloadSizeTextField->setText(!m_supportDownloads || total == 0
-            ? QString()
-            : texts().format(QStringLiteral("SelectedDownloadSizeFormat"),
-                {CZSpeechItem::displayStringForByteSize(total)}));
+    showSelectedDownloadSize(supportDownloads ? total : 0);
 }
 
-void CZCustomizeSRLanguagesWindowController::_updateRowDownloadStatus()
+QVariantList CZCustomizeSRLanguagesWindowControllerPrivate::activeInstallations() const
 {
-    const QVariantList records = manager().activeInstallations();
-    QMutexLocker locker(&m_lock);
-    for (const QVariant &entry : records) {
-        const QVariantMap record = entry.toMap();
-        const QString objectIdentifier = record.value(InstallerProtocol::ObjectIDKey).toString();
-        for (int row = 0; row < m_currentlyDisplayedRows.size(); ++row) {
-            const CZSRLanguageRowPtr &displayed = m_currentlyDisplayedRows.at(row);
-            const CZSRLanguageItemPtr item = displayed->srLanguageItem();
-            if (!item || !CZSpeechItem::isSameLocaleIdentifier(item->localeIdentifier(), objectIdentifier)) {
-                continue;
-            }
-            item->setDownloadStatus(record.value(InstallerProtocol::ItemDownloadStatusKey).toLongLong());
-            item->setDownloadPercentComplete(
-                record.value(InstallerProtocol::ItemPercentCompleteKey).toDouble());
-            if (CZSRLanguageTableCellView *view = existingViewForRow(row)) {
-                _setRowStatusFieldView(view->downloadMessageTextField(), view->downloadVariantPopUpButton(),
-                    item, displayed->isSelected());
-            }
-            break;
+    return manager().activeInstallations();
+}
+
+int CZCustomizeSRLanguagesWindowControllerPrivate::rowOfInstallationRecord(const QVariantMap &record)
+{
+    const QString objectIdentifier = record.value(Protocol::ObjectIDKey).toString();
+    for (int row = 0; row < currentlyDisplayedRows.size(); ++row) {
+        const CZSRLanguageItemPtr item = currentlyDisplayedRows.at(row)->srLanguageItem();
+        if (item && CZSpeechItem::isSameLocaleIdentifier(item->localeIdentifier(), objectIdentifier)) {
+            return row;
         }
     }
+    return -1;
 }
 
-void CZCustomizeSRLanguagesWindowController::finishAccepted(const QList<CZSRLanguageItemPtr> &toInstall)
+void CZCustomizeSRLanguagesWindowControllerPrivate::showInstallationRecord(int row, const QVariantMap &record)
 {
-    disconnect(m_installationObservation);
-    m_installationObservation = {};
-    close();
-    endSheet(true);
-    if (!toInstall.isEmpty()) {
-        (void)manager().startInstallingDownloadableSpeechItems(toInstall, 0);
+    Q_Q(CZCustomizeSRLanguagesWindowController);
+    const CZSRLanguageRowPtr &displayed = currentlyDisplayedRows.at(row);
+    const CZSRLanguageItemPtr item = displayed->srLanguageItem();
+    item->setDownloadStatus(record.value(Protocol::ItemDownloadStatusKey).toLongLong());
+    item->setDownloadPercentComplete(record.value(Protocol::ItemPercentCompleteKey).toDouble());
+    if (CZSRLanguageTableCellView *view = q->existingViewForRow(row)) {
+        _setRowStatusFieldView(view->downloadMessageTextField(), view->downloadVariantPopUpButton(), item,
+            displayed->isSelected());
     }
+}
+
+CustomizeSheetControllerPrivate::Decision CZCustomizeSRLanguagesWindowControllerPrivate::decide()
+{
+    QMutexLocker locker(&lock);
+    // Only the rows on display are saved: ticks on rows the filter hides are not written.
+    QList<CZSRLanguageItemPtr> items;
+    QList<SelectionRow> rows;
+    for (const CZSRLanguageRowPtr &row : std::as_const(currentlyDisplayedRows)) {
+        const CZSRLanguageItemPtr item = row->srLanguageItem();
+        if (row->isGroupRow() || !item) {
+            continue;
+        }
+        SelectionRow entry;
+        entry.identifier = item->localeIdentifier();
+        entry.visibility = item->visibility();
+        entry.visibilityIdentifiers = {item->localeIdentifier()};
+        entry.downloadStatus = item->downloadStatus();
+        entry.selected = row->isSelected();
+        entry.markedForDeletion = markedForDeletionSet.contains(item->localeIdentifier());
+        entry.keptInstalled
+            = CZSpeechItem::isSameLocaleIdentifier(item->localeIdentifier(), requiredLocaleIdentifier);
+        rows.append(entry);
+        items.append(item);
+    }
+    // Locales are compared as locales, never as strings: the table answers for any spelling.
+    const auto stored = [](const QString &locale) -> std::optional<qint64> {
+        return CZSRLanguageItem::visibiltyValueForLocaleIdentifier(locale, nullptr);
+    };
+    Decision decision;
+    decision.changes = decideSelectionChanges(rows, stored, supportDownloads);
+    for (auto entry = decision.changes.visibility.cbegin(); entry != decision.changes.visibility.cend();
+         ++entry) {
+        CZSRLanguageItem::setVisibilityValue(quint64(entry.value()), entry.key());
+    }
+
+    QList<CZSRLanguageItemPtr> toInstall;
+    for (const qsizetype index : std::as_const(decision.changes.install)) {
+        toInstall.append(items.at(index));
+    }
+    QList<RemovableSpeechItem> toRemove;
+    for (const qsizetype index : std::as_const(decision.changes.remove)) {
+        toRemove.append(items.at(index));
+    }
+    decision.remove = [toRemove] {
+        // Dictation must let go of the language before its files go.
+        Platform::Services::notifications().postNotification(DoCancelListeningNotification);
+        manager().startRemovingDownloadedSpeechItems(toRemove);
+    };
+    decision.commit = [toInstall] {
+        if (!toInstall.isEmpty()) {
+            (void)manager().startInstallingDownloadableSpeechItems(toInstall, 0);
+        }
+    };
+    return decision;
 }
 
 void CZCustomizeSRLanguagesWindowController::acceptSelection()
 {
-    QList<CZSRLanguageItemPtr> toInstall;
-    QList<RemovableSpeechItem> toRemove;
-    {
-        QMutexLocker locker(&m_lock);
-        // Only the rows on display are saved: ticks on rows the filter hides are not written.
-        for (const CZSRLanguageRowPtr &row : std::as_const(m_currentlyDisplayedRows)) {
-            const CZSRLanguageItemPtr item = row->srLanguageItem();
-            if (row->isGroupRow() || !item) {
-                continue;
-            }
-            const qint64 stored
-                = CZSRLanguageItem::visibiltyValueForLocaleIdentifier(item->localeIdentifier(), nullptr);
-            if (stored != item->visibility()) {
-                CZSRLanguageItem::setVisibilityValue(quint64(item->visibility()), item->localeIdentifier());
-            }
-        }
-        if (m_supportDownloads) {
-            for (const CZSRLanguageRowPtr &row : std::as_const(m_currentlyDisplayedRows)) {
-                const CZSRLanguageItemPtr item = row->srLanguageItem();
-                if (row->isGroupRow() || !item) {
-                    continue;
-                }
-                if (row->isSelected() && item->downloadStatus() == 2) {
-                    toInstall.append(item);
-                } else if (!row->isSelected() && item->downloadStatus() == 0
-                    && m_markedForDeletionSet.contains(item->localeIdentifier())
-                    && !CZSpeechItem::isSameLocaleIdentifier(
-                        item->localeIdentifier(), m_requiredLocaleIdentifier)) {
-                    toRemove.append(item);
-                }
-            }
-        }
-    }
-    if (toRemove.isEmpty()) {
-        finishAccepted(toInstall);
-        return;
-    }
-    Platform::AlertRequest alert;
-    alert.icon = QIcon::fromTheme(QStringLiteral("preferences-desktop-text-to-speech"),
-        m_window->style()->standardIcon(QStyle::SP_MessageBoxWarning));
-    alert.title = texts().text(QStringLiteral("DeleteDisabledLanguageAlertTitleText"));
-    alert.buttons = {texts().text(QStringLiteral("DeleteDisabledItemAlertDeleteButtonText")),
-        texts().text(QStringLiteral("Cancel")),
-        texts().text(QStringLiteral("DeleteDisabledItemAlertKeepButtonText"))};
-    Platform::Alert::beginSheet(alert, m_window, [this, toInstall, toRemove](int answer) {
-        if (answer == 0) {
-            // Dictation must let go of the language before its files go.
-            Platform::Services::notifications().postNotification(DoCancelListeningNotification);
-            manager().startRemovingDownloadedSpeechItems(toRemove);
-            finishAccepted(toInstall);
-        } else if (answer == 2) {
-            finishAccepted(toInstall);
-        }
-    });
+    acceptSheet();
 }
 
 void CZCustomizeSRLanguagesWindowController::cancelSelection()
 {
-    disconnect(m_installationObservation);
-    m_installationObservation = {};
-    close();
-    endSheet(false);
+    cancelSheet();
 }
 
 } // namespace Cadenza

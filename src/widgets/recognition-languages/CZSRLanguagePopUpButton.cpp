@@ -1,12 +1,13 @@
 #include "CZSRLanguagePopUpButton.h"
 
+#include "core/SpeechNames.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/locale/LocalizationTable.h"
-#include "core/rows/CZDownloadDisplayManager.h"
 #include "core/services/DistributedNotificationCenter.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem.h"
 #include "protocol/InstallerProtocol.h"
+#include "widgets/helpers/DownloadStatusLine.h"
 #include "widgets/installation/CZSpeechInstallationManagerSheets.h"
 #include "widgets/voice-popup/VoiceMenuModel.h"
 
@@ -25,10 +26,6 @@ const QString EnUS = QStringLiteral("en_US");
 const QString WillStartListeningNotification = QStringLiteral("DictationIMNotificationWillStartListening");
 const QString RecognizerDidPreHeatNotification
     = QStringLiteral("DictationIMNotificationRecognizerDidPreHeat");
-const QString LanguagePreferencesChangedNotification
-    = QStringLiteral("VendraLanguagePreferencesChangedNotification");
-const QString NumberPreferencesChangedNotification
-    = QStringLiteral("VendraNumberPreferencesChangedNotification");
 constexpr int PreHeatWaitMilliseconds = 30000;
 
 // Only the first pop-up of a process follows the notifications.
@@ -48,17 +45,41 @@ QList<CZSpeechItemPtr> asSpeechItems(const QList<CZSRLanguageItemPtr> &items)
     return {items.cbegin(), items.cend()};
 }
 
-QString tagOf(const QVariantMap &record)
-{
-    return record.value(Protocol::TagNameKey).toString();
-}
 } // namespace
 
 CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
     : Platform::PopUpButton(parent)
-    , m_downloadDisplayManager(std::make_unique<CZDownloadDisplayManager>())
     , m_menu(new VoiceMenuModel(this))
 {
+    DownloadStatusLine::Style style;
+    style.tagPrefix = Protocol::RecognitionTagPrefix;
+    style.join = [](const QString &itemLine, const QString &timeLeft) {
+        return QStringLiteral("%1\n%2").arg(itemLine, timeLeft);
+    };
+    // With a single language on offer the download is the enhanced dictation itself.
+    style.itemName = [this](const QVariantList &records, const QVariantMap &first) {
+        return records.size() == 1 && count() <= 3 ? texts().text(QStringLiteral("EnhancedDictation"))
+                                                   : first.value(Protocol::ItemNameKey).toString();
+    };
+    // Installed is not usable yet: keep the line until the engine has loaded the language.
+    style.installing = [this] {
+        delete m_preHeatTimer;
+        m_preHeatTimer = new QTimer(this);
+        m_preHeatTimer->setInterval(PreHeatWaitMilliseconds);
+        connect(m_preHeatTimer, &QTimer::timeout, this,
+            &CZSRLanguagePopUpButton::_clearDownloadStatusFieldAfterPreHeat);
+        m_preHeatTimer->start();
+    };
+    style.idleLine = [this] {
+        if (!m_preHeatTimer) {
+            return QString();
+        }
+        return QStringLiteral("%1\n%2").arg(
+            texts().format(QStringLiteral("DownloadingStatusStringInstallingItem"),
+                {texts().text(QStringLiteral("EnhancedDictation"))}),
+            CZSpeechItem::displayStringForTimeRemaining(1.0));
+    };
+    m_statusLine = new DownloadStatusLine(style, this);
     setObjectName(QStringLiteral("srLanguagePopUpButton"));
     setModel(m_menu);
     setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
@@ -69,10 +90,10 @@ CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
         connect(&Platform::Services::notifications(),
             &Platform::DistributedNotificationCenter::notificationPosted, this,
             [this](const QString &name, const QString &, const QVariantMap &userInfo) {
-                if (name == CZSRLanguageItem::DefaultLanguageChangedNotification
+                if (name == SpeechNames::DefaultSRLanguageChangedNotification
                     || name == Protocol::StartedInstallationNotification
-                    || name == LanguagePreferencesChangedNotification
-                    || name == NumberPreferencesChangedNotification) {
+                    || name == SpeechNames::LanguagePreferencesChangedNotification
+                    || name == SpeechNames::NumberPreferencesChangedNotification) {
                     _startDelayedPopUpUpdate();
                 } else if (name == Protocol::FinishedInstallationNotification) {
                     installationFinished(userInfo.value(Protocol::ObjectIDKey).toString());
@@ -89,20 +110,13 @@ CZSRLanguagePopUpButton::~CZSRLanguagePopUpButton() = default;
 
 void CZSRLanguagePopUpButton::setDownloadStatusTextField(QLabel *textField)
 {
-    m_downloadStatusTextField = textField;
+    m_statusLine->setTextField(textField);
 }
 
 void CZSRLanguagePopUpButton::setDownloadStatusProgressIndicator(QProgressBar *indicator)
 {
-    m_downloadStatusProgressIndicator = indicator;
-    if (indicator) {
-        indicator->setRange(0, 0);
-        indicator->setTextVisible(false);
-        if (indicator->accessibleName().isEmpty()) {
-            indicator->setAccessibleName(texts().text(QStringLiteral("LanguageDownloadProgressName")));
-        }
-        indicator->hide();
-    }
+    m_statusLine->setProgressIndicator(
+        indicator, texts().text(QStringLiteral("LanguageDownloadProgressName")));
 }
 
 void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
@@ -149,7 +163,7 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
         item->setShowCountryInDisplayTitle(true);
         Item entry;
         entry.title = item->displayTitle();
-        if (item->downloadStatus() == 3) {
+        if (item->downloadStatus() == Protocol::DownloadingStatus) {
             entry.title = Platform::LocalizationTable::fill(downloadingFormat, {entry.title});
             entry.enabled = false;
         }
@@ -217,11 +231,8 @@ void CZSRLanguagePopUpButton::installationFinished(const QString &objectIdentifi
 {
     const CZSRLanguageItemPtr selected = selectedLanguageItem();
     if (!objectIdentifier.isEmpty() && selected
-        && CZSpeechItem::isSameLangaugeFromLocaleIdentifier(selected->localeIdentifier(), objectIdentifier)
-        && m_downloadStatusUpdateTimer) {
-        m_downloadStatusUpdateTimer->stop();
-        m_downloadStatusUpdateTimer->deleteLater();
-        m_downloadStatusUpdateTimer = nullptr;
+        && CZSpeechItem::isSameLangaugeFromLocaleIdentifier(selected->localeIdentifier(), objectIdentifier)) {
+        m_statusLine->stopRefreshing();
     }
     _startDelayedPopUpUpdate();
 }
@@ -239,74 +250,17 @@ void CZSRLanguagePopUpButton::_updateSRLanguageMenu()
 
 QString CZSRLanguagePopUpButton::_statusStringForActiveDownloads()
 {
-    const QVariantList records = CZSpeechInstallationManager::sharedManager()->activeInstallations();
-    const QVariantMap first = records.isEmpty() ? QVariantMap() : records.first().toMap();
-    const bool anyLanguage = std::any_of(records.cbegin(), records.cend(), [](const QVariant &record) {
-        return tagOf(record.toMap()).startsWith(Protocol::RecognitionTagPrefix);
-    });
-    const double remaining = m_downloadDisplayManager->timeRemainingForActiveInstallations(
-        records, Protocol::RecognitionTagPrefix);
-    const QString twoLines = QStringLiteral("%1\n%2");
-
-    QString status;
-    if (tagOf(first).startsWith(Protocol::RecognitionTagPrefix)) {
-        const QString time = first.value(Protocol::ItemSecondsRemainingKey).toDouble() > 0
-            ? CZSpeechItem::displayStringForTimeRemaining(remaining)
-            : QString();
-        QString name = first.value(Protocol::ItemNameKey).toString();
-        if (records.size() == 1 && count() <= 3) {
-            name = texts().text(QStringLiteral("EnhancedDictation"));
-        }
-        switch (first.value(Protocol::ItemSoftwareUpdateStateKey).toLongLong()) {
-        case 3:
-            status = twoLines.arg(
-                texts().format(QStringLiteral("DownloadingStatusStringInstallingItem"), {name}), time);
-            // Installed is not usable yet: keep the line until the engine has loaded the language.
-            delete m_preHeatTimer;
-            m_preHeatTimer = new QTimer(this);
-            m_preHeatTimer->setInterval(PreHeatWaitMilliseconds);
-            connect(m_preHeatTimer, &QTimer::timeout, this,
-                &CZSRLanguagePopUpButton::_clearDownloadStatusFieldAfterPreHeat);
-            m_preHeatTimer->start();
-            break;
-        case 2:
-            status = twoLines.arg(
-                texts().format(QStringLiteral("DownloadingStatusStringDownloadingItem"), {name}), time);
-            break;
-        default:
-            status = texts().text(QStringLiteral("DownloadingStatusStringPreparing"));
-            break;
-        }
-    } else if (anyLanguage) {
-        status = texts().text(QStringLiteral("DownloadingStatusStringWaiting"));
-    } else if (m_preHeatTimer) {
-        status = twoLines.arg(texts().format(QStringLiteral("DownloadingStatusStringInstallingItem"),
-                                  {texts().text(QStringLiteral("EnhancedDictation"))}),
-            CZSpeechItem::displayStringForTimeRemaining(1.0));
-    }
-
-    if (m_downloadStatusUpdateTimer && status.isNull()) {
-        m_downloadStatusUpdateTimer->stop();
-        m_downloadStatusUpdateTimer->deleteLater();
-        m_downloadStatusUpdateTimer = nullptr;
-        m_downloadDisplayManager->reset();
-    } else if (!m_downloadStatusUpdateTimer && !status.isNull()) {
-        m_downloadStatusUpdateTimer = new QTimer(this);
-        m_downloadStatusUpdateTimer->setInterval(500);
-        connect(m_downloadStatusUpdateTimer, &QTimer::timeout, this,
-            &CZSRLanguagePopUpButton::_updateDownloadStatusFields);
-        m_downloadStatusUpdateTimer->start();
-    }
-    return status;
+    return m_statusLine->statusForActiveDownloads();
 }
 
 void CZSRLanguagePopUpButton::_updateDownloadStatusFields()
 {
-    const QString status = _statusStringForActiveDownloads();
-    showStatusLine(m_downloadStatusTextField, status.isNull() ? QString() : status);
-    if (m_downloadStatusProgressIndicator) {
-        m_downloadStatusProgressIndicator->setVisible(!status.isNull());
-    }
+    m_statusLine->update();
+}
+
+bool CZSRLanguagePopUpButton::_hasDownloadStatusUpdateTimer() const
+{
+    return m_statusLine->isRefreshing();
 }
 
 void CZSRLanguagePopUpButton::_clearDownloadStatusFieldAfterPreHeat()

@@ -18,7 +18,7 @@ class QTimer;
 
 namespace Cadenza {
 
-class CZDownloadDisplayManager;
+class DownloadStatusLine;
 class VoiceMenuModel;
 
 /**
@@ -90,10 +90,7 @@ public:
     void _clearDownloadStatusFieldAfterPreHeat();
     [[nodiscard]] int _numberOfFixedItemsAtEndOfMenu() const { return m_numberOfFixedItemsAtEndOfMenu; }
     [[nodiscard]] bool _isWaitingForPreHeat() const { return m_preHeatTimer != nullptr; }
-    [[nodiscard]] bool _hasDownloadStatusUpdateTimer() const
-    {
-        return m_downloadStatusUpdateTimer != nullptr;
-    }
+    [[nodiscard]] bool _hasDownloadStatusUpdateTimer() const;
     [[nodiscard]] QList<CZSRLanguageRowPtr> rows() const { return m_rows; }
 
 Q_SIGNALS:
@@ -105,11 +102,8 @@ private:
     std::optional<QStringList> m_network;
     std::optional<QStringList> m_offline;
     int m_numberOfFixedItemsAtEndOfMenu = 1;
-    QPointer<QLabel> m_downloadStatusTextField;
-    QPointer<QProgressBar> m_downloadStatusProgressIndicator;
-    QTimer *m_downloadStatusUpdateTimer = nullptr;
+    DownloadStatusLine *m_statusLine;
     QTimer *m_preHeatTimer = nullptr;
-    std::unique_ptr<CZDownloadDisplayManager> m_downloadDisplayManager;
     bool m_languagesAreDownloadable = false;
     VoiceMenuModel *m_menu;
     QList<CZSRLanguageRowPtr> m_rows;

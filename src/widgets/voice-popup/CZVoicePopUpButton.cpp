@@ -1,11 +1,11 @@
 #include "CZVoicePopUpButton.h"
 
 #include "CZVoicePopUpButton_p.h"
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/VoiceDescription.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/locale/LocalizationTable.h"
-#include "core/rows/CZDownloadDisplayManager.h"
 #include "core/rows/VoiceTableRow.h"
 #include "core/services/DistributedNotificationCenter.h"
 #include "core/services/Services.h"
@@ -15,14 +15,13 @@
 #include "core/voices/SpeechSynthesizer.h"
 #include "protocol/InstallerProtocol.h"
 #include "widgets/helpers/Alert.h"
+#include "widgets/helpers/DownloadStatusLine.h"
 #include "widgets/installation/CZSpeechInstallationManagerSheets.h"
 
 #include <QDir>
 #include <QFileSystemWatcher>
 #include <QGuiApplication>
-#include <QLabel>
 #include <QListView>
-#include <QProgressBar>
 #include <QRecursiveMutex>
 #include <QTimer>
 
@@ -34,13 +33,6 @@ namespace {
 using Item = VoiceMenuModel::Item;
 namespace Protocol = InstallerProtocol;
 
-const QString OrinIdentifier = QStringLiteral("com.vendra.speech.synthesis.voice.Orin");
-const QString DefaultVoiceChangedNotification
-    = QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification");
-const QString LanguagePreferencesChangedNotification
-    = QStringLiteral("VendraLanguagePreferencesChangedNotification");
-const QString NumberPreferencesChangedNotification
-    = QStringLiteral("VendraNumberPreferencesChangedNotification");
 const QString LecternUtilityIdentifier = QStringLiteral("com.vendra.LecternUtility");
 
 /// What every voice pop-up of the process shares.
@@ -72,19 +64,15 @@ const Platform::LocalizationTable &texts()
     return Platform::LocalizationTable::shared();
 }
 
-QString tagOf(const QVariantMap &record)
-{
-    return record.value(Protocol::TagNameKey).toString();
-}
-
 // Registers the class for the notifications that change every menu and watches the voice folders.
 void registerProcessWideObservers()
 {
     SharedState &state = shared();
     state.preferenceNotifications = QObject::connect(&Platform::Services::notifications(),
         &Platform::DistributedNotificationCenter::notificationPosted, qApp, [](const QString &name) {
-            if (name == DefaultVoiceChangedNotification || name == LanguagePreferencesChangedNotification
-                || name == NumberPreferencesChangedNotification) {
+            if (name == SpeechNames::DefaultVoiceChangedNotification
+                || name == SpeechNames::LanguagePreferencesChangedNotification
+                || name == SpeechNames::NumberPreferencesChangedNotification) {
                 CZVoicePopUpButton::_startDelayedForceAllVoicePopupsToUpdate();
             }
         });
@@ -108,9 +96,16 @@ void registerProcessWideObservers()
 
 CZVoicePopUpButton::CZVoicePopUpButton(QWidget *parent)
     : Platform::PopUpButton(parent)
-    , m_downloadDisplayManager(std::make_unique<CZDownloadDisplayManager>())
     , m_menu(new VoiceMenuModel(this))
 {
+    m_statusLine = new DownloadStatusLine(
+        {Protocol::VoiceTagPrefix,
+            [](const QString &itemLine, const QString &timeLeft) {
+                return Platform::LocalizationTable::fill(
+                    texts().text(QStringLiteral("DownloadingStatusStringsWithEmDash")), {itemLine, timeLeft});
+            },
+            {}, {}, {}},
+        this);
     setObjectName(QStringLiteral("voicePopUpButton"));
     setModel(m_menu);
     // Measuring 10,000 titles for the width would cost more than building the menu.
@@ -154,20 +149,12 @@ void CZVoicePopUpButton::setSystemVoiceLocalizedText(const QString &text, qint64
 
 void CZVoicePopUpButton::setDownloadStatusTextField(QLabel *textField)
 {
-    m_downloadStatusTextField = textField;
+    m_statusLine->setTextField(textField);
 }
 
 void CZVoicePopUpButton::setDownloadStatusProgressIndicator(QProgressBar *indicator)
 {
-    m_downloadStatusProgressIndicator = indicator;
-    if (indicator) {
-        indicator->setRange(0, 0); // busy, not a fraction
-        indicator->setTextVisible(false);
-        if (indicator->accessibleName().isEmpty()) {
-            indicator->setAccessibleName(texts().text(QStringLiteral("VoiceDownloadProgressName")));
-        }
-        indicator->hide();
-    }
+    m_statusLine->setProgressIndicator(indicator, texts().text(QStringLiteral("VoiceDownloadProgressName")));
 }
 
 QString CZVoicePopUpButton::displayNameForGender(const QString &gender)
@@ -202,7 +189,8 @@ void CZVoicePopUpButton::buildSharedVoicesMenuShowingLTVoices(bool showingLTVoic
     }
     for (const DownloadableVoicePtr &voice : downloadables) {
         const qint64 status = voice->downloadStatus();
-        if ((status != 3 && status != 4) || voice->identifier() == OrinIdentifier) {
+        if ((status != Protocol::DownloadingStatus && status != Protocol::WaitingStatus)
+            || voice->identifier() == SpeechNames::OrinIdentifier) {
             continue;
         }
         if (!showingLTVoices) {
@@ -243,9 +231,9 @@ void CZVoicePopUpButton::buildSharedVoicesMenuShowingLTVoices(bool showingLTVoic
         Item item;
         item.title = showingLTVoices ? voice->displayName() : voice->displayNameRoot();
         const qint64 status = voice->downloadStatus();
-        if (status == 3 || status == 4) {
+        if (status == Protocol::DownloadingStatus || status == Protocol::WaitingStatus) {
             item.title = Platform::LocalizationTable::fill(
-                status == 3 ? downloadingFormat : pendingFormat, {item.title});
+                status == Protocol::DownloadingStatus ? downloadingFormat : pendingFormat, {item.title});
             item.enabled = false;
         }
         state.menu.append(item);
@@ -555,62 +543,17 @@ void CZVoicePopUpButton::_handleSpeechDataInstallationNotification()
 
 QString CZVoicePopUpButton::_statusStringForActiveDownloads()
 {
-    const QVariantList records = CZSpeechInstallationManager::sharedManager()->activeInstallations();
-    const QVariantMap first = records.isEmpty() ? QVariantMap() : records.first().toMap();
-    const bool anyVoice = std::any_of(records.cbegin(), records.cend(),
-        [](const QVariant &record) { return tagOf(record.toMap()).startsWith(Protocol::VoiceTagPrefix); });
-    const double timeRemaining
-        = m_downloadDisplayManager->timeRemainingForActiveInstallations(records, Protocol::VoiceTagPrefix);
-
-    QString line;
-    if (tagOf(first).startsWith(Protocol::VoiceTagPrefix)) {
-        const QString timeText = first.value(Protocol::ItemSecondsRemainingKey).toDouble() > 0
-            ? CZSpeechItem::displayStringForTimeRemaining(timeRemaining)
-            : QString();
-        const QVariant name = first.value(Protocol::ItemNameKey);
-        const QString withEmDash = texts().text(QStringLiteral("DownloadingStatusStringsWithEmDash"));
-        switch (first.value(Protocol::ItemSoftwareUpdateStateKey).toLongLong()) {
-        case 3: // the installing line passes a missing name on as it is
-            line = Platform::LocalizationTable::fill(withEmDash,
-                {texts().format(QStringLiteral("DownloadingStatusStringInstallingItem"), {name.toString()}),
-                    timeText});
-            break;
-        case 2:
-            line = Platform::LocalizationTable::fill(withEmDash,
-                {texts().format(QStringLiteral("DownloadingStatusStringDownloadingItem"),
-                     {name.isValid() ? name.toString() : QString()}),
-                    timeText});
-            break;
-        default:
-            line = texts().text(QStringLiteral("DownloadingStatusStringPreparing"));
-            break;
-        }
-    } else if (anyVoice) {
-        line = texts().text(QStringLiteral("DownloadingStatusStringWaiting"));
-    }
-
-    if (m_downloadStatusUpdateTimer && line.isNull()) {
-        m_downloadStatusUpdateTimer->stop();
-        m_downloadStatusUpdateTimer->deleteLater();
-        m_downloadStatusUpdateTimer = nullptr;
-        m_downloadDisplayManager->reset();
-    } else if (!m_downloadStatusUpdateTimer && !line.isNull()) {
-        m_downloadStatusUpdateTimer = new QTimer(this);
-        m_downloadStatusUpdateTimer->setInterval(500);
-        connect(m_downloadStatusUpdateTimer, &QTimer::timeout, this,
-            &CZVoicePopUpButton::_updateDownloadStatusFields);
-        m_downloadStatusUpdateTimer->start();
-    }
-    return line;
+    return m_statusLine->statusForActiveDownloads();
 }
 
 void CZVoicePopUpButton::_updateDownloadStatusFields()
 {
-    const QString line = _statusStringForActiveDownloads();
-    showStatusLine(m_downloadStatusTextField, line.isNull() ? QString() : line);
-    if (m_downloadStatusProgressIndicator) {
-        m_downloadStatusProgressIndicator->setVisible(!line.isNull());
-    }
+    m_statusLine->update();
+}
+
+bool CZVoicePopUpButton::_hasDownloadStatusUpdateTimer() const
+{
+    return m_statusLine->isRefreshing();
 }
 
 namespace VoicePopUpPrivate {

@@ -12,11 +12,10 @@
 
 class QLabel;
 class QProgressBar;
-class QTimer;
 
 namespace Cadenza {
 
-class CZDownloadDisplayManager;
+class DownloadStatusLine;
 class VoiceMenuModel;
 
 /**
@@ -122,10 +121,7 @@ public:
     /// Empties the shared menu and has every pop-up adopt it again.
     void _forceAllVoicePopupsToUpdateNow();
     /// Whether the status line's refresh timer runs.
-    [[nodiscard]] bool _hasDownloadStatusUpdateTimer() const
-    {
-        return m_downloadStatusUpdateTimer != nullptr;
-    }
+    [[nodiscard]] bool _hasDownloadStatusUpdateTimer() const;
 
 Q_SIGNALS:
     /// The user picked a voice (@p index > 0 or with no system item) or the system item (@p index 0).
@@ -140,10 +136,7 @@ private:
     qint64 m_systemVoiceMenuItemTag = 0;
     bool m_allowSystemVoiceChoice = false;
     bool m_showIndividualVoiceQualities = false;
-    QPointer<QLabel> m_downloadStatusTextField;
-    QPointer<QProgressBar> m_downloadStatusProgressIndicator;
-    QTimer *m_downloadStatusUpdateTimer = nullptr;
-    std::unique_ptr<CZDownloadDisplayManager> m_downloadDisplayManager;
+    DownloadStatusLine *m_statusLine;
     VoiceMenuModel *m_menu;
 };
 

@@ -1,6 +1,7 @@
 #include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/installation/CZSpeechInstallationManager.h"
@@ -31,9 +32,8 @@ using Cadenza::Testing::TestEnvironment;
 namespace {
 const QString P = QStringLiteral("com.vendra.speech.synthesis.voice.");
 const QString Orin = P + QStringLiteral("Orin");
-const QString VoiceDomain = QStringLiteral("com.vendra.speech.voice.prefs");
-const QString RecognitionDomain
-    = QStringLiteral("com.vendra.speech.recognition.VendraSpeechRecognition.prefs");
+const QString VoiceDomain = Cadenza::SpeechNames::VoicePreferencesDomain;
+const QString RecognitionDomain = Cadenza::SpeechNames::RecognitionPreferencesDomain;
 
 QVariantMap downloadable(
     const QString &name, qint64 desirability, const QString &version = QStringLiteral("1.0"))
@@ -105,15 +105,17 @@ private Q_SLOTS:
     void downloadableVoicesAndTheirStatus()
     {
         m_daemon->setActiveRecords({QVariantMap {{ObjectIDKey, QString(P + QStringLiteral("new.premium"))},
-            {ItemDownloadStatusKey, qint64(3)}, {ItemPercentCompleteKey, 42.0}}});
+            {ItemDownloadStatusKey, qint64(InstallerProtocol::DownloadingStatus)},
+            {ItemPercentCompleteKey, 42.0}}});
         const auto voices = byIdentifier(m_manager->downloadableVoices());
         QVERIFY(!voices.contains(P + QStringLiteral("have.premium"))); // installed
+        QCOMPARE(voices.value(P + QStringLiteral("maren.premium"))->downloadStatus(),
+            qint64(UpgradeAvailableStatus)); // compact twin installed
         QCOMPARE(
-            voices.value(P + QStringLiteral("maren.premium"))->downloadStatus(), 1); // compact twin installed
-        QCOMPARE(voices.value(P + QStringLiteral("new.premium"))->downloadStatus(), 3);
+            voices.value(P + QStringLiteral("new.premium"))->downloadStatus(), qint64(DownloadingStatus));
         QCOMPARE(voices.value(P + QStringLiteral("new.premium"))->downloadPercentComplete(), 42.0);
         // The default voice: installed 1.2, catalogue 1.3: an upgrade, always at full size.
-        QCOMPARE(voices.value(Orin)->downloadStatus(), 1);
+        QCOMPARE(voices.value(Orin)->downloadStatus(), qint64(UpgradeAvailableStatus));
         QVERIFY(voices.value(Orin)->downloadFullSize());
         m_daemon->setActiveRecords({});
         QCOMPARE(byIdentifier(m_manager->downloadableVoices())
@@ -131,7 +133,8 @@ private Q_SLOTS:
             2);
         installVoice(QStringLiteral("new"), QStringLiteral("New"), 5);
         const auto voices = m_manager->downloadableVoices();
-        QCOMPARE(byIdentifier(voices).value(P + QStringLiteral("new.premium"))->downloadStatus(), 1);
+        QCOMPARE(byIdentifier(voices).value(P + QStringLiteral("new.premium"))->downloadStatus(),
+            qint64(UpgradeAvailableStatus));
         const auto plain = CZVoiceObject::initWithVoiceIdentifier(P + QStringLiteral("new"));
         QCOMPARE(m_manager->downloadableVoiceUpgradeForVoice(*plain, voices)->identifier(),
             P + QStringLiteral("new.premium"));
@@ -151,7 +154,7 @@ private Q_SLOTS:
         QVERIFY(!byIdentifier(m_manager->downloadableVoices()).contains(Orin));
         m_speech->removeVoice(Orin);
         const auto voices = byIdentifier(m_manager->downloadableVoices());
-        QCOMPARE(voices.value(Orin)->downloadStatus(), 2);
+        QCOMPARE(voices.value(Orin)->downloadStatus(), qint64(NotInstalledStatus));
         QVERIFY(voices.value(Orin)->downloadFullSize());
     }
 
@@ -186,12 +189,12 @@ private Q_SLOTS:
     void recognitionLanguages()
     {
         m_recognition->setInstalledLanguages(QStringList {QStringLiteral("fr_FR")});
-        m_daemon->setActiveRecords(
-            {QVariantMap {{ObjectIDKey, QStringLiteral("de-de")}, {ItemDownloadStatusKey, qint64(4)}}});
+        m_daemon->setActiveRecords({QVariantMap {{ObjectIDKey, QStringLiteral("de-de")},
+            {ItemDownloadStatusKey, qint64(InstallerProtocol::WaitingStatus)}}});
         const auto items = m_manager->downloadableSRLanguageItems();
         QCOMPARE(items.size(), 1);
         QCOMPARE(items.first()->localeIdentifier(), QStringLiteral("de_DE"));
-        QCOMPARE(items.first()->downloadStatus(), 4);
+        QCOMPARE(items.first()->downloadStatus(), qint64(WaitingStatus));
         items.first()->setShowCountryInDisplayTitle(true);
         QVERIFY(m_manager->startInstallingDownloadableSpeechItems(items, 1));
         QCOMPARE(m_daemon->installRequests().last().value(ItemNameKey).toString(),
@@ -335,7 +338,7 @@ private Q_SLOTS:
 
         // Already running: no second request.
         m_daemon->setActiveRecords({QVariantMap {{ObjectIDKey, QString(P + QStringLiteral("maren.premium"))},
-            {ItemDownloadStatusKey, qint64(3)}}});
+            {ItemDownloadStatusKey, qint64(InstallerProtocol::DownloadingStatus)}}});
         QVERIFY(m_manager->startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(compact));
         QCOMPARE(m_daemon->installRequests().size(), 1);
     }

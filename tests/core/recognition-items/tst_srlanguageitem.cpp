@@ -1,6 +1,7 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/recognition-items/CZSRLanguageItem.h"
@@ -11,6 +12,7 @@
 #include "core/services/RecognitionService.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem_p.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QDir>
 #include <QFile>
@@ -194,15 +196,14 @@ private Q_SLOTS:
         QCOMPARE(CZSRLanguageItem::visibiltyValueForLocaleIdentifier(QStringLiteral("de"), &exists), 2);
         QVERIFY(!exists);
         QTRY_COMPARE(posted.size(), 3); // every write announces, changed or not
-        QCOMPARE(posted.first().at(0).toString(),
-            QStringLiteral("com.vendra.speech.DefaultSRLanguageChangedNotification"));
+        QCOMPARE(posted.first().at(0).toString(), Cadenza::SpeechNames::DefaultSRLanguageChangedNotification);
         QCOMPARE(CZSRLanguageItem::initWithLocaleIdentifier(QStringLiteral("fr_CA"))->visibility(), 0);
     }
 
     void description()
     {
         const auto item = CZSRLanguageItem::initWithLocaleIdentifier(QStringLiteral("de-DE"));
-        item->setDownloadStatus(3);
+        item->setDownloadStatus(InstallerProtocol::DownloadingStatus);
         item->setDownloadPercentComplete(12.5);
         QCOMPARE(item->description(),
             QStringLiteral(

@@ -7,6 +7,7 @@
 #include "core/services/RecognitionService.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem_p.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QTest>
 
@@ -81,12 +82,12 @@ private Q_SLOTS:
     {
         const auto item = m_items.first();
         item->setVisibility(0);
-        item->setDownloadStatus(4);
+        item->setDownloadStatus(InstallerProtocol::WaitingStatus);
         auto row = CZSRLanguageRow::initWithTitle(QStringLiteral("x"), item);
         row->setSelectedUsingLanguageCodeOnlyToSelectItems(false);
         QVERIFY(row->isSelected());
         QCOMPARE(item->visibility(), 1);
-        item->setDownloadStatus(0);
+        item->setDownloadStatus(InstallerProtocol::InstalledStatus);
         for (const auto &[visibility, expected] :
             {std::pair {2, false}, std::pair {1, true}, std::pair {0, false}}) {
             item->setVisibility(visibility);

@@ -9,6 +9,7 @@
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem_p.h"
 #include "core/voices/DownloadableVoice.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QTest>
 
@@ -138,7 +139,7 @@ private Q_SLOTS:
         auto hidden
             = downloadable(QStringLiteral("hidden"), QStringLiteral("Hidden"), QStringLiteral("en_US"));
         hidden->setVisibility(0);
-        hidden->setDownloadStatus(4);
+        hidden->setDownloadStatus(InstallerProtocol::WaitingStatus);
         auto chosen
             = downloadable(QStringLiteral("chosen"), QStringLiteral("Chosen"), QStringLiteral("de_DE"));
         chosen->setVisibility(1);

@@ -1,5 +1,6 @@
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/services/DBusNotificationCenter.h"
 #include "core/services/InProcessNotificationCenter.h"
 
@@ -30,12 +31,11 @@ private Q_SLOTS:
         QSignalSpy spy(center.get(), &DistributedNotificationCenter::notificationPosted);
         const QVariantMap info {
             {QStringLiteral("QLNDObjectID"), QStringLiteral("com.vendra.x")}, {QStringLiteral("n"), 3}};
-        center->postNotification(QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"),
-            QStringLiteral("object"), info);
+        center->postNotification(
+            Cadenza::SpeechNames::DefaultVoiceChangedNotification, QStringLiteral("object"), info);
         QCOMPARE(spy.size(), 0); // never inside the post
         QVERIFY(spy.wait(2000));
-        QCOMPARE(spy.first().at(0).toString(),
-            QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"));
+        QCOMPARE(spy.first().at(0).toString(), Cadenza::SpeechNames::DefaultVoiceChangedNotification);
         QCOMPARE(spy.first().at(1).toString(), QStringLiteral("object"));
         QCOMPARE(spy.first().at(2).toMap(), info);
         QTest::qWait(200);

@@ -1,5 +1,6 @@
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/services/FilePreferencesStore.h"
 #include "core/services/MemoryPreferencesStore.h"
 
@@ -10,7 +11,7 @@
 using namespace Cadenza::Platform;
 
 namespace {
-const QString Domain = QStringLiteral("com.vendra.speech.voice.prefs");
+const QString Domain = Cadenza::SpeechNames::VoicePreferencesDomain;
 }
 
 /**

@@ -1,5 +1,6 @@
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/formats/WaveFile.h"
@@ -76,8 +77,8 @@ public:
     void setSpeechLanguage(const QString &locale) override
     {
         Services::preferences().setValue(
-            SpeechSynthesisService::SpeechLanguageKey, locale, SpeechSynthesisService::PreferencesDomain);
-        QVERIFY(Services::preferences().synchronize(SpeechSynthesisService::PreferencesDomain));
+            SpeechSynthesisService::SpeechLanguageKey, locale, Cadenza::SpeechNames::VoicePreferencesDomain);
+        QVERIFY(Services::preferences().synchronize(Cadenza::SpeechNames::VoicePreferencesDomain));
     }
 };
 
@@ -194,9 +195,10 @@ private Q_SLOTS:
     {
         PreferencesStore &preferences = Services::preferences();
         preferences.setValue(
-            QStringLiteral("SelectedVoiceCreator"), 77, SpeechSynthesisService::PreferencesDomain);
-        preferences.setValue(QStringLiteral("SelectedVoiceID"), 2, SpeechSynthesisService::PreferencesDomain);
-        QVERIFY(preferences.synchronize(SpeechSynthesisService::PreferencesDomain));
+            Cadenza::SpeechNames::SelectedVoiceCreatorKey, 77, Cadenza::SpeechNames::VoicePreferencesDomain);
+        preferences.setValue(
+            Cadenza::SpeechNames::SelectedVoiceIDKey, 2, Cadenza::SpeechNames::VoicePreferencesDomain);
+        QVERIFY(preferences.synchronize(Cadenza::SpeechNames::VoicePreferencesDomain));
         QCOMPARE(m_service->defaultVoice(), P + QStringLiteral("maren.premium"));
     }
 

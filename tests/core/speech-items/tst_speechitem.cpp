@@ -7,6 +7,7 @@
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem.h"
 #include "core/speech-items/CZSpeechItem_p.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QProcess>
 #include <QTest>
@@ -255,7 +256,7 @@ private Q_SLOTS:
         QVERIFY(odd->tagName().isNull());
         QCOMPARE(odd->fullSizeByteSize(), 77u);
         QCOMPARE(odd->version(), QStringLiteral("2.0"));
-        QCOMPARE(odd->downloadStatus(), 0);
+        QCOMPARE(odd->downloadStatus(), qint64(InstallerProtocol::InstalledStatus));
         QCOMPARE(odd->visibility(), 0);
     }
 

@@ -1,5 +1,6 @@
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/services/FakeSpeechSynthesisService.h"
 #include "core/services/FakeUserLocaleService.h"
 #include "core/services/MemoryPreferencesStore.h"
@@ -14,7 +15,7 @@ using Cadenza::Testing::TestEnvironment;
 
 namespace {
 const QString P = QStringLiteral("com.vendra.speech.synthesis.voice.");
-const QString Domain = QStringLiteral("com.vendra.speech.voice.prefs");
+const QString Domain = Cadenza::SpeechNames::VoicePreferencesDomain;
 // 40 characters: long enough for prefix matching.
 const QString X = QStringLiteral("com.vendra.speech.synthesis.voice.x12345");
 } // namespace
@@ -57,8 +58,8 @@ private Q_SLOTS:
 
     void defaultVoiceFollowsTheStoredSpec()
     {
-        m_preferences->setValue(QStringLiteral("SelectedVoiceCreator"), 5, Domain);
-        m_preferences->setValue(QStringLiteral("SelectedVoiceID"), 2, Domain);
+        m_preferences->setValue(Cadenza::SpeechNames::SelectedVoiceCreatorKey, 5, Domain);
+        m_preferences->setValue(Cadenza::SpeechNames::SelectedVoiceIDKey, 2, Domain);
         QVERIFY(m_preferences->synchronize(Domain));
         QCOMPARE(SpeechSynthesizer::defaultVoiceFromAllVoices(), P + QStringLiteral("maren.compact"));
         // The ordinary default names the same voice in its best quality.
@@ -72,7 +73,7 @@ private Q_SLOTS:
         attributes.insert(QStringLiteral("VoiceCreator"), 9);
         attributes.insert(QStringLiteral("VoiceID"), 0);
         m_service->addVoice(attributes);
-        m_preferences->setValue(QStringLiteral("SelectedVoiceCreator"), 9, Domain);
+        m_preferences->setValue(Cadenza::SpeechNames::SelectedVoiceCreatorKey, 9, Domain);
         QVERIFY(m_preferences->synchronize(Domain));
         QCOMPARE(SpeechSynthesizer::defaultVoiceFromAllVoices(), P + QStringLiteral("zero"));
     }
@@ -125,8 +126,8 @@ private Q_SLOTS:
 
     void storedSpecOfNoVoiceFallsThrough()
     {
-        m_preferences->setValue(QStringLiteral("SelectedVoiceCreator"), 5, Domain);
-        m_preferences->setValue(QStringLiteral("SelectedVoiceID"), 99, Domain);
+        m_preferences->setValue(Cadenza::SpeechNames::SelectedVoiceCreatorKey, 5, Domain);
+        m_preferences->setValue(Cadenza::SpeechNames::SelectedVoiceIDKey, 99, Domain);
         QVERIFY(m_preferences->synchronize(Domain));
         m_service->setSpeechLanguageLocale(QStringLiteral("de_DE"));
         QCOMPARE(SpeechSynthesizer::defaultVoiceFromAllVoices(), P + QStringLiteral("liesel.compact"));
@@ -134,8 +135,8 @@ private Q_SLOTS:
 
     void storedSpecOfTheWrongTypeIsIgnored()
     {
-        m_preferences->setValue(QStringLiteral("SelectedVoiceCreator"), QStringLiteral("5"), Domain);
-        m_preferences->setValue(QStringLiteral("SelectedVoiceID"), 2, Domain);
+        m_preferences->setValue(Cadenza::SpeechNames::SelectedVoiceCreatorKey, QStringLiteral("5"), Domain);
+        m_preferences->setValue(Cadenza::SpeechNames::SelectedVoiceIDKey, 2, Domain);
         QVERIFY(m_preferences->synchronize(Domain));
         m_service->setSpeechLanguageLocale(QStringLiteral("de_DE"));
         QCOMPARE(SpeechSynthesizer::defaultVoiceFromAllVoices(), P + QStringLiteral("liesel.compact"));

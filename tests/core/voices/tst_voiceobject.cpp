@@ -1,5 +1,6 @@
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/locale/LocalizationTable.h"
 #include "core/services/FakeSpeechSynthesisService.h"
 #include "core/services/FakeUserLocaleService.h"
@@ -110,14 +111,13 @@ private Q_SLOTS:
         CZVoiceObject::setVisibleVoicesTable({{P + QStringLiteral("a"), 1}});
         QVERIFY(m_preferences->synchronizeCount() > before);
         QCOMPARE(m_preferences->backing()
-                     ->value(CZVoiceObject::PreferencesDomain)
+                     ->value(Cadenza::SpeechNames::VoicePreferencesDomain)
                      .value(QStringLiteral("VisibleIdentifiers"))
                      .toMap()
                      .size(),
             1);
         QVERIFY(posted.wait(1000));
-        QCOMPARE(posted.first().at(0).toString(),
-            QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification"));
+        QCOMPARE(posted.first().at(0).toString(), Cadenza::SpeechNames::DefaultVoiceChangedNotification);
         QVERIFY(posted.first().at(1).toString().isEmpty());
     }
 
@@ -180,8 +180,10 @@ private Q_SLOTS:
         us.insert(QStringLiteral("VoiceCreator"), 3);
         us.insert(QStringLiteral("VoiceID"), 4);
         m_speech->addVoice(us);
-        m_preferences->setValue(QStringLiteral("SelectedVoiceCreator"), 3, CZVoiceObject::PreferencesDomain);
-        m_preferences->setValue(QStringLiteral("SelectedVoiceID"), 4, CZVoiceObject::PreferencesDomain);
+        m_preferences->setValue(
+            Cadenza::SpeechNames::SelectedVoiceCreatorKey, 3, Cadenza::SpeechNames::VoicePreferencesDomain);
+        m_preferences->setValue(
+            Cadenza::SpeechNames::SelectedVoiceIDKey, 4, Cadenza::SpeechNames::VoicePreferencesDomain);
         addVoice(QStringLiteral("gb"), QStringLiteral("Gb"), QStringLiteral("en_GB"));
         addVoice(QStringLiteral("de"), QStringLiteral("De"), QStringLiteral("de_DE"));
         QCOMPARE(

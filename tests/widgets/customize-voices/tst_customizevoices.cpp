@@ -1,6 +1,7 @@
 #include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/services/BundleSpeechSynthesisService.h"
@@ -19,6 +20,7 @@
 #include "widgets/customize-voices/CZVoiceRowCheckboxButton.h"
 #include "widgets/customize-voices/CZVoiceRowTextView.h"
 #include "widgets/customize-voices/CustomizeVoicesWindowController.h"
+#include "widgets/customize-voices/CustomizeVoicesWindowController_p.h"
 #include "widgets/customize-voices/VoiceTableCellView.h"
 #include "widgets/helpers/Alert.h"
 #include "widgets/installation/CZSpeechInstallationManagerSheets.h"
@@ -43,7 +45,7 @@ using Cadenza::Testing::TestEnvironment;
 
 namespace {
 const QString P = QStringLiteral("com.vendra.speech.synthesis.voice.");
-const QString Domain = QStringLiteral("com.vendra.speech.voice.prefs");
+const QString Domain = Cadenza::SpeechNames::VoicePreferencesDomain;
 
 QVariantMap downloadable(
     const QString &name, const QString &locale, const QString &fullSizeIdentifier = QString())
@@ -154,13 +156,13 @@ private Q_SLOTS:
         QCOMPARE(iris->downloadVariantPopUpButton()->currentIndex(), 0);
         QCOMPARE(
             m_controller->voiceSelectionTableView()->currentIndex().row(), rowIndex(QStringLiteral("Iris")));
-        m_controller->_updateButtonStates();
+        CustomizeVoicesWindowControllerPrivate::get(m_controller.get())->_updateButtonStates();
         QCOMPARE(
             label("selectedDownloadSizeTextField")->text(), QStringLiteral("Selected download size: 2 MB"));
         // The full size adds its own bytes instead.
         iris->downloadVariantPopUpButton()->setCurrentIndex(1);
         Q_EMIT iris->downloadVariantPopUpButton()->activated(1);
-        m_controller->_updateButtonStates();
+        CustomizeVoicesWindowControllerPrivate::get(m_controller.get())->_updateButtonStates();
         QCOMPARE(
             label("selectedDownloadSizeTextField")->text(), QStringLiteral("Selected download size: 9 MB"));
 
@@ -189,7 +191,7 @@ private Q_SLOTS:
         QTRY_VERIFY_WITH_TIMEOUT(std::any_of(notified.cbegin(), notified.cend(),
                                      [](const QList<QVariant> &args) {
                                          return args.first().toString()
-                                             == u"com.vendra.speech.DefaultVoiceChangedNotification";
+                                             == Cadenza::SpeechNames::DefaultVoiceChangedNotification;
                                      }),
             4000);
     }
@@ -260,9 +262,10 @@ private Q_SLOTS:
 
     void removingTheDefaultVoiceForgetsIt()
     {
-        Services::preferences().setValue(QStringLiteral("SelectedVoiceCreator"), 1, Domain);
-        Services::preferences().setValue(QStringLiteral("SelectedVoiceID"), 77, Domain);
-        Services::preferences().setValue(QStringLiteral("SelectedVoiceName"), QStringLiteral("Nora"), Domain);
+        Services::preferences().setValue(Cadenza::SpeechNames::SelectedVoiceCreatorKey, 1, Domain);
+        Services::preferences().setValue(Cadenza::SpeechNames::SelectedVoiceIDKey, 77, Domain);
+        Services::preferences().setValue(
+            Cadenza::SpeechNames::SelectedVoiceNameKey, QStringLiteral("Nora"), Domain);
         // Nora, the premium voice of the user's language, is the default.
         QCOMPARE(SpeechSynthesizer::defaultVoiceFromMainstreamVoices(), P + QStringLiteral("nora.premium"));
         show();
@@ -270,9 +273,10 @@ private Q_SLOTS:
         m_alertAnswer = 0;
         button("okButton")->click();
         QTest::qWait(50);
-        QVERIFY(!Services::preferences().value(QStringLiteral("SelectedVoiceCreator"), Domain).isValid());
-        QVERIFY(!Services::preferences().value(QStringLiteral("SelectedVoiceID"), Domain).isValid());
-        QVERIFY(!Services::preferences().value(QStringLiteral("SelectedVoiceName"), Domain).isValid());
+        QVERIFY(
+            !Services::preferences().value(Cadenza::SpeechNames::SelectedVoiceCreatorKey, Domain).isValid());
+        QVERIFY(!Services::preferences().value(Cadenza::SpeechNames::SelectedVoiceIDKey, Domain).isValid());
+        QVERIFY(!Services::preferences().value(Cadenza::SpeechNames::SelectedVoiceNameKey, Domain).isValid());
     }
 
     void downloadingRowsAreTickedAndGreyed()
@@ -280,7 +284,7 @@ private Q_SLOTS:
         m_daemon->setActiveRecords(
             {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("femke.compact"))},
                 {InstallerProtocol::TagNameKey, QStringLiteral("VOICEID:Femke Compact")},
-                {InstallerProtocol::ItemDownloadStatusKey, qint64(3)},
+                {InstallerProtocol::ItemDownloadStatusKey, qint64(InstallerProtocol::DownloadingStatus)},
                 {InstallerProtocol::ItemPercentCompleteKey, 0.7}}});
         show();
         VoiceTableCellView *femke = view(QStringLiteral("Femke"));
@@ -290,7 +294,7 @@ private Q_SLOTS:
         QCOMPARE(femke->downloadMessageTextField()->text(), QStringLiteral("Downloading"));
         m_daemon->setActiveRecords(
             {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("femke.compact"))},
-                {InstallerProtocol::ItemDownloadStatusKey, qint64(3)},
+                {InstallerProtocol::ItemDownloadStatusKey, qint64(InstallerProtocol::DownloadingStatus)},
                 {InstallerProtocol::ItemPercentCompleteKey, 45.9}}});
         // The 2-second poll brings the percentage.
         QTRY_COMPARE_WITH_TIMEOUT(
@@ -329,8 +333,10 @@ private Q_SLOTS:
         const DownloadableVoicePtr recorded
             = DownloadableVoice::initWithVoiceID(P + QStringLiteral("femke.compact"),
                 downloadable(QStringLiteral("Femke Compact"), QStringLiteral("nl_NL")));
-        QVERIFY(m_controller->_isSampleAvailableForVoiceObject(recorded));
-        QVERIFY(!m_controller->_isSampleAvailableForVoiceObject(nullptr));
+        QVERIFY(CustomizeVoicesWindowControllerPrivate::get(m_controller.get())
+                    ->_isSampleAvailableForVoiceObject(recorded));
+        QVERIFY(!CustomizeVoicesWindowControllerPrivate::get(m_controller.get())
+                     ->_isSampleAvailableForVoiceObject(nullptr));
 
         table->selectRow(rowIndex(QStringLiteral("Maren")));
         QVERIFY(play->isEnabled());
@@ -338,7 +344,7 @@ private Q_SLOTS:
         QCOMPARE(play->text(), QStringLiteral("Stop"));
         play->click();
         QCOMPARE(play->text(), QStringLiteral("Play"));
-        QVERIFY(!m_controller->_anyVoicePlaying());
+        QVERIFY(!CustomizeVoicesWindowControllerPrivate::get(m_controller.get())->_anyVoicePlaying());
     }
 
     void sheetTicksAgreeWithTheMenusForEverySampleLocale_data()
@@ -398,7 +404,8 @@ private Q_SLOTS:
         for (const VoiceTableRowPtr &entry : m_controller->currentlyDisplayedVoiceRows()) {
             // Rows of installed voices, and of upgrades that stand for one; other downloads are not in menus.
             if (entry->isGroupRow()
-                || (entry->voiceObject()->isDownloadable() && entry->voiceObject()->downloadStatus() != 1)) {
+                || (entry->voiceObject()->isDownloadable()
+                    && entry->voiceObject()->downloadStatus() != InstallerProtocol::UpgradeAvailableStatus)) {
                 continue;
             }
             ++installedRows;
@@ -434,7 +441,7 @@ private Q_SLOTS:
         QTRY_VERIFY_WITH_TIMEOUT(play->text() == QStringLiteral("Stop") || Alert::beepCount() == 1, 10000);
         if (Alert::beepCount() == 1) {
             QCOMPARE(play->text(), QStringLiteral("Play"));
-            QVERIFY(!m_controller->_anyVoicePlaying());
+            QVERIFY(!CustomizeVoicesWindowControllerPrivate::get(m_controller.get())->_anyVoicePlaying());
         } else {
             play->click();
             QCOMPARE(play->text(), QStringLiteral("Play"));
@@ -459,7 +466,7 @@ private Q_SLOTS:
         QCOMPARE(titles, QStringList {QStringLiteral("Play")}); // never showed Stop
         QTest::qWait(10);
         QCOMPARE(play->text(), QStringLiteral("Play"));
-        QVERIFY(!m_controller->_anyVoicePlaying());
+        QVERIFY(!CustomizeVoicesWindowControllerPrivate::get(m_controller.get())->_anyVoicePlaying());
 
         // One that plays shows Stop until it ends, or until Stop is pressed.
         sound->setOutcome(FakeSoundService::Outcome::Plays);

@@ -4,6 +4,7 @@
 #include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/services/BundleSpeechSynthesisService.h"
 #include "core/services/FakeMessagePortService.h"
@@ -39,7 +40,7 @@ using Cadenza::Testing::TestEnvironment;
 
 namespace {
 const QString P = QStringLiteral("com.vendra.speech.synthesis.voice.");
-const QString Domain = QStringLiteral("com.vendra.speech.voice.prefs");
+const QString Domain = Cadenza::SpeechNames::VoicePreferencesDomain;
 
 QVariantMap downloadable(
     const QString &name, const QString &locale, const QString &fullSizeIdentifier = QString())
@@ -202,7 +203,9 @@ private Q_SLOTS:
         QCOMPARE(QApplication::focusWidget(), table);
         // No control inside a row is a tab stop of its own.
         for (QWidget *inside : table->viewport()->findChildren<QWidget *>()) {
-            QVERIFY2(!(inside->focusPolicy() & Qt::TabFocus), qPrintable(inside->objectName()));
+            QVERIFY2(!(inside->focusPolicy() & Qt::TabFocus),
+                qPrintable(inside->objectName() + QLatin1Char(' ')
+                    + QLatin1String(inside->metaObject()->className())));
         }
     }
 

@@ -12,6 +12,7 @@
 #include "protocol/InstallerProtocol.h"
 #include "widgets/customize-voices/CZVoiceRowCheckboxButton.h"
 #include "widgets/customize-voices/CustomizeVoicesWindowController.h"
+#include "widgets/customize-voices/CustomizeVoicesWindowController_p.h"
 #include "widgets/customize-voices/VoiceTableCellView.h"
 #include "widgets/helpers/SizeVariants.h"
 #include "widgets/installation/CZSpeechInstallationManagerSheets.h"
@@ -172,7 +173,8 @@ private Q_SLOTS:
             = sheet->currentlyDisplayedVoiceRows().value(rowOf(sheet, TobiasCompact));
         QVERIFY(downloading);
         const qint64 status = downloading->voiceObject()->downloadStatus();
-        QVERIFY2(status == 3 || status == 4, qPrintable(QString::number(status)));
+        QVERIFY2(status == InstallerProtocol::DownloadingStatus || status == InstallerProtocol::WaitingStatus,
+            qPrintable(QString::number(status)));
         QVERIFY(std::static_pointer_cast<DownloadableVoice>(downloading->voiceObject())->downloadFullSize());
         QVERIFY(downloading->isSelected());
         sheet->cancelVoiceSelection();
@@ -211,11 +213,11 @@ private Q_SLOTS:
                 ++tobiasRows;
                 QCOMPARE(row->voiceObject()->identifier(), TobiasPremium);
                 QVERIFY(row->isSelected());
-                QCOMPARE(row->voiceObject()->downloadStatus(), 0);
+                QCOMPARE(row->voiceObject()->downloadStatus(), qint64(InstallerProtocol::InstalledStatus));
             }
         }
         QCOMPARE(tobiasRows, 1);
-        sheet->_updateButtonStates();
+        CustomizeVoicesWindowControllerPrivate::get(sheet)->_updateButtonStates();
         QVERIFY(sheet->window()
                     ->findChild<QLabel *>(QStringLiteral("selectedDownloadSizeTextField"))
                     ->text()

@@ -1,6 +1,7 @@
 #include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/services/DBusNotificationCenter.h"
 #include "core/services/FakeMessagePortService.h"
 #include "core/services/FakeSpeechSynthesisService.h"
@@ -299,7 +300,7 @@ private Q_SLOTS:
         m_daemon->setActiveRecords(
             {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("nora.premium"))},
                 {InstallerProtocol::TagNameKey, QStringLiteral("VOICEID:Nora Premium")},
-                {InstallerProtocol::ItemDownloadStatusKey, qint64(3)}}});
+                {InstallerProtocol::ItemDownloadStatusKey, qint64(InstallerProtocol::DownloadingStatus)}}});
         CZVoicePopUpButton popUp;
         popUp.buildPopUpButtonWithSelectVoiceIdentifier(P + QStringLiteral("maren.compact"));
         const int row = titles(popUp).indexOf(QStringLiteral("Nora (Downloading)"));
@@ -310,7 +311,7 @@ private Q_SLOTS:
         m_daemon->setActiveRecords(
             {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("maren.premium"))},
                 {InstallerProtocol::TagNameKey, QStringLiteral("VOICEID:Maren Premium")},
-                {InstallerProtocol::ItemDownloadStatusKey, qint64(4)}}});
+                {InstallerProtocol::ItemDownloadStatusKey, qint64(InstallerProtocol::WaitingStatus)}}});
         CZVoicePopUpButton::_forceAllVoicePopupsToUpdate();
         QCOMPARE(titles(popUp).filter(QStringLiteral("Maren")), QStringList {QStringLiteral("Maren")});
         // Listing every quality shows it, disabled, under its full name.
@@ -358,7 +359,7 @@ private Q_SLOTS:
             {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("nora.premium"))},
                 {InstallerProtocol::TagNameKey, QStringLiteral("VOICEID:Nora Premium")},
                 {InstallerProtocol::ItemNameKey, QStringLiteral("Nora")},
-                {InstallerProtocol::ItemSoftwareUpdateStateKey, qint64(2)},
+                {InstallerProtocol::ItemSoftwareUpdateStateKey, qint64(InstallerProtocol::DownloadingState)},
                 {InstallerProtocol::ItemSecondsRemainingKey, 30.0},
                 {InstallerProtocol::ItemByteSizeKey, qint64(1000)},
                 {InstallerProtocol::ItemDownloadByteCountKey, qint64(100)}}});
@@ -393,12 +394,12 @@ private Q_SLOTS:
         QVariantMap table = *CZVoiceObject::visibleVoicesTable();
         table.insert(P + QStringLiteral("giulia.compact"), 1);
         Services::preferences().setValue(
-            CZVoiceObject::VisibleIdentifiersKey, table, QStringLiteral("com.vendra.speech.voice.prefs"));
+            CZVoiceObject::VisibleIdentifiersKey, table, Cadenza::SpeechNames::VoicePreferencesDomain);
         QTest::qWait(100);
         QVERIFY(!titles(popUp).contains(QStringLiteral("Giulia")));
         QProcess poster;
         poster.start(QStringLiteral(CADENZA_CLI_PATH),
-            {QStringLiteral("post"), QStringLiteral("com.vendra.speech.DefaultVoiceChangedNotification")});
+            {QStringLiteral("post"), Cadenza::SpeechNames::DefaultVoiceChangedNotification});
         QVERIFY(poster.waitForFinished(10000));
         QCOMPARE(poster.exitCode(), 0);
         QTRY_VERIFY(titles(popUp).contains(QStringLiteral("Giulia")));
