@@ -3,10 +3,10 @@
 
 #include "BenchTable.h"
 
-#include "platform/FakeSpeechSynthesisService.h"
-#include "platform/FakeUserLocaleService.h"
-#include "platform/InProcessNotificationCenter.h"
-#include "platform/MemoryPreferencesStore.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "InProcessNotificationCenter.h"
+#include "MemoryPreferencesStore.h"
 #include "platform/Services.h"
 #include "voices/CZVoiceObject.h"
 

@@ -3,7 +3,7 @@
 
 #include "SettingsWindow.h"
 
-#include "platform/FakeUserLocaleService.h"
+#include "FakeUserLocaleService.h"
 #include "platform/Paths.h"
 #include "platform/Services.h"
 #include "speech-items/CZSpeechItem.h"

@@ -4,7 +4,7 @@
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/InstallerProtocol.h"
 #include "installation/SecureArchiving.h"
-#include "platform/FakeMessagePortService.h"
+#include "FakeMessagePortService.h"
 #include "platform/KeyedArchive.h"
 #include "platform/Services.h"
 

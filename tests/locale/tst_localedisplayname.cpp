@@ -3,7 +3,7 @@
 #include "locale/LocaleDisplayName.h"
 #include "locale/LocaleDisplayName_p.h"
 #include "platform/Assertion.h"
-#include "platform/FakeUserLocaleService.h"
+#include "FakeUserLocaleService.h"
 #include "platform/LocalizationTable.h"
 #include "platform/Services.h"
 

@@ -1,6 +1,6 @@
 #include "TestEnvironment.h"
 
-#include "platform/FakeUserLocaleService.h"
+#include "FakeUserLocaleService.h"
 #include "platform/LocalizationTable.h"
 #include "platform/Services.h"
 

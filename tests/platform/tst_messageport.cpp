@@ -1,6 +1,6 @@
 #include "TestEnvironment.h"
 
-#include "platform/FakeMessagePortService.h"
+#include "FakeMessagePortService.h"
 #include "platform/MessageFrame.h"
 #include "platform/Paths.h"
 #include "platform/UnixMessagePortService.h"

@@ -1,7 +1,7 @@
 #include "TestEnvironment.h"
 
 #include "platform/DBusNotificationCenter.h"
-#include "platform/InProcessNotificationCenter.h"
+#include "InProcessNotificationCenter.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>

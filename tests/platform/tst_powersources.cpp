@@ -1,4 +1,5 @@
 #include "TestEnvironment.h"
+#include "FakePowerSourcesInfo.h"
 
 #include "installation/CZSpeechInstallationManager.h"
 #include "platform/Paths.h"

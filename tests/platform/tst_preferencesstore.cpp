@@ -1,7 +1,7 @@
 #include "TestEnvironment.h"
 
 #include "platform/FilePreferencesStore.h"
-#include "platform/MemoryPreferencesStore.h"
+#include "MemoryPreferencesStore.h"
 
 #include <QDir>
 #include <QFile>

@@ -1,7 +1,7 @@
 // Sound playback never holds up the caller's event loop, whatever the media backend does.
 #include "TestEnvironment.h"
 
-#include "platform/FakeSoundService.h"
+#include "FakeSoundService.h"
 #include "platform/MediaSoundService.h"
 
 #include <QFile>

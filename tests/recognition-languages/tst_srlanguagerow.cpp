@@ -1,8 +1,9 @@
 #include "TestEnvironment.h"
+#include "FakeRecognitionService.h"
 
-#include "platform/FakeSpeechSynthesisService.h"
-#include "platform/FakeUserLocaleService.h"
-#include "platform/MemoryPreferencesStore.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "MemoryPreferencesStore.h"
 #include "platform/RecognitionService.h"
 #include "platform/Services.h"
 #include "recognition-languages/CZSRLanguageRow.h"

@@ -1,9 +1,9 @@
 #include "TestEnvironment.h"
 
-#include "platform/FakeSpeechSynthesisService.h"
-#include "platform/FakeUserLocaleService.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
 #include "platform/LocalizationTable.h"
-#include "platform/MemoryPreferencesStore.h"
+#include "MemoryPreferencesStore.h"
 #include "platform/Services.h"
 #include "speech-items/CZSpeechItem.h"
 #include "speech-items/CZSpeechItem_p.h"

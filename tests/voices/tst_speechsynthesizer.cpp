@@ -1,8 +1,8 @@
 #include "TestEnvironment.h"
 
-#include "platform/FakeSpeechSynthesisService.h"
-#include "platform/FakeUserLocaleService.h"
-#include "platform/MemoryPreferencesStore.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "MemoryPreferencesStore.h"
 #include "platform/Services.h"
 #include "voices/SpeechSynthesizer.h"
 

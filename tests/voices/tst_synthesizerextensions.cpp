@@ -1,9 +1,9 @@
 #include "TestEnvironment.h"
 
 #include "platform/BundleSpeechSynthesisService.h"
-#include "platform/FakeSpeechSynthesisService.h"
-#include "platform/FakeUserLocaleService.h"
-#include "platform/MemoryPreferencesStore.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "MemoryPreferencesStore.h"
 #include "platform/Services.h"
 #include "platform/WaveFile.h"
 #include "voices/SpeechSynthesizer.h"

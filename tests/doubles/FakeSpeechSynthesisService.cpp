@@ -1,7 +1,7 @@
 #include "FakeSpeechSynthesisService.h"
 
-#include "Logging.h"
-#include "WaveFile.h"
+#include "platform/Logging.h"
+#include "platform/WaveFile.h"
 
 #include <QTimer>
 
