@@ -7,12 +7,12 @@
 
 #include "BenchTable.h"
 
-#include "customize-voices/CustomizeVoicesWindowController.h"
 #include "FakeMessagePortService.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
+#include "customize-voices/CustomizeVoicesWindowController.h"
 #include "platform/Services.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-popup/CZVoicePopUpButton_p.h"
@@ -76,7 +76,7 @@ void measureMenu(int count)
     popUp.buildPopUpButtonWithSelectVoiceIdentifier(QStringLiteral("com.vendra.bench.voice00000"));
     // Emptying the shared menu makes the pop-up rebuild it and adopt the new one.
     const std::vector<double> build
-        = samplesOf(5, [&] { CZVoicePopUpButton::_forceAllVoicePopupsToUpdate(); });
+        = samplesOf(5, [&] { CZVoicePopUpButtonPrivate::_forceAllVoicePopupsToUpdate(); });
     const std::string n = " (" + std::to_string(count) + " voices, 40 languages)";
     printTable(("Shared voice menu" + n).c_str(),
         {{"build the shared menu and adopt it, ms", median(build) * 1e3, "ms",

@@ -1,5 +1,7 @@
 #include "CZSRLanguagePopUpButton.h"
 
+#include "CZSRLanguagePopUpButton_p.h"
+
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
 #include "installation/InstallerProtocol.h"
@@ -54,13 +56,20 @@ QString tagOf(const QVariantMap &record)
 }
 } // namespace
 
+CZSRLanguagePopUpButtonPrivate::CZSRLanguagePopUpButtonPrivate(CZSRLanguagePopUpButton *q)
+    : q(q)
+    , m_downloadDisplayManager(std::make_unique<CZDownloadDisplayManager>())
+    , m_menu(new VoiceMenuModel(q))
+{ }
+
+CZSRLanguagePopUpButtonPrivate::~CZSRLanguagePopUpButtonPrivate() = default;
+
 CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
     : Platform::PopUpButton(parent)
-    , m_downloadDisplayManager(std::make_unique<CZDownloadDisplayManager>())
-    , m_menu(new VoiceMenuModel(this))
+    , d(std::make_unique<CZSRLanguagePopUpButtonPrivate>(this))
 {
     setObjectName(QStringLiteral("srLanguagePopUpButton"));
-    setModel(m_menu);
+    setModel(d->m_menu);
     setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
     setMinimumContentsLength(24);
     setEnabled(false); // the client enables it once it has built the menu
@@ -73,12 +82,12 @@ CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
                     || name == Protocol::StartedInstallationNotification
                     || name == LanguagePreferencesChangedNotification
                     || name == NumberPreferencesChangedNotification) {
-                    _startDelayedPopUpUpdate();
+                    d->_startDelayedPopUpUpdate();
                 } else if (name == Protocol::FinishedInstallationNotification) {
                     installationFinished(userInfo.value(Protocol::ObjectIDKey).toString());
                 } else if (name == WillStartListeningNotification
                     || name == RecognizerDidPreHeatNotification) {
-                    _clearDownloadStatusFieldAfterPreHeat();
+                    d->_clearDownloadStatusFieldAfterPreHeat();
                 }
             });
     }
@@ -87,14 +96,54 @@ CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
 
 CZSRLanguagePopUpButton::~CZSRLanguagePopUpButton() = default;
 
+QString CZSRLanguagePopUpButton::previouslyChosenLocaleIdentifier() const
+{
+    return d->m_previouslyChosenLocaleIdentifier;
+}
+
+void CZSRLanguagePopUpButton::setPreviouslyChosenLocaleIdentifier(const QString &locale)
+{
+    d->m_previouslyChosenLocaleIdentifier = locale;
+}
+
+std::optional<QStringList> CZSRLanguagePopUpButton::networkBasedLocaleIdentifiers() const
+{
+    return d->m_network;
+}
+
+void CZSRLanguagePopUpButton::setNetworkBasedLocaleIdentifiers(const std::optional<QStringList> &locales)
+{
+    d->m_network = locales;
+}
+
+std::optional<QStringList> CZSRLanguagePopUpButton::offlineBasedLocaleIdentifiers() const
+{
+    return d->m_offline;
+}
+
+void CZSRLanguagePopUpButton::setOfflineBasedLocaleIdentifiers(const std::optional<QStringList> &locales)
+{
+    d->m_offline = locales;
+}
+
+bool CZSRLanguagePopUpButton::languagesAreDownloadable() const
+{
+    return d->m_languagesAreDownloadable;
+}
+
+void CZSRLanguagePopUpButton::setLanguagesAreDownloadable(bool downloadable)
+{
+    d->m_languagesAreDownloadable = downloadable;
+}
+
 void CZSRLanguagePopUpButton::setDownloadStatusTextField(QLabel *textField)
 {
-    m_downloadStatusTextField = textField;
+    d->m_downloadStatusTextField = textField;
 }
 
 void CZSRLanguagePopUpButton::setDownloadStatusProgressIndicator(QProgressBar *indicator)
 {
-    m_downloadStatusProgressIndicator = indicator;
+    d->m_downloadStatusProgressIndicator = indicator;
     if (indicator) {
         indicator->setRange(0, 0);
         indicator->setTextVisible(false);
@@ -112,10 +161,10 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
 {
     // A copy: rebuilds pass the remembered locale itself, which is cleared below.
     const QString localeIdentifier = requestedLocaleIdentifier;
-    m_network = networkSupportedLocaleIdentifiers;
-    m_offline = offlineSupportedLocaleIdentifiers;
-    const QList<CZSRLanguageItemPtr> candidates = m_network
-        ? CZSRLanguageItem::languageItemsFromLocaleIdentifiers(*m_network)
+    d->m_network = networkSupportedLocaleIdentifiers;
+    d->m_offline = offlineSupportedLocaleIdentifiers;
+    const QList<CZSRLanguageItemPtr> candidates = d->m_network
+        ? CZSRLanguageItem::languageItemsFromLocaleIdentifiers(*d->m_network)
         : CZSRLanguageItem::availableLocalRecognizerLanguageItems();
     QList<CZSRLanguageItemPtr> visible;
     for (const CZSpeechItemPtr &item :
@@ -123,7 +172,7 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
         visible.append(std::static_pointer_cast<CZSRLanguageItem>(item));
     }
     const QString system = CZSpeechItem::systemLocaleIdentifier();
-    const QStringList known = m_network ? *m_network : m_offline.value_or(QStringList());
+    const QStringList known = d->m_network ? *d->m_network : d->m_offline.value_or(QStringList());
     if (visible.isEmpty() && CZSpeechItem::isLocaleIdentifier(system, known)) {
         visible = CZSRLanguageItem::languageItemsFromLocaleIdentifiers({system});
     }
@@ -139,12 +188,12 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
         visible = CZSRLanguageItem::languageItemsFromLocaleIdentifiers({EnUS}); // never without a language
     }
 
-    m_rows = CZSRLanguageRow::arrangedRowsFromSRLanguageItems(visible, false, false, false);
+    d->m_rows = CZSRLanguageRow::arrangedRowsFromSRLanguageItems(visible, false, false, false);
     QList<Item> items;
     CZSRLanguageRowPtr matchRequested, matchSystem, matchSystemLanguage, matchEnUS;
     const QString downloadingFormat = texts().text(QStringLiteral("DownloadingItemFormat"));
-    for (qsizetype i = 0; i < m_rows.size(); ++i) {
-        const CZSRLanguageRowPtr &row = m_rows.at(i);
+    for (qsizetype i = 0; i < d->m_rows.size(); ++i) {
+        const CZSRLanguageRowPtr &row = d->m_rows.at(i);
         const CZSRLanguageItemPtr item = row->srLanguageItem();
         item->setShowCountryInDisplayTitle(true);
         Item entry;
@@ -167,48 +216,49 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
             matchEnUS = row;
         }
     }
-    m_numberOfFixedItemsAtEndOfMenu = 1;
+    d->m_numberOfFixedItemsAtEndOfMenu = 1;
     Item command;
     command.title = texts().text(QStringLiteral("CustomizeMenuItem"));
-    if (!m_rows.isEmpty()) {
+    if (!d->m_rows.isEmpty()) {
         items.append(Item::makeSeparator());
-        m_numberOfFixedItemsAtEndOfMenu = 2;
-        if (m_rows.size() == 1) {
+        d->m_numberOfFixedItemsAtEndOfMenu = 2;
+        if (d->m_rows.size() == 1) {
             command.title = texts().text(QStringLiteral("AddLanguageMenuItem"));
         }
     }
     items.append(command);
-    m_menu->setItems({}, items);
+    d->m_menu->setItems({}, items);
 
-    m_previouslyChosenLocaleIdentifier.clear();
+    d->m_previouslyChosenLocaleIdentifier.clear();
     if (matchRequested) {
         setCurrentIndex(int(matchRequested->tableIndex()));
-        m_previouslyChosenLocaleIdentifier = localeIdentifier;
+        d->m_previouslyChosenLocaleIdentifier = localeIdentifier;
     } else if (const CZSRLanguageRowPtr fallback
         = matchSystem ? matchSystem : (matchSystemLanguage ? matchSystemLanguage : matchEnUS)) {
         setCurrentIndex(int(fallback->tableIndex()));
     }
-    _updateDownloadStatusFields();
+    d->_updateDownloadStatusFields();
 }
 
 CZSRLanguageItemPtr CZSRLanguagePopUpButton::selectedLanguageItem() const
 {
     const int index = currentIndex();
-    return index >= 0 && index < m_rows.size() ? m_rows.at(index)->srLanguageItem() : nullptr;
+    return index >= 0 && index < d->m_rows.size() ? d->m_rows.at(index)->srLanguageItem() : nullptr;
 }
 
 bool CZSRLanguagePopUpButton::sendAction()
 {
     const quint32 selected = quint32(currentIndex());
     const quint32 itemCount = quint32(count());
-    if (itemCount >= quint32(m_numberOfFixedItemsAtEndOfMenu) && selected == itemCount - 1) {
+    if (itemCount >= quint32(d->m_numberOfFixedItemsAtEndOfMenu) && selected == itemCount - 1) {
         CZSpeechInstallationManagerSheets::showSRLanguagesSelectionSheetForWindow(
-            window(), m_network, m_previouslyChosenLocaleIdentifier, m_languagesAreDownloadable);
-        buildPopUpButtonAndSelectLocaleIdentifier(m_previouslyChosenLocaleIdentifier, m_network, m_offline);
+            window(), d->m_network, d->m_previouslyChosenLocaleIdentifier, d->m_languagesAreDownloadable);
+        buildPopUpButtonAndSelectLocaleIdentifier(
+            d->m_previouslyChosenLocaleIdentifier, d->m_network, d->m_offline);
         return false;
     }
     const CZSRLanguageItemPtr item = selectedLanguageItem();
-    m_previouslyChosenLocaleIdentifier = item ? item->localeIdentifier() : QString();
+    d->m_previouslyChosenLocaleIdentifier = item ? item->localeIdentifier() : QString();
     Q_EMIT languageActivated(currentIndex());
     return true;
 }
@@ -218,26 +268,26 @@ void CZSRLanguagePopUpButton::installationFinished(const QString &objectIdentifi
     const CZSRLanguageItemPtr selected = selectedLanguageItem();
     if (!objectIdentifier.isEmpty() && selected
         && CZSpeechItem::isSameLangaugeFromLocaleIdentifier(selected->localeIdentifier(), objectIdentifier)
-        && m_downloadStatusUpdateTimer) {
-        m_downloadStatusUpdateTimer->stop();
-        m_downloadStatusUpdateTimer->deleteLater();
-        m_downloadStatusUpdateTimer = nullptr;
+        && d->m_downloadStatusUpdateTimer) {
+        d->m_downloadStatusUpdateTimer->stop();
+        d->m_downloadStatusUpdateTimer->deleteLater();
+        d->m_downloadStatusUpdateTimer = nullptr;
     }
-    _startDelayedPopUpUpdate();
+    d->_startDelayedPopUpUpdate();
 }
 
-void CZSRLanguagePopUpButton::_startDelayedPopUpUpdate()
+void CZSRLanguagePopUpButtonPrivate::_startDelayedPopUpUpdate()
 {
-    QTimer::singleShot(100, this, &CZSRLanguagePopUpButton::_updateSRLanguageMenu);
-    QTimer::singleShot(200, this, &CZSRLanguagePopUpButton::_updateDownloadStatusFields);
+    QTimer::singleShot(100, q, [this] { _updateSRLanguageMenu(); });
+    QTimer::singleShot(200, q, [this] { _updateDownloadStatusFields(); });
 }
 
-void CZSRLanguagePopUpButton::_updateSRLanguageMenu()
+void CZSRLanguagePopUpButtonPrivate::_updateSRLanguageMenu()
 {
-    buildPopUpButtonAndSelectLocaleIdentifier(m_previouslyChosenLocaleIdentifier, m_network, m_offline);
+    q->buildPopUpButtonAndSelectLocaleIdentifier(m_previouslyChosenLocaleIdentifier, m_network, m_offline);
 }
 
-QString CZSRLanguagePopUpButton::_statusStringForActiveDownloads()
+QString CZSRLanguagePopUpButtonPrivate::_statusStringForActiveDownloads()
 {
     const QVariantList records = CZSpeechInstallationManager::sharedManager()->activeInstallations();
     const QVariantMap first = records.isEmpty() ? QVariantMap() : records.first().toMap();
@@ -254,7 +304,7 @@ QString CZSRLanguagePopUpButton::_statusStringForActiveDownloads()
             ? CZSpeechItem::displayStringForTimeRemaining(remaining)
             : QString();
         QString name = first.value(Protocol::ItemNameKey).toString();
-        if (records.size() == 1 && count() <= 3) {
+        if (records.size() == 1 && q->count() <= 3) {
             name = texts().text(QStringLiteral("EnhancedDictation"));
         }
         switch (first.value(Protocol::ItemSoftwareUpdateStateKey).toLongLong()) {
@@ -263,10 +313,10 @@ QString CZSRLanguagePopUpButton::_statusStringForActiveDownloads()
                 texts().format(QStringLiteral("DownloadingStatusStringInstallingItem"), {name}), time);
             // Installed is not usable yet: keep the line until the engine has loaded the language.
             delete m_preHeatTimer;
-            m_preHeatTimer = new QTimer(this);
+            m_preHeatTimer = new QTimer(q);
             m_preHeatTimer->setInterval(PreHeatWaitMilliseconds);
-            connect(m_preHeatTimer, &QTimer::timeout, this,
-                &CZSRLanguagePopUpButton::_clearDownloadStatusFieldAfterPreHeat);
+            QObject::connect(
+                m_preHeatTimer, &QTimer::timeout, q, [this] { _clearDownloadStatusFieldAfterPreHeat(); });
             m_preHeatTimer->start();
             break;
         case 2:
@@ -291,25 +341,25 @@ QString CZSRLanguagePopUpButton::_statusStringForActiveDownloads()
         m_downloadStatusUpdateTimer = nullptr;
         m_downloadDisplayManager->reset();
     } else if (!m_downloadStatusUpdateTimer && !status.isNull()) {
-        m_downloadStatusUpdateTimer = new QTimer(this);
+        m_downloadStatusUpdateTimer = new QTimer(q);
         m_downloadStatusUpdateTimer->setInterval(500);
-        connect(m_downloadStatusUpdateTimer, &QTimer::timeout, this,
-            &CZSRLanguagePopUpButton::_updateDownloadStatusFields);
+        QObject::connect(
+            m_downloadStatusUpdateTimer, &QTimer::timeout, q, [this] { _updateDownloadStatusFields(); });
         m_downloadStatusUpdateTimer->start();
     }
     return status;
 }
 
-void CZSRLanguagePopUpButton::_updateDownloadStatusFields()
+void CZSRLanguagePopUpButtonPrivate::_updateDownloadStatusFields()
 {
     const QString status = _statusStringForActiveDownloads();
-    showStatusLine(m_downloadStatusTextField, status.isNull() ? QString() : status);
+    q->showStatusLine(m_downloadStatusTextField, status.isNull() ? QString() : status);
     if (m_downloadStatusProgressIndicator) {
         m_downloadStatusProgressIndicator->setVisible(!status.isNull());
     }
 }
 
-void CZSRLanguagePopUpButton::_clearDownloadStatusFieldAfterPreHeat()
+void CZSRLanguagePopUpButtonPrivate::_clearDownloadStatusFieldAfterPreHeat()
 {
     if (!m_preHeatTimer) {
         return;

@@ -13,6 +13,7 @@
 #include "platform/Services.h"
 #include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
+#include "recognition-languages/CZSRLanguagePopUpButton_p.h"
 
 #include <QDBusConnection>
 #include <QDBusConnectionInterface>
@@ -155,7 +156,7 @@ private Q_SLOTS:
         QElapsedTimer wait;
         wait.start();
         while (wait.elapsed() < 120000 && !QDir(bundle).exists()) {
-            popUp->_updateDownloadStatusFields();
+            CZSRLanguagePopUpButtonPrivate::get(popUp)->_updateDownloadStatusFields();
             sawInstalling = sawInstalling || !status->text().isEmpty();
             QTest::qWait(20);
         }

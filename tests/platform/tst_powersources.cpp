@@ -1,5 +1,5 @@
-#include "TestEnvironment.h"
 #include "FakePowerSourcesInfo.h"
+#include "TestEnvironment.h"
 
 #include "installation/CZSpeechInstallationManager.h"
 #include "platform/Paths.h"

@@ -1,20 +1,21 @@
 #include "FakeInstallerDaemon.h"
-#include "TestEnvironment.h"
 #include "FakeRecognitionService.h"
+#include "TestEnvironment.h"
 
-#include "installation/CZSpeechInstallationManagerSheets.h"
-#include "installation/InstallerProtocol.h"
-#include "platform/Alert.h"
 #include "FakeMessagePortService.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
+#include "installation/CZSpeechInstallationManagerSheets.h"
+#include "installation/InstallerProtocol.h"
+#include "platform/Alert.h"
 #include "platform/Paths.h"
 #include "platform/RecognitionService.h"
 #include "platform/Services.h"
 #include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "recognition-languages/CZSRLanguagePopUpButton.h"
+#include "recognition-languages/CZSRLanguagePopUpButton_p.h"
 #include "recognition-languages/CZSRLanguageRowCheckboxButton.h"
 #include "recognition-languages/CZSRLanguageRowTextView.h"
 #include "recognition-languages/CZSRLanguageTableCellView.h"
@@ -128,7 +129,7 @@ private Q_SLOTS:
         QCOMPARE(m_popUp->count(), 3);
         QCOMPARE(m_popUp->itemText(0), QStringLiteral("English (United States)"));
         QCOMPARE(m_popUp->itemText(2), QStringLiteral("Add Language…"));
-        QCOMPARE(m_popUp->_numberOfFixedItemsAtEndOfMenu(), 2);
+        QCOMPARE(CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_numberOfFixedItemsAtEndOfMenu(), 2);
         QCOMPARE(m_popUp->previouslyChosenLocaleIdentifier(), QStringLiteral("en_US"));
 
         // Only the languages the user shows, and the one asked for, are listed.
@@ -178,28 +179,28 @@ private Q_SLOTS:
         m_popUp->buildPopUpButtonAndSelectLocaleIdentifier(
             QStringLiteral("en_US"), std::nullopt, std::nullopt);
         m_daemon->setActiveRecords({record(QStringLiteral("SRCLANGID:de_DE"), 2, QStringLiteral("German"))});
-        m_popUp->_updateDownloadStatusFields();
+        CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_updateDownloadStatusFields();
         QCOMPARE(
             m_status->text(), QStringLiteral("Downloading Enhanced Dictation\nLess than a minute remaining"));
         QVERIFY(m_spinner->isVisible());
         // A voice first: the language waits.
         m_daemon->setActiveRecords({record(QStringLiteral("VOICEID:v"), 2),
             record(QStringLiteral("SRCLANGID:de_DE"), 2, QStringLiteral("German"))});
-        m_popUp->_updateDownloadStatusFields();
+        CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_updateDownloadStatusFields();
         QCOMPARE(m_status->text(), QStringLiteral("Waiting to download…"));
         // Installing starts the pre-heat wait, which outlives the installer's records.
         m_daemon->setActiveRecords({record(QStringLiteral("SRCLANGID:de_DE"), 3, QStringLiteral("German"))});
-        m_popUp->_updateDownloadStatusFields();
-        QVERIFY(m_popUp->_isWaitingForPreHeat());
+        CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_updateDownloadStatusFields();
+        QVERIFY(CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_isWaitingForPreHeat());
         m_daemon->setActiveRecords({});
-        m_popUp->_updateDownloadStatusFields();
+        CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_updateDownloadStatusFields();
         QVERIFY(m_status->text().startsWith(QStringLiteral("Installing Enhanced Dictation\n")));
         // The dictation engine says it has loaded the language.
         m_notifications->postNotification(QStringLiteral("DictationIMNotificationRecognizerDidPreHeat"));
         QTRY_VERIFY(m_status->text().isEmpty());
         QVERIFY(!m_spinner->isVisible());
-        QVERIFY(!m_popUp->_isWaitingForPreHeat());
-        QVERIFY(!m_popUp->_hasDownloadStatusUpdateTimer());
+        QVERIFY(!CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_isWaitingForPreHeat());
+        QVERIFY(!CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_hasDownloadStatusUpdateTimer());
     }
 
     void onlyTheFirstPopUpFollowsNotifications()

@@ -1,6 +1,6 @@
+#include "FakeRecognitionService.h"
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
-#include "FakeRecognitionService.h"
 
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"

@@ -1,5 +1,5 @@
-#include "TestEnvironment.h"
 #include "FakeRecognitionService.h"
+#include "TestEnvironment.h"
 
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
