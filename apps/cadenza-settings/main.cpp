@@ -6,6 +6,7 @@
 #include "customize-voices/VoiceTableCellView.h"
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
+#include "installation/CZSpeechInstallationManager_p.h"
 #include "installation/InstallerProtocol.h"
 #include "platform/SpeechDispatcherModule.h"
 #include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
@@ -53,7 +54,7 @@ bool tickAndDownload(Cadenza::CustomizeVoicesWindowController *sheet, const std:
             chosen = row;
         }
     }
-    if (chosen < 0 || !manager->_serverIsReachable()) {
+    if (chosen < 0 || !Cadenza::CZSpeechInstallationManagerPrivate::get(manager)->_serverIsReachable()) {
         sheet->cancelVoiceSelection();
         return false;
     }

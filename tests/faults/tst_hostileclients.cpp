@@ -6,6 +6,7 @@
 #include "TestHttpServer.h"
 
 #include "installation/CZSpeechInstallationManager.h"
+#include "installation/CZSpeechInstallationManager_p.h"
 #include "installation/InstallerProtocol.h"
 #include "platform/MessageFrame.h"
 #include "platform/UnixMessagePortService.h"
@@ -60,8 +61,9 @@ private Q_SLOTS:
         Testing::QuillondProcess daemon;
         QVERIFY(daemon.start({QStringLiteral("--repository"), http.baseUrl().toString()}));
         CZSpeechInstallationManager manager;
-        QVERIFY(manager._requestInstallation(FemkeTag, QStringLiteral("Femke"), 696,
-            QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"), 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(FemkeTag,
+            QStringLiteral("Femke"), 696, QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"),
+            0));
         QTRY_COMPARE(manager.activeInstallations().size(), 1);
 
         const auto [quiet, quietAnswered] = ask(manager, 200);
@@ -97,8 +99,9 @@ private Q_SLOTS:
         QTRY_COMPARE(noisy->state(), QLocalSocket::UnconnectedState);
         QTRY_COMPARE(huge->state(), QLocalSocket::UnconnectedState);
         // And the daemon still takes work.
-        QVERIFY(manager._requestInstallation(QStringLiteral("VOICEID:com.vendra.speech.synthesis.voice.Orin"),
-            QStringLiteral("Orin"), 709, QStringLiteral("com.vendra.speech.synthesis.voice.Orin"), 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(
+            QStringLiteral("VOICEID:com.vendra.speech.synthesis.voice.Orin"), QStringLiteral("Orin"), 709,
+            QStringLiteral("com.vendra.speech.synthesis.voice.Orin"), 0));
         QTRY_COMPARE(manager.activeInstallations().size(), 2);
     }
 };

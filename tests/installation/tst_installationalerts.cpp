@@ -6,6 +6,7 @@
 #include "customize-voices/VoiceTableCellView.h"
 #include "installation/CZSpeechInstallationManager.h"
 #include "installation/CZSpeechInstallationManagerSheets.h"
+#include "installation/CZSpeechInstallationManager_p.h"
 #include "platform/Alert.h"
 #include "voices/CZVoiceObject.h"
 #include "voices/DownloadableVoice.h"
@@ -76,7 +77,9 @@ private Q_SLOTS:
             }
         }
         QCOMPARE(unreachable, 1);
-        QVERIFY(CZSpeechInstallationManager::sharedManager()->pendingLocalPortNames().isEmpty());
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(CZSpeechInstallationManager::sharedManager())
+                    ->pendingLocalPortNames()
+                    .isEmpty());
     }
 
     void aBackgroundFetchDoesNotAlert()
