@@ -1,8 +1,8 @@
 // A window with Cadenza's voice pop-up, its download status line and the voice settings dialog.
 // Run with --check to build the window, print the chosen voice and exit.
-#include <voice-popup/CZVoicePopUpButton.h>
-#include <voice-settings/SpeechSynthesizerVoiceSettings.h>
-#include <voices/SpeechSynthesizer.h>
+#include <Cadenza/CZVoicePopUpButton>
+#include <Cadenza/SpeechSynthesizer>
+#include <Cadenza/SpeechSynthesizerVoiceSettings>
 
 #include <QApplication>
 #include <QLabel>

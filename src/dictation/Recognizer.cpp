@@ -12,6 +12,8 @@
 #include <QPointer>
 #include <QThread>
 
+#include <atomic>
+
 namespace Cadenza {
 
 namespace {
@@ -36,9 +38,46 @@ std::unique_ptr<Transcriber> loadTranscriber(const QString &language, QString *e
 
 } // namespace
 
+class RecognizerPrivate
+{
+public:
+    explicit RecognizerPrivate(Recognizer *q)
+        : q(q)
+    {
+    }
+
+    void finishMicrophone();
+
+    Recognizer *const q;
+    QString m_language;
+    QString m_grammarFile;
+    bool m_running = false;
+    std::shared_ptr<std::atomic<bool>> m_cancelled;
+    std::unique_ptr<Platform::Microphone> m_microphone;
+    std::unique_ptr<Transcriber> m_transcriber;
+    quint64 m_generation = 0;
+};
+
 Recognizer::Recognizer(QObject *parent)
     : QObject(parent)
-{ }
+    , d(std::make_unique<RecognizerPrivate>(this))
+{
+}
+
+void Recognizer::setLanguage(const QString &locale)
+{
+    d->m_language = locale;
+}
+
+void Recognizer::setGrammarFile(const QString &path)
+{
+    d->m_grammarFile = path;
+}
+
+bool Recognizer::isRunning() const
+{
+    return d->m_running;
+}
 
 Recognizer::~Recognizer()
 {
@@ -48,12 +87,12 @@ Recognizer::~Recognizer()
 void Recognizer::startFromFile(const QString &path)
 {
     cancel();
-    m_running = true;
-    const quint64 generation = ++m_generation;
+    d->m_running = true;
+    const quint64 generation = ++d->m_generation;
     auto cancelled = std::make_shared<std::atomic<bool>>(false);
-    m_cancelled = cancelled;
-    const QString language = m_language;
-    const QString grammar = m_grammarFile;
+    d->m_cancelled = cancelled;
+    const QString language = d->m_language;
+    const QString grammar = d->m_grammarFile;
     QPointer<Recognizer> self(this);
     // Results travel back through the event loop; a cancelled or newer run drops them.
     const auto post = [self, generation, cancelled](auto deliver) {
@@ -64,7 +103,7 @@ void Recognizer::startFromFile(const QString &path)
         QMetaObject::invokeMethod(
             QCoreApplication::instance(),
             [self, generation, cancelled, deliver] {
-                if (self && !*cancelled && self->m_generation == generation) {
+                if (self && !*cancelled && self->d->m_generation == generation) {
                     deliver(self.data());
                 }
             },
@@ -74,7 +113,7 @@ void Recognizer::startFromFile(const QString &path)
         QString error;
         const auto fail = [&](const QString &reason) {
             post([reason](Recognizer *r) {
-                r->m_running = false;
+                r->d->m_running = false;
                 Q_EMIT r->failed(reason);
             });
         };
@@ -112,7 +151,7 @@ void Recognizer::startFromFile(const QString &path)
             return fail(error);
         }
         post([text = *text](Recognizer *r) {
-            r->m_running = false;
+            r->d->m_running = false;
             Q_EMIT r->finalResult(text);
         });
     });
@@ -123,42 +162,54 @@ void Recognizer::startFromFile(const QString &path)
 void Recognizer::startFromMicrophone()
 {
     cancel();
-    ++m_generation;
+    ++d->m_generation;
     QString error;
-    m_transcriber = loadTranscriber(m_language, &error);
-    if (!m_transcriber || !m_transcriber->begin(m_grammarFile, &error)) {
-        m_transcriber.reset();
+    d->m_transcriber = loadTranscriber(d->m_language, &error);
+    if (!d->m_transcriber || !d->m_transcriber->begin(d->m_grammarFile, &error)) {
+        d->m_transcriber.reset();
         Q_EMIT failed(error);
         return;
     }
-    m_microphone = std::make_unique<Platform::Microphone>();
-    if (!m_microphone->start(m_transcriber->sampleRate(), &error)) {
-        m_microphone.reset();
-        m_transcriber.reset();
+    d->m_microphone = std::make_unique<Platform::Microphone>();
+    if (!d->m_microphone->start(d->m_transcriber->sampleRate(), &error)) {
+        d->m_microphone.reset();
+        d->m_transcriber.reset();
         Q_EMIT failed(error);
         return;
     }
-    m_running = true;
-    connect(m_microphone.get(), &Platform::Microphone::samplesAvailable, this,
+    d->m_running = true;
+    connect(d->m_microphone.get(), &Platform::Microphone::samplesAvailable, this,
         [this](const QVector<qint16> &samples) {
             QString error;
-            if (!m_transcriber || !m_transcriber->feed(samples.constData(), samples.size(), &error)) {
+            if (!d->m_transcriber || !d->m_transcriber->feed(samples.constData(), samples.size(), &error)) {
                 cancel();
                 Q_EMIT failed(error);
                 return;
             }
-            Q_EMIT partialResult(m_transcriber->partialResult());
+            Q_EMIT partialResult(d->m_transcriber->partialResult());
         });
 }
 
 void Recognizer::stop()
 {
-    if (m_microphone) {
-        finishMicrophone();
+    if (d->m_microphone) {
+        d->finishMicrophone();
     }
 }
 
-void Recognizer::finishMicrophone()
+
+void Recognizer::cancel()
+{
+    if (d->m_cancelled) {
+        *d->m_cancelled = true;
+        d->m_cancelled.reset();
+    }
+    d->m_microphone.reset();
+    d->m_transcriber.reset();
+    d->m_running = false;
+}
+
+void RecognizerPrivate::finishMicrophone()
 {
     m_microphone.reset();
     QString error;
@@ -166,21 +217,10 @@ void Recognizer::finishMicrophone()
     m_transcriber.reset();
     m_running = false;
     if (text) {
-        Q_EMIT finalResult(*text);
+        Q_EMIT q->finalResult(*text);
     } else {
-        Q_EMIT failed(error);
+        Q_EMIT q->failed(error);
     }
-}
-
-void Recognizer::cancel()
-{
-    if (m_cancelled) {
-        *m_cancelled = true;
-        m_cancelled.reset();
-    }
-    m_microphone.reset();
-    m_transcriber.reset();
-    m_running = false;
 }
 
 } // namespace Cadenza
