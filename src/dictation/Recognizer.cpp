@@ -43,8 +43,7 @@ class RecognizerPrivate
 public:
     explicit RecognizerPrivate(Recognizer *q)
         : q(q)
-    {
-    }
+    { }
 
     void finishMicrophone();
 
@@ -61,8 +60,7 @@ public:
 Recognizer::Recognizer(QObject *parent)
     : QObject(parent)
     , d(std::make_unique<RecognizerPrivate>(this))
-{
-}
+{ }
 
 void Recognizer::setLanguage(const QString &locale)
 {
@@ -196,7 +194,6 @@ void Recognizer::stop()
         d->finishMicrophone();
     }
 }
-
 
 void Recognizer::cancel()
 {

@@ -11,6 +11,7 @@
 
 namespace Cadenza {
 
+class RecognizerPrivate;
 
 /**
  * Speech to text for applications. A recognition runs on a worker thread for files (the event loop

@@ -49,7 +49,8 @@ void CZFloatSlider::setMaximumFloatValue(double maximum)
 
 double CZFloatSlider::floatValue() const
 {
-    return d->m_minimum + (d->m_maximum - d->m_minimum) * double(value() - minimum()) / double(maximum() - minimum());
+    return d->m_minimum
+        + (d->m_maximum - d->m_minimum) * double(value() - minimum()) / double(maximum() - minimum());
 }
 
 void CZFloatSlider::setFloatValue(double value)
