@@ -3,11 +3,11 @@
 
 #include "BenchTable.h"
 
-#include "customize-voices/VoiceTableRow.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
+#include "customize-voices/VoiceTableRow.h"
 #include "platform/Services.h"
 
 #include <QCollator>

@@ -1,11 +1,11 @@
 #include "TestEnvironment.h"
 
-#include "customize-voices/VoiceTableRow.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
-#include "platform/LocalizationTable.h"
 #include "MemoryPreferencesStore.h"
+#include "customize-voices/VoiceTableRow.h"
+#include "platform/LocalizationTable.h"
 #include "platform/Services.h"
 #include "speech-items/CZSpeechItem_p.h"
 #include "voices/DownloadableVoice.h"

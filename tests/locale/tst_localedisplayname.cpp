@@ -1,9 +1,9 @@
 #include "TestEnvironment.h"
 
+#include "FakeUserLocaleService.h"
 #include "locale/LocaleDisplayName.h"
 #include "locale/LocaleDisplayName_p.h"
 #include "platform/Assertion.h"
-#include "FakeUserLocaleService.h"
 #include "platform/LocalizationTable.h"
 #include "platform/Services.h"
 

@@ -1,7 +1,7 @@
 #include "TestEnvironment.h"
 
-#include "platform/EnvironmentUserLocaleService.h"
 #include "FakeUserLocaleService.h"
+#include "platform/EnvironmentUserLocaleService.h"
 #include "platform/Locale.h"
 
 #include <QTest>

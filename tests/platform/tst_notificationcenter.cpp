@@ -1,7 +1,7 @@
 #include "TestEnvironment.h"
 
-#include "platform/DBusNotificationCenter.h"
 #include "InProcessNotificationCenter.h"
+#include "platform/DBusNotificationCenter.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>

@@ -1,7 +1,7 @@
 #include "TestEnvironment.h"
 
-#include "platform/FilePreferencesStore.h"
 #include "MemoryPreferencesStore.h"
+#include "platform/FilePreferencesStore.h"
 
 #include <QDir>
 #include <QFile>

@@ -1,8 +1,8 @@
 #include "TestEnvironment.h"
 
-#include "platform/BundleSpeechSynthesisService.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
+#include "platform/BundleSpeechSynthesisService.h"
 #include "platform/Paths.h"
 #include "platform/PreferencesStore.h"
 #include "platform/PropertyList.h"

@@ -1,10 +1,10 @@
 #include "TestEnvironment.h"
 
-#include "platform/Alert.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
+#include "platform/Alert.h"
 #include "platform/Services.h"
 #include "voice-popup/CZVoicePopUpButton.h"
 #include "voice-settings/CZFloatSlider.h"

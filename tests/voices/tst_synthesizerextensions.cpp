@@ -1,9 +1,9 @@
 #include "TestEnvironment.h"
 
-#include "platform/BundleSpeechSynthesisService.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "MemoryPreferencesStore.h"
+#include "platform/BundleSpeechSynthesisService.h"
 #include "platform/Services.h"
 #include "platform/WaveFile.h"
 #include "voices/SpeechSynthesizer.h"
