@@ -4,7 +4,7 @@
 // A private world for a benchmark that starts the daemon: every XDG folder and CADENZA_ROOT inside
 // one temporary folder, the runtime folder private as the message ports want it.
 
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
 
 #include <QDir>
 #include <QFile>

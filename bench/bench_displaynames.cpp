@@ -3,8 +3,8 @@
 
 #include "BenchTable.h"
 
-#include "locale/LocaleDisplayName.h"
-#include "locale/LocaleDisplayName_p.h"
+#include "core/locale/LocaleDisplayName.h"
+#include "core/locale/LocaleDisplayName_p.h"
 
 #include <QCoreApplication>
 #include <QStringList>

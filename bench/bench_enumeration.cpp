@@ -5,11 +5,11 @@
 
 #include "BenchTable.h"
 
-#include "platform/BundleSpeechSynthesisService.h"
-#include "platform/Paths.h"
-#include "platform/PropertyList.h"
-#include "platform/Services.h"
-#include "voices/SpeechSynthesizer.h"
+#include "core/files/Paths.h"
+#include "core/formats/PropertyList.h"
+#include "core/services/BundleSpeechSynthesisService.h"
+#include "core/services/Services.h"
+#include "core/voices/SpeechSynthesizer.h"
 
 #include <QCoreApplication>
 #include <QDir>

@@ -4,10 +4,10 @@
 #include "BenchTable.h"
 #include "BenchWorld.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "installation/CZSpeechInstallationManager_p.h"
-#include "installation/InstallerProtocol.h"
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QCoreApplication>
 #include <QCryptographicHash>

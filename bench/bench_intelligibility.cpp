@@ -9,9 +9,9 @@
 //   bench_intelligibility [RUNS]    RUNS: latency runs per command (default 7)
 #include "BenchTable.h"
 
-#include "platform/BundleSpeechSynthesisService.h"
-#include "platform/Paths.h"
-#include "platform/WaveFile.h"
+#include "core/files/Paths.h"
+#include "core/formats/WaveFile.h"
+#include "core/services/BundleSpeechSynthesisService.h"
 
 #include <QCoreApplication>
 #include <QDir>

@@ -7,10 +7,10 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
-#include "dictation/Transcriber.h"
-#include "platform/AudioFileReader.h"
-#include "platform/Paths.h"
-#include "platform/RecognitionService.h"
+#include "core/dictation/Transcriber.h"
+#include "core/files/Paths.h"
+#include "core/formats/AudioFileReader.h"
+#include "core/services/RecognitionService.h"
 
 #include <QCoreApplication>
 #include <QProcess>
@@ -105,8 +105,8 @@ int main(int argc, char *argv[])
             TestEnvironment::voiceAttributes(prefix + voice, voice, QStringLiteral("en_US")), voice);
     }
     TestEnvironment::writeVoiceBundle(Paths::userVoicesFolder(), QStringLiteral("espeak"),
-        TestEnvironment::voiceAttributes(prefix + QStringLiteral("espeak"), QStringLiteral("espeak"),
-            QStringLiteral("en_US")));
+        TestEnvironment::voiceAttributes(
+            prefix + QStringLiteral("espeak"), QStringLiteral("espeak"), QStringLiteral("en_US")));
     RecognizerFixture::writeModelBundle(Paths::userRecognizersFolder(), QStringLiteral("en_US"));
 
     BundleRecognitionService recognition;
@@ -137,8 +137,8 @@ int main(int argc, char *argv[])
         {QStringLiteral("slt"), QStringLiteral("rms"), QStringLiteral("awb"), QStringLiteral("espeak")}) {
         const QString wav = environment.path(voice + QStringLiteral(".wav"));
         const int said = QProcess::execute(QStringLiteral(CADENZA_CLI_PATH),
-            {QStringLiteral("say"), QStringLiteral("--voice"), prefix + voice, QStringLiteral("--output"), wav,
-                text});
+            {QStringLiteral("say"), QStringLiteral("--voice"), prefix + voice, QStringLiteral("--output"),
+                wav, text});
         if (said != 0) {
             qFatal("cadenza say failed for %s", qPrintable(voice));
         }

@@ -4,13 +4,13 @@
 #include "BenchTable.h"
 #include "BenchWorld.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "installation/CZSpeechInstallationManager_p.h"
-#include "installation/InstallerProtocol.h"
-#include "installation/SecureArchiving.h"
-#include "platform/PropertyList.h"
-#include "platform/Services.h"
-#include "platform/UnixMessagePortService.h"
+#include "core/formats/PropertyList.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
+#include "core/services/Services.h"
+#include "core/services/UnixMessagePortService.h"
+#include "protocol/InstallerProtocol.h"
+#include "protocol/SecureArchiving.h"
 
 #include <QCoreApplication>
 #include <QDir>

@@ -7,8 +7,8 @@
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
-#include "customize-voices/VoiceTableRow.h"
-#include "platform/Services.h"
+#include "core/rows/VoiceTableRow.h"
+#include "core/services/Services.h"
 
 #include <QCollator>
 #include <QCoreApplication>

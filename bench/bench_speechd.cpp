@@ -11,7 +11,7 @@
 #include "BenchTable.h"
 #include "ModuleDriver.h"
 
-#include "platform/Paths.h"
+#include "core/files/Paths.h"
 
 #include <QCoreApplication>
 #include <QDir>

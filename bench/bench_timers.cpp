@@ -6,8 +6,8 @@
 
 #include "BenchTable.h"
 
-#include "platform/RunLoopTimer.h"
-#include "timers/CZPowerSavvyTimer.h"
+#include "core/services/RunLoopTimer.h"
+#include "core/timers/CZPowerSavvyTimer.h"
 
 #include <QCoreApplication>
 #include <QElapsedTimer>

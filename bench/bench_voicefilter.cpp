@@ -7,8 +7,8 @@
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
-#include "platform/Services.h"
-#include "voices/CZVoiceObject.h"
+#include "core/services/Services.h"
+#include "core/voices/CZVoiceObject.h"
 
 #include <QCollator>
 #include <QCoreApplication>

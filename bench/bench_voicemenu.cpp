@@ -12,11 +12,11 @@
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
-#include "customize-voices/CustomizeVoicesWindowController.h"
-#include "platform/Services.h"
-#include "voice-popup/CZVoicePopUpButton.h"
-#include "voice-popup/CZVoicePopUpButton_p.h"
-#include "voices/CZVoiceObject.h"
+#include "core/services/Services.h"
+#include "core/voices/CZVoiceObject.h"
+#include "widgets/customize-voices/CustomizeVoicesWindowController.h"
+#include "widgets/voice-popup/CZVoicePopUpButton.h"
+#include "widgets/voice-popup/CZVoicePopUpButton_p.h"
 
 #include <QApplication>
 #include <QCollator>

@@ -3,8 +3,8 @@
 #include "BundleUnpacker.h"
 #include "Download.h"
 
-#include "installation/InstallerProtocol.h"
-#include "platform/KeyedArchive.h"
+#include "protocol/InstallerProtocol.h"
+#include "protocol/KeyedArchive.h"
 
 #include <QCryptographicHash>
 #include <QDateTime>

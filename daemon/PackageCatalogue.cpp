@@ -1,6 +1,6 @@
 #include "PackageCatalogue.h"
 
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
 
 #include <QLoggingCategory>
 #include <QRegularExpression>

@@ -2,14 +2,14 @@
 
 #include "RequestCheck.h"
 
-#include "installation/InstallerProtocol.h"
-#include "installation/SecureArchiving.h"
-#include "platform/DistributedNotificationCenter.h"
-#include "platform/KeyedArchive.h"
-#include "platform/MessagePort.h"
-#include "platform/Paths.h"
-#include "platform/Services.h"
-#include "platform/UnixMessagePortService.h"
+#include "core/files/Paths.h"
+#include "core/services/DistributedNotificationCenter.h"
+#include "core/services/MessagePort.h"
+#include "core/services/Services.h"
+#include "core/services/UnixMessagePortService.h"
+#include "protocol/InstallerProtocol.h"
+#include "protocol/KeyedArchive.h"
+#include "protocol/SecureArchiving.h"
 
 #include <QDir>
 #include <QLoggingCategory>

@@ -1,6 +1,6 @@
 #include "RequestCheck.h"
 
-#include "installation/InstallerProtocol.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QRegularExpression>
 

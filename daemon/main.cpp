@@ -3,7 +3,7 @@
 #include "PackageCatalogue.h"
 #include "QuillonDaemon.h"
 
-#include "platform/Paths.h"
+#include "core/files/Paths.h"
 
 #include "cadenza-config.h"
 

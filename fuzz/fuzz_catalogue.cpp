@@ -1,7 +1,7 @@
 // The catalogue the daemon trusts for paths, names and checksums.
 #include "PackageCatalogue.h"
 
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
 
 #include <QLoggingCategory>
 

@@ -1,6 +1,6 @@
 // Keyed archives arrive from other processes: installation requests, status records, notifications.
-#include "installation/SecureArchiving.h"
-#include "platform/KeyedArchive.h"
+#include "protocol/KeyedArchive.h"
+#include "protocol/SecureArchiving.h"
 
 #include <QLoggingCategory>
 

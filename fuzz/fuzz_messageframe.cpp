@@ -1,5 +1,5 @@
 // Message-port streams: frames cut at arbitrary places, with a small size limit.
-#include "platform/MessageFrame.h"
+#include "protocol/MessageFrame.h"
 
 using namespace Cadenza::Platform;
 

@@ -1,5 +1,5 @@
 // Property lists: Info.plist of every bundle, the catalogue, the preference files.
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
 
 using namespace Cadenza::Platform;
 

@@ -1,8 +1,8 @@
 // Info.plist of a recognizer bundle, as the list of installed dictation languages reads it: any bytes
 // may sit in a bundle somebody copied into the recognizer folder.
-#include "platform/Locale.h"
-#include "platform/PropertyList.h"
-#include "platform/RecognizerBundleInfo.h"
+#include "core/formats/Locale.h"
+#include "core/formats/PropertyList.h"
+#include "core/formats/RecognizerBundleInfo.h"
 
 using namespace Cadenza::Platform;
 

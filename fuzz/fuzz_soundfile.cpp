@@ -2,7 +2,7 @@
 // A sound file as "cadenza dictate" reads it: any bytes may be handed to it. The reader must refuse
 // with a reason or deliver blocks of bounded size until the end (compressed formats may hold far
 // more samples than bytes, so only the rounds are capped).
-#include "platform/AudioFileReader.h"
+#include "core/formats/AudioFileReader.h"
 
 #include <QFile>
 #include <QTemporaryDir>

@@ -1,8 +1,8 @@
 // Info.plist of an installed voice bundle, as the voice list reads it: any bytes may sit in a bundle
 // somebody copied into a voice folder.
-#include "platform/Locale.h"
-#include "platform/PropertyList.h"
-#include "platform/VoiceDescription.h"
+#include "core/formats/Locale.h"
+#include "core/formats/PropertyList.h"
+#include "core/formats/VoiceDescription.h"
 
 using namespace Cadenza::Platform;
 

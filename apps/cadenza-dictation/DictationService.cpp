@@ -1,13 +1,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "DictationService.h"
 
-#include "dictation/Transcriber.h"
-#include "installation/InstallerProtocol.h"
-#include "platform/AudioFileReader.h"
-#include "platform/DistributedNotificationCenter.h"
-#include "platform/Paths.h"
-#include "platform/RecognitionService.h"
-#include "platform/Services.h"
+#include "core/dictation/Transcriber.h"
+#include "core/files/Paths.h"
+#include "core/formats/AudioFileReader.h"
+#include "core/services/DistributedNotificationCenter.h"
+#include "core/services/RecognitionService.h"
+#include "core/services/Services.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QCoreApplication>
 #include <QDBusConnection>

@@ -4,7 +4,7 @@
 // directly inside a known voice or recognizer folder, reached without symbolic links, and the
 // deletion never follows a link.
 
-#include "platform/BundleRemoval.h"
+#include "core/services/BundleRemoval.h"
 
 #include <QCoreApplication>
 

@@ -2,18 +2,18 @@
 
 #include "TryDictationArea.h"
 
-#include "platform/DistributedNotificationCenter.h"
-#include "platform/LocalizationTable.h"
-#include "platform/PreferencesStore.h"
-#include "platform/Services.h"
-#include "platform/SpeechDispatcherModule.h"
-#include "recognition-languages/CZSRLanguageItem.h"
-#include "recognition-languages/CZSRLanguagePopUpButton.h"
-#include "speech-items/CZSpeechItem.h"
-#include "voice-popup/CZVoicePopUpButton.h"
-#include "voice-settings/SpeechSynthesizerVoiceSettings.h"
-#include "voices/CZVoiceObject.h"
-#include "voices/SpeechSynthesizer.h"
+#include "core/locale/LocalizationTable.h"
+#include "core/recognition-items/CZSRLanguageItem.h"
+#include "core/services/DistributedNotificationCenter.h"
+#include "core/services/PreferencesStore.h"
+#include "core/services/Services.h"
+#include "core/services/SpeechDispatcherModule.h"
+#include "core/speech-items/CZSpeechItem.h"
+#include "core/voices/CZVoiceObject.h"
+#include "core/voices/SpeechSynthesizer.h"
+#include "widgets/recognition-languages/CZSRLanguagePopUpButton.h"
+#include "widgets/voice-popup/CZVoicePopUpButton.h"
+#include "widgets/voice-settings/SpeechSynthesizerVoiceSettings.h"
 
 #include <QComboBox>
 #include <QCoreApplication>

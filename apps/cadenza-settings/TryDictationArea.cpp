@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "TryDictationArea.h"
 
-#include "dictation/Recognizer.h"
-#include "platform/LocalizationTable.h"
+#include "core/dictation/Recognizer.h"
+#include "core/locale/LocalizationTable.h"
 
 #include <QHBoxLayout>
 #include <QLabel>

@@ -1,19 +1,19 @@
 // cadenza-settings: a small speech settings application hosting Cadenza's controls.
 #include "SettingsWindow.h"
 
-#include "customize-voices/CZVoiceRowCheckboxButton.h"
-#include "customize-voices/CustomizeVoicesWindowController.h"
-#include "customize-voices/VoiceTableCellView.h"
-#include "installation/CZSpeechInstallationManager.h"
-#include "installation/CZSpeechInstallationManagerSheets.h"
-#include "installation/CZSpeechInstallationManager_p.h"
-#include "installation/InstallerProtocol.h"
-#include "platform/SpeechDispatcherModule.h"
-#include "recognition-languages/CZCustomizeSRLanguagesWindowController.h"
-#include "recognition-languages/CZSRLanguagePopUpButton.h"
-#include "voice-settings/VoiceSettingsAlertController.h"
-#include "voice-settings/VoiceSettingsSheetController.h"
-#include "voices/CZVoiceObject.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
+#include "core/services/SpeechDispatcherModule.h"
+#include "core/voices/CZVoiceObject.h"
+#include "protocol/InstallerProtocol.h"
+#include "widgets/customize-voices/CZVoiceRowCheckboxButton.h"
+#include "widgets/customize-voices/CustomizeVoicesWindowController.h"
+#include "widgets/customize-voices/VoiceTableCellView.h"
+#include "widgets/installation/CZSpeechInstallationManagerSheets.h"
+#include "widgets/recognition-languages/CZCustomizeSRLanguagesWindowController.h"
+#include "widgets/recognition-languages/CZSRLanguagePopUpButton.h"
+#include "widgets/voice-settings/VoiceSettingsAlertController.h"
+#include "widgets/voice-settings/VoiceSettingsSheetController.h"
 
 #include <QAccessibleWidget>
 #include <QApplication>

@@ -1,6 +1,6 @@
 #include "CommandLine.h"
 
-#include "platform/LocalizationTable.h"
+#include "core/locale/LocalizationTable.h"
 
 #include <QCoreApplication>
 

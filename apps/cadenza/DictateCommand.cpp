@@ -3,12 +3,12 @@
 
 #include "CommandLine.h"
 
-#include "dictation/Transcriber.h"
-#include "platform/AudioFileReader.h"
-#include "platform/Microphone.h"
-#include "platform/RecognitionService.h"
-#include "platform/Services.h"
-#include "recognition-languages/CZSRLanguageItem.h"
+#include "core/dictation/Transcriber.h"
+#include "core/formats/AudioFileReader.h"
+#include "core/recognition-items/CZSRLanguageItem.h"
+#include "core/services/Microphone.h"
+#include "core/services/RecognitionService.h"
+#include "core/services/Services.h"
 
 #include <QCommandLineParser>
 #include <QCoreApplication>

@@ -2,9 +2,9 @@
 
 #include "CommandLine.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "recognition-languages/CZSRLanguageItem.h"
-#include "voices/DownloadableVoice.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/recognition-items/CZSRLanguageItem.h"
+#include "core/voices/DownloadableVoice.h"
 
 #include <QCommandLineParser>
 #include <QCoreApplication>

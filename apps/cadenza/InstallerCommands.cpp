@@ -2,11 +2,11 @@
 
 #include "CommandLine.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "installation/CZSpeechInstallationManager_p.h"
-#include "installation/InstallerProtocol.h"
-#include "platform/LocalizationTable.h"
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
+#include "core/locale/LocalizationTable.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QCommandLineParser>
 #include <QEventLoop>

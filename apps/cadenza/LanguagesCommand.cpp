@@ -2,8 +2,8 @@
 
 #include "CommandLine.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "recognition-languages/CZSRLanguageItem.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/recognition-items/CZSRLanguageItem.h"
 
 #include <QCommandLineParser>
 #include <QJsonArray>

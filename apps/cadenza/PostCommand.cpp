@@ -2,7 +2,7 @@
 
 #include "CommandLine.h"
 
-#include "platform/DBusNotificationCenter.h"
+#include "core/services/DBusNotificationCenter.h"
 
 #include <QCommandLineParser>
 #include <QDBusConnection>

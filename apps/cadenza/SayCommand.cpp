@@ -2,10 +2,10 @@
 
 #include "CommandLine.h"
 
-#include "platform/OutputFile.h"
-#include "platform/Services.h"
-#include "platform/SpeechSynthesisService.h"
-#include "voices/SpeechSynthesizer.h"
+#include "core/files/OutputFile.h"
+#include "core/services/Services.h"
+#include "core/services/SpeechSynthesisService.h"
+#include "core/voices/SpeechSynthesizer.h"
 
 #include <QCommandLineParser>
 #include <QEventLoop>

@@ -2,13 +2,13 @@
 
 #include "CommandLine.h"
 
-#include "locale/LocaleDisplayName.h"
-#include "platform/Locale.h"
-#include "platform/LocalizationTable.h"
-#include "platform/Services.h"
-#include "platform/SpeechEngines.h"
-#include "platform/SpeechSynthesisService.h"
-#include "voices/SpeechSynthesizer.h"
+#include "core/engines/SpeechEngines.h"
+#include "core/formats/Locale.h"
+#include "core/locale/LocaleDisplayName.h"
+#include "core/locale/LocalizationTable.h"
+#include "core/services/Services.h"
+#include "core/services/SpeechSynthesisService.h"
+#include "core/voices/SpeechSynthesizer.h"
 
 #include <QCommandLineParser>
 #include <QJsonArray>

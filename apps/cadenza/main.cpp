@@ -9,7 +9,7 @@
 #include "SayCommand.h"
 #include "VoicesCommand.h"
 
-#include "platform/LocalizationTable.h"
+#include "core/locale/LocalizationTable.h"
 
 #include <QCoreApplication>
 #include <QLibraryInfo>

@@ -3,8 +3,8 @@
 
 #include "AudioSender.h"
 
-#include "platform/WaveFile.h"
-#include "voices/SpeechSynthesizer.h"
+#include "core/formats/WaveFile.h"
+#include "core/voices/SpeechSynthesizer.h"
 
 #include <QDir>
 #include <QFile>

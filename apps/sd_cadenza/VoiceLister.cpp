@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "VoiceLister.h"
 
-#include "platform/Locale.h"
-#include "platform/PreferencesStore.h"
-#include "platform/Services.h"
-#include "platform/SpeechSynthesisService.h"
-#include "platform/VoiceDescription.h"
+#include "core/formats/Locale.h"
+#include "core/formats/VoiceDescription.h"
+#include "core/services/PreferencesStore.h"
+#include "core/services/Services.h"
+#include "core/services/SpeechSynthesisService.h"
 
 #include <QHash>
 #include <QRegularExpression>

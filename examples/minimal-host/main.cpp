@@ -3,6 +3,9 @@
 #include <Cadenza/CZVoicePopUpButton>
 #include <Cadenza/SpeechSynthesizer>
 #include <Cadenza/SpeechSynthesizerVoiceSettings>
+#include <core/voices/SpeechSynthesizer.h>
+#include <widgets/voice-popup/CZVoicePopUpButton.h>
+#include <widgets/voice-settings/SpeechSynthesizerVoiceSettings.h>
 
 #include <QApplication>
 #include <QLabel>

@@ -2,7 +2,7 @@
 #ifndef CADENZA_PLUGINS_ESPEAKENGINEPLUGIN_H
 #define CADENZA_PLUGINS_ESPEAKENGINEPLUGIN_H
 
-#include "SpeechEngine.h"
+#include "core/engines/SpeechEngine.h"
 
 #include <QMutex>
 #include <QObject>

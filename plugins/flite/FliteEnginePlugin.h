@@ -2,7 +2,7 @@
 #ifndef CADENZA_PLUGINS_FLITEENGINEPLUGIN_H
 #define CADENZA_PLUGINS_FLITEENGINEPLUGIN_H
 
-#include "SpeechEngine.h"
+#include "core/engines/SpeechEngine.h"
 
 #include <QHash>
 #include <QMutex>

@@ -2,7 +2,7 @@
 #ifndef CADENZA_PLUGINS_POCKETSPHINXDECODER_H
 #define CADENZA_PLUGINS_POCKETSPHINXDECODER_H
 
-#include "RecognitionEngine.h"
+#include "core/engines/RecognitionEngine.h"
 
 #include <QByteArray>
 

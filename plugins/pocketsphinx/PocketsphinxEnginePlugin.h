@@ -2,7 +2,7 @@
 #ifndef CADENZA_PLUGINS_POCKETSPHINXENGINEPLUGIN_H
 #define CADENZA_PLUGINS_POCKETSPHINXENGINEPLUGIN_H
 
-#include "RecognitionEngine.h"
+#include "core/engines/RecognitionEngine.h"
 
 #include <QObject>
 

@@ -2,7 +2,7 @@
 #ifndef CADENZA_PLUGINS_POCKETSPHINXMODELCHECK_H
 #define CADENZA_PLUGINS_POCKETSPHINXMODELCHECK_H
 
-#include "RecognitionEngine.h"
+#include "core/engines/RecognitionEngine.h"
 
 namespace Cadenza::Engines {
 

@@ -1,10 +1,10 @@
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
-#include "platform/FilePreferencesStore.h"
-#include "platform/Paths.h"
-#include "platform/PropertyList.h"
-#include "platform/WaveFile.h"
+#include "core/files/Paths.h"
+#include "core/formats/PropertyList.h"
+#include "core/formats/WaveFile.h"
+#include "core/services/FilePreferencesStore.h"
 
 #include <QDir>
 #include <QFile>

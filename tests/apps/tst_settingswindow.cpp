@@ -4,10 +4,10 @@
 #include "SettingsWindow.h"
 
 #include "FakeUserLocaleService.h"
-#include "platform/Paths.h"
-#include "platform/Services.h"
-#include "speech-items/CZSpeechItem.h"
-#include "voices/SpeechSynthesizer.h"
+#include "core/files/Paths.h"
+#include "core/services/Services.h"
+#include "core/speech-items/CZSpeechItem.h"
+#include "core/voices/SpeechSynthesizer.h"
 
 #include <QLabel>
 #include <QTest>

@@ -4,7 +4,7 @@
 #include "SettingsWindow.h"
 #include "TestEnvironment.h"
 
-#include "platform/SpeechDispatcherModule.h"
+#include "core/services/SpeechDispatcherModule.h"
 
 #include <QDir>
 #include <QFile>

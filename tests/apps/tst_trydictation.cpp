@@ -4,7 +4,7 @@
 #include "TestEnvironment.h"
 #include "TryDictationArea.h"
 
-#include "platform/Paths.h"
+#include "core/files/Paths.h"
 
 #include <QLabel>
 #include <QPushButton>

@@ -1,7 +1,7 @@
 #include "FakeInstallerDaemon.h"
 
-#include "installation/InstallerProtocol.h"
-#include "installation/SecureArchiving.h"
+#include "protocol/InstallerProtocol.h"
+#include "protocol/SecureArchiving.h"
 
 namespace Cadenza::Testing {
 

@@ -1,8 +1,8 @@
 #include "QuillondProcess.h"
 
-#include "installation/InstallerProtocol.h"
-#include "platform/Paths.h"
-#include "platform/UnixMessagePortService.h"
+#include "core/files/Paths.h"
+#include "core/services/UnixMessagePortService.h"
+#include "protocol/InstallerProtocol.h"
 
 #include <QDirIterator>
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 #include "RecognizerFixture.h"
 
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
 
 #include <QDir>
 #include <QFile>

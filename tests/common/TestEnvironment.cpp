@@ -1,10 +1,10 @@
 #include "TestEnvironment.h"
 
-#include "locale/LocaleDisplayName_p.h"
-#include "platform/LocalizationTable.h"
-#include "platform/Paths.h"
-#include "platform/PropertyList.h"
-#include "platform/Services.h"
+#include "core/files/Paths.h"
+#include "core/formats/PropertyList.h"
+#include "core/locale/LocaleDisplayName_p.h"
+#include "core/locale/LocalizationTable.h"
+#include "core/services/Services.h"
 
 #include <QCryptographicHash>
 #include <QDir>

@@ -1,6 +1,6 @@
 #include "FakeAdministratorService.h"
 
-#include "platform/BundleRemoval.h"
+#include "core/services/BundleRemoval.h"
 
 namespace Cadenza::Platform {
 

@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_FAKEADMINISTRATORSERVICE_H
 #define CADENZA_TESTS_FAKEADMINISTRATORSERVICE_H
 
-#include "platform/AdministratorService.h"
+#include "core/services/AdministratorService.h"
 
 #include <QStringList>
 

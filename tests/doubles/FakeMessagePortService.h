@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_FAKEMESSAGEPORTSERVICE_H
 #define CADENZA_TESTS_FAKEMESSAGEPORTSERVICE_H
 
-#include "platform/MessagePort.h"
+#include "core/services/MessagePort.h"
 
 #include <QHash>
 #include <QList>

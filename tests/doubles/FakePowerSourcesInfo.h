@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_FAKEPOWERSOURCESINFO_H
 #define CADENZA_TESTS_FAKEPOWERSOURCESINFO_H
 
-#include "platform/PowerSourcesInfo.h"
+#include "core/services/PowerSourcesInfo.h"
 
 namespace Cadenza::Platform {
 

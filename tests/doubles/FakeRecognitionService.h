@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_FAKERECOGNITIONSERVICE_H
 #define CADENZA_TESTS_FAKERECOGNITIONSERVICE_H
 
-#include "platform/RecognitionService.h"
+#include "core/services/RecognitionService.h"
 
 #include <QHash>
 

@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_FAKESOUNDSERVICE_H
 #define CADENZA_TESTS_FAKESOUNDSERVICE_H
 
-#include "platform/SoundService.h"
+#include "core/services/SoundService.h"
 
 #include <QList>
 

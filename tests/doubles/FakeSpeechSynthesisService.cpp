@@ -1,7 +1,7 @@
 #include "FakeSpeechSynthesisService.h"
 
-#include "platform/Logging.h"
-#include "platform/WaveFile.h"
+#include "core/Logging.h"
+#include "core/formats/WaveFile.h"
 
 #include <QTimer>
 

@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_FAKESPEECHSYNTHESISSERVICE_H
 #define CADENZA_TESTS_FAKESPEECHSYNTHESISSERVICE_H
 
-#include "platform/SpeechSynthesisService.h"
+#include "core/services/SpeechSynthesisService.h"
 
 namespace Cadenza::Platform {
 

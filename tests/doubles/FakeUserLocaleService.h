@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_FAKEUSERLOCALESERVICE_H
 #define CADENZA_TESTS_FAKEUSERLOCALESERVICE_H
 
-#include "platform/UserLocaleService.h"
+#include "core/services/UserLocaleService.h"
 
 namespace Cadenza::Platform {
 

@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_INPROCESSNOTIFICATIONCENTER_H
 #define CADENZA_TESTS_INPROCESSNOTIFICATIONCENTER_H
 
-#include "platform/DistributedNotificationCenter.h"
+#include "core/services/DistributedNotificationCenter.h"
 
 namespace Cadenza::Platform {
 

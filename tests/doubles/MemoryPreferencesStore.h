@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_MEMORYPREFERENCESSTORE_H
 #define CADENZA_TESTS_MEMORYPREFERENCESSTORE_H
 
-#include "platform/PreferencesStore.h"
+#include "core/services/PreferencesStore.h"
 
 #include <QHash>
 #include <QVariantMap>

@@ -4,12 +4,12 @@
 #include "QuillondProcess.h"
 #include "TestEnvironment.h"
 
-#include "platform/BundleSpeechSynthesisService.h"
-#include "platform/FilePreferencesStore.h"
-#include "platform/Paths.h"
-#include "platform/Services.h"
-#include "voices/CZVoiceObject.h"
-#include "voices/SpeechSynthesizer.h"
+#include "core/files/Paths.h"
+#include "core/services/BundleSpeechSynthesisService.h"
+#include "core/services/FilePreferencesStore.h"
+#include "core/services/Services.h"
+#include "core/voices/CZVoiceObject.h"
+#include "core/voices/SpeechSynthesizer.h"
 
 #include <QDir>
 #include <QFile>

@@ -4,9 +4,9 @@
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "installation/CZSpeechInstallationManager_p.h"
-#include "platform/Paths.h"
+#include "core/files/Paths.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 
 #include <QDir>
 #include <QElapsedTimer>

@@ -5,11 +5,11 @@
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
 
-#include "installation/CZSpeechInstallationManager.h"
-#include "installation/CZSpeechInstallationManager_p.h"
-#include "installation/InstallerProtocol.h"
-#include "platform/MessageFrame.h"
-#include "platform/UnixMessagePortService.h"
+#include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
+#include "core/services/UnixMessagePortService.h"
+#include "protocol/InstallerProtocol.h"
+#include "protocol/MessageFrame.h"
 
 #include <QElapsedTimer>
 #include <QLocalSocket>

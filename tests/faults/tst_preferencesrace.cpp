@@ -2,8 +2,8 @@
 // synchronised on its own: no update may be lost, and the file must parse whenever anyone reads it.
 #include "TestEnvironment.h"
 
-#include "platform/FilePreferencesStore.h"
-#include "platform/PropertyList.h"
+#include "core/formats/PropertyList.h"
+#include "core/services/FilePreferencesStore.h"
 
 #include <QCoreApplication>
 #include <QFile>

@@ -164,15 +164,14 @@ target_include_directories(helper-path PRIVATE ${PRIVATE_HEADERS_DIR})
 target_link_libraries(helper-path PRIVATE Cadenza::Core)
 CMAKE
 cat >"$work/helper-path/main.cpp" <<'CPP'
-#include "AdministratorService.h"
+#include <core/services/AdministratorService.h>
 #include <cstdio>
 int main() { std::puts(qPrintable(Cadenza::Platform::PolkitAdministratorService::helperPath())); }
 CPP
 # The administrator service is private: its declaration comes from the source tree, its code from the
 # installed library.
-admin_h=$(find "$source/src" -name AdministratorService.h | head -1)
 cmake -S "$work/helper-path" -B "$work/helper-path/build" "${example_args[@]}" \
-  -DPRIVATE_HEADERS_DIR="$(dirname "$admin_h")" >/dev/null
+  -DPRIVATE_HEADERS_DIR="$source/src" >/dev/null
 cmake --build "$work/helper-path/build" >/dev/null
 helper=$(env -u CADENZA_REMOVE_HELPER LD_LIBRARY_PATH="$prefix/lib" "$work/helper-path/build/helper-path")
 configured=$(sed -n 's/^CMAKE_INSTALL_PREFIX:PATH=//p' "$build/CMakeCache.txt")

@@ -9,11 +9,11 @@
 #include "SsmlText.h"
 #include "TestEnvironment.h"
 
-#include "platform/Paths.h"
-#include "platform/PreferencesStore.h"
-#include "platform/PropertyList.h"
-#include "platform/Services.h"
-#include "platform/SpeechSynthesisService.h"
+#include "core/files/Paths.h"
+#include "core/formats/PropertyList.h"
+#include "core/services/PreferencesStore.h"
+#include "core/services/Services.h"
+#include "core/services/SpeechSynthesisService.h"
 
 #include <QDir>
 #include <QFile>

@@ -10,7 +10,7 @@
 #include "ModuleDriver.h"
 #include "TestEnvironment.h"
 
-#include "platform/Paths.h"
+#include "core/files/Paths.h"
 
 #include <QDir>
 #include <QFile>

@@ -1,0 +1,19 @@
+#ifndef CADENZA_CUSTOMIZEVOICES_CZVOICEROWTEXTVIEW_H
+#define CADENZA_CUSTOMIZEVOICES_CZVOICEROWTEXTVIEW_H
+
+#include "cadenza_export.h"
+#include "widgets/helpers/ClickThroughLabel.h"
+
+namespace Cadenza {
+
+/// The label of a voice row: a click on it selects the row rather than stopping at the label.
+class CADENZA_EXPORT CZVoiceRowTextView : public Platform::ClickThroughLabel
+{
+    Q_OBJECT
+public:
+    explicit CZVoiceRowTextView(QWidget *parent = nullptr);
+};
+
+} // namespace Cadenza
+
+#endif
