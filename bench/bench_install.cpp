@@ -6,6 +6,7 @@
 
 #include "core/formats/PropertyList.h"
 #include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 #include "protocol/InstallerProtocol.h"
 
 #include <QCoreApplication>
@@ -88,7 +89,7 @@ int main(int argc, char *argv[])
     QProcess daemon;
     startDaemon(daemon, world, packages, repository);
     CZSpeechInstallationManager manager;
-    for (int i = 0; i < 100 && !manager._serverIsRunning(); ++i) {
+    for (int i = 0; i < 100 && !CZSpeechInstallationManagerPrivate::get(&manager)->_serverIsRunning(); ++i) {
         QThread::msleep(50);
     }
 
@@ -103,8 +104,9 @@ int main(int argc, char *argv[])
                     outcome = message;
                     loop.quit();
                 });
-            manager._requestInstallation(QStringLiteral("VOICEID:bench.large"), QStringLiteral("Large"),
-                quint64(archiveSize), QStringLiteral("bench.large"), 0);
+            CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(
+                QStringLiteral("VOICEID:bench.large"), QStringLiteral("Large"), quint64(archiveSize),
+                QStringLiteral("bench.large"), 0);
             loop.exec();
             if (outcome != InstallerProtocol::InstalledCompletion) {
                 qFatal("installation failed");

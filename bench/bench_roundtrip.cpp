@@ -6,6 +6,7 @@
 
 #include "core/formats/PropertyList.h"
 #include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 #include "core/services/Services.h"
 #include "core/services/UnixMessagePortService.h"
 #include "protocol/InstallerProtocol.h"
@@ -129,10 +130,10 @@ int main(int argc, char *argv[])
     QProcess daemon;
     startDaemon(daemon, world, packages, world.filePath(QStringLiteral("repository")));
     CZSpeechInstallationManager manager;
-    for (int i = 0; i < 100 && !manager._serverIsRunning(); ++i) {
+    for (int i = 0; i < 100 && !CZSpeechInstallationManagerPrivate::get(&manager)->_serverIsRunning(); ++i) {
         QThread::msleep(50);
     }
-    if (!manager._serverIsRunning()) {
+    if (!CZSpeechInstallationManagerPrivate::get(&manager)->_serverIsRunning()) {
         std::fputs("quillond did not start\n", stderr);
         return 1;
     }
@@ -143,8 +144,9 @@ int main(int argc, char *argv[])
         while (queued < active) {
             // A request's reply port has a random 16-bit number in its name; a number already taken
             // by an earlier request fails this one, so it is asked again.
-            if (manager._requestInstallation(QStringLiteral("VOICEID:bench.%1").arg(queued),
-                    QStringLiteral("Bench"), 1, QStringLiteral("bench.%1").arg(queued), 0)) {
+            if (CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(
+                    QStringLiteral("VOICEID:bench.%1").arg(queued), QStringLiteral("Bench"), 1,
+                    QStringLiteral("bench.%1").arg(queued), 0)) {
                 ++queued;
             }
         }

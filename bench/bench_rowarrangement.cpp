@@ -3,11 +3,11 @@
 
 #include "BenchTable.h"
 
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "InProcessNotificationCenter.h"
+#include "MemoryPreferencesStore.h"
 #include "core/rows/VoiceTableRow.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/InProcessNotificationCenter.h"
-#include "core/services/MemoryPreferencesStore.h"
 #include "core/services/Services.h"
 
 #include <QCollator>

@@ -3,10 +3,10 @@
 
 #include "BenchTable.h"
 
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/InProcessNotificationCenter.h"
-#include "core/services/MemoryPreferencesStore.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "InProcessNotificationCenter.h"
+#include "MemoryPreferencesStore.h"
 #include "core/services/Services.h"
 #include "core/voices/CZVoiceObject.h"
 

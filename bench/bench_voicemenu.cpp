@@ -7,11 +7,11 @@
 
 #include "BenchTable.h"
 
-#include "core/services/FakeMessagePortService.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/InProcessNotificationCenter.h"
-#include "core/services/MemoryPreferencesStore.h"
+#include "FakeMessagePortService.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "InProcessNotificationCenter.h"
+#include "MemoryPreferencesStore.h"
 #include "core/services/Services.h"
 #include "core/voices/CZVoiceObject.h"
 #include "widgets/customize-voices/CustomizeVoicesWindowController.h"
@@ -76,7 +76,7 @@ void measureMenu(int count)
     popUp.buildPopUpButtonWithSelectVoiceIdentifier(QStringLiteral("com.vendra.bench.voice00000"));
     // Emptying the shared menu makes the pop-up rebuild it and adopt the new one.
     const std::vector<double> build
-        = samplesOf(5, [&] { CZVoicePopUpButton::_forceAllVoicePopupsToUpdate(); });
+        = samplesOf(5, [&] { CZVoicePopUpButtonPrivate::_forceAllVoicePopupsToUpdate(); });
     const std::string n = " (" + std::to_string(count) + " voices, 40 languages)";
     printTable(("Shared voice menu" + n).c_str(),
         {{"build the shared menu and adopt it, ms", median(build) * 1e3, "ms",

@@ -2,6 +2,7 @@
 #include "SettingsWindow.h"
 
 #include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 #include "core/services/SpeechDispatcherModule.h"
 #include "core/voices/CZVoiceObject.h"
 #include "core/voices/DownloadableVoice.h"
@@ -65,7 +66,7 @@ bool tickAndDownload(Cadenza::CustomizeVoicesWindowController *sheet, const std:
             chosen = row;
         }
     }
-    if (chosen < 0 || !manager->_serverIsReachable()) {
+    if (chosen < 0 || !Cadenza::CZSpeechInstallationManagerPrivate::get(manager)->_serverIsReachable()) {
         sheet->cancelVoiceSelection();
         return false;
     }

@@ -4,6 +4,7 @@
 
 #include "core/formats/PropertyList.h"
 #include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 #include "core/locale/LocalizationTable.h"
 #include "protocol/InstallerProtocol.h"
 
@@ -101,7 +102,7 @@ int InstallerCommands::status(const QStringList &arguments)
         return *done;
     }
     CZSpeechInstallationManager manager;
-    if (!manager._serverIsReachable()) {
+    if (!CZSpeechInstallationManagerPrivate::get(&manager)->_serverIsReachable()) {
         if (parser.isSet(json)) {
             std::fputs("[]\n", stdout);
         }
@@ -150,7 +151,7 @@ int InstallerCommands::install(const QStringList &arguments)
         return CommandLine::BadUsage;
     }
     CZSpeechInstallationManager manager;
-    if (!manager._serverIsReachable()) {
+    if (!CZSpeechInstallationManagerPrivate::get(&manager)->_serverIsReachable()) {
         CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonUnreachable")));
         return CommandLine::DaemonUnreachable;
     }
@@ -182,7 +183,8 @@ int InstallerCommands::install(const QStringList &arguments)
             }
             loop.quit();
         });
-    if (!manager._requestInstallation(tag, item.name, item.byteSize, item.objectIdentifier, 0)) {
+    if (!CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(
+            tag, item.name, item.byteSize, item.objectIdentifier, 0)) {
         CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonUnreachable")));
         return CommandLine::DaemonUnreachable;
     }
@@ -203,9 +205,10 @@ int InstallerCommands::install(const QStringList &arguments)
             }
         }
         // A socket-activated daemon may take a moment to come up; once it ran, its going is the end.
-        const bool running = manager._serverIsRunning();
+        const bool running = CZSpeechInstallationManagerPrivate::get(&manager)->_serverIsRunning();
         seenRunning = seenRunning || running;
-        if ((seenRunning && !running) || !manager._serverIsReachable()) {
+        if ((seenRunning && !running)
+            || !CZSpeechInstallationManagerPrivate::get(&manager)->_serverIsReachable()) {
             CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonStopped")));
             exitCode = CommandLine::DaemonUnreachable;
             loop.exit();
@@ -224,7 +227,7 @@ int InstallerCommands::cancel(const QStringList &arguments)
         return *done;
     }
     CZSpeechInstallationManager manager;
-    if (!manager._serverIsReachable()) {
+    if (!CZSpeechInstallationManagerPrivate::get(&manager)->_serverIsReachable()) {
         CommandLine::fail(arguments, CommandLine::text(QStringLiteral("CLIDaemonNotRunning")));
         return CommandLine::DaemonUnreachable;
     }

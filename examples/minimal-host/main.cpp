@@ -1,5 +1,8 @@
 // A window with Cadenza's voice pop-up, its download status line and the voice settings dialog.
 // Run with --check to build the window, print the chosen voice and exit.
+#include <Cadenza/CZVoicePopUpButton>
+#include <Cadenza/SpeechSynthesizer>
+#include <Cadenza/SpeechSynthesizerVoiceSettings>
 #include <core/voices/SpeechSynthesizer.h>
 #include <widgets/voice-popup/CZVoicePopUpButton.h>
 #include <widgets/voice-settings/SpeechSynthesizerVoiceSettings.h>

@@ -3,8 +3,8 @@
 
 #include "SettingsWindow.h"
 
+#include "FakeUserLocaleService.h"
 #include "core/files/Paths.h"
-#include "core/services/FakeUserLocaleService.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem.h"
 #include "core/voices/SpeechSynthesizer.h"

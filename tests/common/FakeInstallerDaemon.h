@@ -1,7 +1,7 @@
 #ifndef CADENZA_TESTS_FAKEINSTALLERDAEMON_H
 #define CADENZA_TESTS_FAKEINSTALLERDAEMON_H
 
-#include "core/services/FakeMessagePortService.h"
+#include "FakeMessagePortService.h"
 
 #include <QVariantList>
 

@@ -7,6 +7,7 @@
 #include "core/formats/WaveFile.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/services/BundleSpeechSynthesisService.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 #include "core/services/DistributedNotificationCenter.h"
 #include "core/services/Services.h"
 #include "core/services/UnixMessagePortService.h"
@@ -78,11 +79,11 @@ private Q_SLOTS:
         QSignalSpy notifications(&Platform::Services::notifications(),
             &Platform::DistributedNotificationCenter::notificationPosted);
         const QString voice = QStringLiteral("com.vendra.speech.synthesis.voice.tobias.premium");
-        QVERIFY(m_manager->_requestInstallation(
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_requestInstallation(
             QStringLiteral("VOICEID:") + voice, QStringLiteral("Tobias"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion));
         QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/TobiasPremium.SpeechVoice/Info.plist")));
-        QVERIFY(m_manager->pendingLocalPortNames().isEmpty());
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames().isEmpty());
         if (QDBusConnection::sessionBus().isConnected()) {
             // Other tests share the session bus: only this voice's notifications count.
             auto namesForThisVoice = [&] {
@@ -101,7 +102,7 @@ private Q_SLOTS:
         QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
 
         // Installing again replaces the bundle in one step.
-        QVERIFY(m_manager->_requestInstallation(
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_requestInstallation(
             QStringLiteral("VOICEID:") + voice, QStringLiteral("Tobias"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion));
         QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/TobiasPremium.SpeechVoice/Info.plist")));
@@ -142,12 +143,12 @@ private Q_SLOTS:
         QCOMPARE(downloading.value(ItemByteSizeKey).toULongLong(), m_bigSize);
         QCOMPARE(waiting.value(ItemDownloadStatusKey).toLongLong(), qint64(WaitingStatus));
         // One at a time, in request order; each request's own port is closed by its own completion.
-        QCOMPARE(m_manager->pendingLocalPortNames().size(), 2);
+        QCOMPARE(CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames().size(), 2);
         QVERIFY(waitForCompletion(InstalledCompletion, 30000));
         QCOMPARE(m_finished->first().at(0).toString(), BigTag);
         QVERIFY(waitForCompletions(2, 10000));
         QCOMPARE(m_finished->at(1).at(0).toString(), SmallTag);
-        QVERIFY(m_manager->pendingLocalPortNames().isEmpty());
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames().isEmpty());
         QVERIFY(m_manager->activeInstallations().isEmpty());
     }
 
@@ -223,7 +224,7 @@ private Q_SLOTS:
         server.dropNextTransferAfter(1024 * 1024 + 17);
         startDaemon({QStringLiteral("--repository"), server.baseUrl().toString()});
         const QString voice = Cadenza::SpeechNames::OrinIdentifier;
-        QVERIFY(m_manager->_requestInstallation(
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_requestInstallation(
             QStringLiteral("VOICEID:") + voice, QStringLiteral("Orin"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion, 30000));
         QVERIFY(server.rangeRequestCount() >= 1);
@@ -401,7 +402,8 @@ private Q_SLOTS:
         QVERIFY(request(BigTag));
         QVERIFY(QTest::qWaitFor([&] { return downloadedBytes(BigTag) > 0; }, 10000));
 
-        Platform::LocalMessagePort *port = m_manager->_createLocalPort();
+        Platform::LocalMessagePort *port
+            = CZSpeechInstallationManagerPrivate::get(m_manager.get())->_createLocalPort();
         QVERIFY(port);
         QVariantMap record {{TagNameKey, SmallTag}, {ItemNameKey, QStringLiteral("Small")},
             {ItemByteSizeKey, qint64(1)}, {ClientPortNameKey, port->name()},
@@ -413,7 +415,8 @@ private Q_SLOTS:
         }
         const QByteArray archived = CZEncodeSecureObject(record);
         QVERIFY(!archived.isEmpty());
-        (void)m_manager->_sendMessage(StartInstallingMessage, archived, false);
+        (void)CZSpeechInstallationManagerPrivate::get(m_manager.get())
+            ->_sendMessage(StartInstallingMessage, archived, false);
         QVERIFY2(waitForCompletion(FailedCompletion), "the malformed request got no answer");
         const QString reason = m_finished->last().at(2).toMap().value(FailureReasonKey).toString();
         QVERIFY2(reason.contains(named), qPrintable(reason));
@@ -445,15 +448,15 @@ private Q_SLOTS:
         QVERIFY(manager.waitForStarted(5000));
         QVERIFY(QTest::qWaitFor([&] { return QFileInfo::exists(socket); }, 5000));
         // The service manager holds the request port; the daemon itself is not there yet.
-        QVERIFY(!m_manager->_serverIsRunning());
-        QVERIFY(m_manager->_serverIsReachable());
+        QVERIFY(!CZSpeechInstallationManagerPrivate::get(m_manager.get())->_serverIsRunning());
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_serverIsReachable());
         QVERIFY(request(SmallTag));
         QVERIFY(waitForCompletion(InstalledCompletion, 20000));
         // After its idle time it exits, and leaves the socket it was given where it was.
         QVERIFY(manager.waitForFinished(15000));
         QCOMPARE(manager.exitCode(), 0);
         QVERIFY(QFileInfo::exists(socket));
-        QVERIFY(!m_manager->_serverIsRunning());
+        QVERIFY(!CZSpeechInstallationManagerPrivate::get(m_manager.get())->_serverIsRunning());
     }
 
 private:
@@ -528,7 +531,8 @@ private:
 
     bool request(const QString &tag)
     {
-        return m_manager->_requestInstallation(tag, tag.section(QLatin1Char('.'), -2, -2), 1, tag.mid(8), 0);
+        return CZSpeechInstallationManagerPrivate::get(m_manager.get())
+            ->_requestInstallation(tag, tag.section(QLatin1Char('.'), -2, -2), 1, tag.mid(8), 0);
     }
     static QVariant nested(int depth)
     {

@@ -6,6 +6,7 @@
 
 #include "core/files/Paths.h"
 #include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 
 #include <QDir>
 #include <QElapsedTimer>
@@ -50,8 +51,9 @@ private Q_SLOTS:
         } else {
             QVERIFY(daemon.start(repository, {QStringLiteral("QUILLOND_STALL_BEFORE=") + stage}));
         }
-        QVERIFY(manager._requestInstallation(FemkeTag, QStringLiteral("Femke"), 696,
-            QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"), 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(FemkeTag,
+            QStringLiteral("Femke"), 696, QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"),
+            0));
         if (stage == u"downloading") {
             QTRY_VERIFY_WITH_TIMEOUT(
                 !Testing::QuillondProcess::leftovers().isEmpty(), 10000); // the partial download
@@ -82,8 +84,9 @@ private Q_SLOTS:
         QVERIFY(next.start(repository));
         QVERIFY2(Testing::QuillondProcess::leftovers().isEmpty(),
             qPrintable(Testing::QuillondProcess::leftovers().join(u' ')));
-        QVERIFY(manager._requestInstallation(FemkeTag, QStringLiteral("Femke"), 696,
-            QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"), 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(FemkeTag,
+            QStringLiteral("Femke"), 696, QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"),
+            0));
         QTRY_VERIFY_WITH_TIMEOUT(QFileInfo::exists(femkeBundle() + QStringLiteral("/Info.plist")), 10000);
         QTRY_VERIFY_WITH_TIMEOUT(manager.activeInstallations().isEmpty(), 10000);
         QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());

@@ -7,6 +7,7 @@
 
 #include "core/SpeechNames.h"
 #include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 #include "core/services/UnixMessagePortService.h"
 #include "protocol/InstallerProtocol.h"
 #include "protocol/MessageFrame.h"
@@ -61,8 +62,9 @@ private Q_SLOTS:
         Testing::QuillondProcess daemon;
         QVERIFY(daemon.start({QStringLiteral("--repository"), http.baseUrl().toString()}));
         CZSpeechInstallationManager manager;
-        QVERIFY(manager._requestInstallation(FemkeTag, QStringLiteral("Femke"), 696,
-            QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"), 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(FemkeTag,
+            QStringLiteral("Femke"), 696, QStringLiteral("com.vendra.speech.synthesis.voice.femke.compact"),
+            0));
         QTRY_COMPARE(manager.activeInstallations().size(), 1);
 
         const auto [quiet, quietAnswered] = ask(manager, 200);
@@ -98,7 +100,7 @@ private Q_SLOTS:
         QTRY_COMPARE(noisy->state(), QLocalSocket::UnconnectedState);
         QTRY_COMPARE(huge->state(), QLocalSocket::UnconnectedState);
         // And the daemon still takes work.
-        QVERIFY(manager._requestInstallation(
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(&manager)->_requestInstallation(
             InstallerProtocol::VoiceTagPrefix + Cadenza::SpeechNames::OrinIdentifier, QStringLiteral("Orin"),
             709, Cadenza::SpeechNames::OrinIdentifier, 0));
         QTRY_COMPARE(manager.activeInstallations().size(), 2);

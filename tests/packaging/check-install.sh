@@ -1,8 +1,9 @@
 #!/usr/bin/env bash
 # Installs the build into a temporary prefix (and staged into a DESTDIR), checks that nothing lands
 # outside it and that the units and the policy name the programs there, validates the desktop entry
-# and the AppStream metadata, and builds and runs the example host application against the installed
-# CMake package.
+# and the AppStream metadata, checks that the installed headers are the public ones and name no test
+# double and no platform implementation, and builds and runs the example host application and a
+# program including every public header against the installed CMake package.
 # Usage: check-install.sh BUILD_DIR SOURCE_DIR
 set -euo pipefail
 build=$1
@@ -22,7 +23,7 @@ check_staged() { # ROOT PREFIX: files were installed into ROOT and will run from
     echo "$outside" >&2
     exit 1
   fi
-  for f in lib/cmake/Cadenza/CadenzaConfig.cmake include/cadenza/widgets/voice-popup/CZVoicePopUpButton.h \
+  for f in lib/cmake/Cadenza/CadenzaConfig.cmake include/cadenza/Cadenza/CZVoicePopUpButton \
            include/cadenza/cadenza_export.h bin/quillond bin/cadenza bin/cadenza-settings \
            lib/systemd/user/quillond.service lib/systemd/user/quillond.socket \
            share/applications/org.cadenza.Settings.desktop share/metainfo/org.cadenza.Settings.metainfo.xml \
@@ -99,6 +100,22 @@ if find "$prefix/include" -name '*_p.h' | grep -q .; then
   echo "private headers were installed" >&2
   exit 1
 fi
+# No installed header names a test double or a platform implementation: the doubles are the classes of
+# tests/doubles, the implementations the final classes of the source tree that implement one of the
+# platform services (the interfaces Services.h names).
+services_h=$(find "$source/src" -name Services.h | head -1)
+interfaces=$(sed -n 's/^class \([A-Za-z]*\);$/\1/p' "$services_h" | paste -sd'|')
+[ -n "$interfaces" ] || { echo "no service interfaces found in $services_h" >&2; exit 1; }
+hidden=$( { grep -rhoE "^class ([A-Z_]+_EXPORT )?[A-Za-z]+ final : public ($interfaces)\b" "$source/src" \
+              | sed -E 's/^class ([A-Z_]+_EXPORT )?([A-Za-z]+) .*/\2/'
+            grep -rhoE '^class [A-Za-z]+' "$source/tests/doubles" | sed 's/^class //'; } | sort -u)
+[ "$(echo "$hidden" | wc -l)" -ge 10 ] || { echo "too few implementations and doubles found: $hidden" >&2; exit 1; }
+named=$(grep -rlwF "$hidden" "$prefix/include" || true)
+if [ -n "$named" ]; then
+  echo "installed headers name a test double or a platform implementation:" >&2
+  grep -rnwF "$hidden" "$prefix/include" >&2
+  exit 1
+fi
 desktop-file-validate "$prefix/share/applications/org.cadenza.Settings.desktop"
 appstreamcli validate --no-net --pedantic "$prefix/share/metainfo/org.cadenza.Settings.metainfo.xml"
 
@@ -111,6 +128,29 @@ cmake -S "$source/examples/minimal-host" -B "$work/example" "${example_args[@]}"
 cmake --build "$work/example" --parallel "$(nproc)" >/dev/null
 LD_LIBRARY_PATH="$prefix/lib" QT_QPA_PLATFORM=offscreen "$work/example/minimal-host" --check
 
+# Every public header compiles on its own against the installed package, so none of them includes a
+# header that was left behind.
+mkdir -p "$work/all-headers"
+cat >"$work/all-headers/CMakeLists.txt" <<'CMAKE'
+cmake_minimum_required(VERSION 3.25)
+project(AllHeaders LANGUAGES CXX)
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_AUTOMOC ON)
+find_package(Cadenza 0.1 REQUIRED)
+file(GLOB sources ${CMAKE_CURRENT_SOURCE_DIR}/*.cpp)
+add_library(all-headers OBJECT ${sources})
+target_link_libraries(all-headers PRIVATE Cadenza::Cadenza)
+CMAKE
+public_headers=0
+for forwarding in "$prefix"/include/cadenza/Cadenza/*; do
+  name=$(basename "$forwarding")
+  printf '#include <Cadenza/%s>\n#include <Cadenza/%s>\n' "$name" "$name" >"$work/all-headers/$name.cpp"
+  public_headers=$((public_headers + 1))
+done
+[ "$public_headers" -ge 10 ] || { echo "only $public_headers public headers installed" >&2; exit 1; }
+cmake -S "$work/all-headers" -B "$work/all-headers/build" "${example_args[@]}" >/dev/null
+cmake --build "$work/all-headers/build" --parallel "$(nproc)" >/dev/null
+
 # The library of an installation whose prefix differs from the configured one finds the removal
 # helper of that installation, the one its policy names.
 mkdir -p "$work/helper-path"
@@ -120,6 +160,7 @@ project(HelperPath LANGUAGES CXX)
 set(CMAKE_CXX_STANDARD 20)
 find_package(Cadenza 0.1 REQUIRED)
 add_executable(helper-path main.cpp)
+target_include_directories(helper-path PRIVATE ${PRIVATE_HEADERS_DIR})
 target_link_libraries(helper-path PRIVATE Cadenza::Core)
 CMAKE
 cat >"$work/helper-path/main.cpp" <<'CPP'
@@ -127,7 +168,10 @@ cat >"$work/helper-path/main.cpp" <<'CPP'
 #include <cstdio>
 int main() { std::puts(qPrintable(Cadenza::Platform::PolkitAdministratorService::helperPath())); }
 CPP
-cmake -S "$work/helper-path" -B "$work/helper-path/build" "${example_args[@]}" >/dev/null
+# The administrator service is private: its declaration comes from the source tree, its code from the
+# installed library.
+cmake -S "$work/helper-path" -B "$work/helper-path/build" "${example_args[@]}" \
+  -DPRIVATE_HEADERS_DIR="$source/src" >/dev/null
 cmake --build "$work/helper-path/build" >/dev/null
 helper=$(env -u CADENZA_REMOVE_HELPER LD_LIBRARY_PATH="$prefix/lib" "$work/helper-path/build/helper-path")
 configured=$(sed -n 's/^CMAKE_INSTALL_PREFIX:PATH=//p' "$build/CMakeCache.txt")

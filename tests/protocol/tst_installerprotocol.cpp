@@ -1,8 +1,9 @@
 #include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
+#include "FakeMessagePortService.h"
 #include "core/installation/CZSpeechInstallationManager.h"
-#include "core/services/FakeMessagePortService.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 #include "core/services/Services.h"
 #include "protocol/InstallerProtocol.h"
 #include "protocol/KeyedArchive.h"
@@ -64,7 +65,7 @@ private Q_SLOTS:
 
     void withoutADaemonNothingIsSent()
     {
-        QVERIFY(!m_manager->_serverIsRunning());
+        QVERIFY(!CZSpeechInstallationManagerPrivate::get(m_manager.get())->_serverIsRunning());
         QVERIFY(m_manager->activeInstallations().isEmpty());
         m_manager->showProgressWindow();
         m_manager->cancelAllInstallations();
@@ -74,10 +75,12 @@ private Q_SLOTS:
     void aRequestCarriesEightEntriesAndItsOwnPort()
     {
         Testing::FakeInstallerDaemon daemon(*m_ports);
-        QVERIFY(m_manager->_requestInstallation(
-            QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1234, QStringLiteral("v.premium"), 1));
-        QVERIFY(m_manager->_requestInstallation(
-            QStringLiteral("VOICEID:w.premium"), QStringLiteral("W"), 99, QStringLiteral("w.premium"), 1));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                    ->_requestInstallation(QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1234,
+                        QStringLiteral("v.premium"), 1));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                    ->_requestInstallation(QStringLiteral("VOICEID:w.premium"), QStringLiteral("W"), 99,
+                        QStringLiteral("w.premium"), 1));
         QCOMPARE(daemon.messages().size(), 2);
         const QVariantMap first
             = CZDecodeSecureDictionary(daemon.messages().at(0).second).value_or(QVariantMap());
@@ -93,7 +96,7 @@ private Q_SLOTS:
         QVERIFY(match.hasMatch());
         QVERIFY(match.captured(1).toInt() <= 65535);
         QVERIFY(first.value(ClientPortNameKey) != second.value(ClientPortNameKey));
-        QCOMPARE(m_manager->pendingLocalPortNames().size(), 2);
+        QCOMPARE(CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames().size(), 2);
 
         // Each completion closes its own port and reaches the delegate with its tag.
         const QString firstPort = first.value(ClientPortNameKey).toString();
@@ -102,28 +105,33 @@ private Q_SLOTS:
         QCOMPARE(m_delegate->calls.size(), 1);
         QCOMPARE(m_delegate->calls.first().first, QStringList {QStringLiteral("VOICEID:v.premium")});
         QCOMPARE(m_delegate->calls.first().second, qint32(InstalledCompletion));
-        QCOMPARE(
-            m_manager->pendingLocalPortNames(), QStringList {second.value(ClientPortNameKey).toString()});
+        QCOMPARE(CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames(),
+            QStringList {second.value(ClientPortNameKey).toString()});
         QVERIFY(!m_ports->localPortNames().contains(firstPort));
     }
 
     void incompleteItemsAreSkipped()
     {
         Testing::FakeInstallerDaemon daemon(*m_ports);
-        QVERIFY(!m_manager->_requestInstallation(QString(), QStringLiteral("V"), 1, QStringLiteral("v"), 0));
-        QVERIFY(!m_manager->_requestInstallation(
-            QStringLiteral("VOICEID:v"), QString(), 1, QStringLiteral("v"), 0));
-        QVERIFY(!m_manager->_requestInstallation(
-            QStringLiteral("VOICEID:v"), QStringLiteral("V"), 1, QString(), 0));
+        QVERIFY(!CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                     ->_requestInstallation(QString(), QStringLiteral("V"), 1, QStringLiteral("v"), 0));
+        QVERIFY(
+            !CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                 ->_requestInstallation(QStringLiteral("VOICEID:v"), QString(), 1, QStringLiteral("v"), 0));
+        QVERIFY(
+            !CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                 ->_requestInstallation(QStringLiteral("VOICEID:v"), QStringLiteral("V"), 1, QString(), 0));
         QVERIFY(daemon.messages().isEmpty());
     }
 
     void otherCompletionIdsLeaveThePortOpen()
     {
         Testing::FakeInstallerDaemon daemon(*m_ports);
-        QVERIFY(m_manager->_requestInstallation(
-            QStringLiteral("SRCLANGID:de_DE"), QStringLiteral("German"), 1, QStringLiteral("de_DE"), 0));
-        const QString port = m_manager->pendingLocalPortNames().value(0);
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                    ->_requestInstallation(QStringLiteral("SRCLANGID:de_DE"), QStringLiteral("German"), 1,
+                        QStringLiteral("de_DE"), 0));
+        const QString port
+            = CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames().value(0);
         const QByteArray answer
             = CZEncodeSecureObject(QVariantMap {{TagNameKey, QStringLiteral("SRCLANGID:de_DE")}});
         QVERIFY(m_ports->deliver(port, 0, answer));
@@ -133,11 +141,12 @@ private Q_SLOTS:
                 "^Quillond returned nil data to port com\\.vendra\\.speech\\.quillond-\\d+$")));
         QVERIFY(m_ports->deliver(port, 1, QByteArray()));
         QVERIFY(m_delegate->calls.isEmpty());
-        QCOMPARE(m_manager->pendingLocalPortNames(), QStringList {port});
+        QCOMPARE(CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames(),
+            QStringList {port});
         QVERIFY(m_ports->deliver(port, FailedCompletion, answer));
         QCOMPARE(m_delegate->calls.size(), 1);
         QCOMPARE(m_delegate->calls.first().second, qint32(FailedCompletion));
-        QVERIFY(m_manager->pendingLocalPortNames().isEmpty());
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames().isEmpty());
     }
 
     void activeInstallationsDecodeOnlyArrays()
@@ -184,17 +193,21 @@ private Q_SLOTS:
     void aRequestNobodyReceivesIsReported()
     {
         QSignalSpy failed(m_manager.get(), &CZSpeechInstallationManager::installationRequestFailed);
-        QVERIFY(!m_manager->_requestInstallation(
-            QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1, QStringLiteral("v.premium"), 0));
+        QVERIFY(!CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                     ->_requestInstallation(QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1,
+                         QStringLiteral("v.premium"), 0));
         QCOMPARE(failed.size(), 1);
         QCOMPARE(failed.first().at(0).toString(), QStringLiteral("VOICEID:v.premium"));
         QCOMPARE(failed.first().at(1).toString(), QStringLiteral("V"));
         QCOMPARE(failed.first().at(2).toLongLong(), 0);
-        QVERIFY(m_manager->pendingLocalPortNames().isEmpty()); // nobody would ever answer it
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                    ->pendingLocalPortNames()
+                    .isEmpty()); // nobody would ever answer it
 
         Testing::FakeInstallerDaemon daemon(*m_ports);
-        QVERIFY(m_manager->_requestInstallation(
-            QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1, QStringLiteral("v.premium"), 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                    ->_requestInstallation(QStringLiteral("VOICEID:v.premium"), QStringLiteral("V"), 1,
+                        QStringLiteral("v.premium"), 0));
         QCOMPARE(failed.size(), 1);
     }
 
@@ -212,11 +225,11 @@ private Q_SLOTS:
     {
         auto daemon = std::make_unique<Testing::FakeInstallerDaemon>(*m_ports);
         daemon->setActiveRecords({});
-        QVERIFY(m_manager->_createServerPortIfNeeded());
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_createServerPortIfNeeded());
         daemon.reset();
-        QVERIFY(!m_manager->_createServerPortIfNeeded());
+        QVERIFY(!CZSpeechInstallationManagerPrivate::get(m_manager.get())->_createServerPortIfNeeded());
         daemon = std::make_unique<Testing::FakeInstallerDaemon>(*m_ports);
-        QVERIFY(m_manager->_createServerPortIfNeeded());
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_createServerPortIfNeeded());
         m_manager->cancelAllInstallations();
         QCOMPARE(daemon->messages().size(), 1);
         QCOMPARE(daemon->messages().first().first, qint32(CancelAllMessage));

@@ -9,11 +9,48 @@
 #include <QPointer>
 #include <QThread>
 
+#include <atomic>
+
 namespace Cadenza {
+
+class RecognizerPrivate
+{
+public:
+    explicit RecognizerPrivate(Recognizer *q)
+        : q(q)
+    { }
+
+    /// Disconnects and lets go of the microphone session, if there is one.
+    void endMicrophone();
+
+    Recognizer *const q;
+    QString m_language;
+    QString m_grammarFile;
+    bool m_running = false;
+    std::shared_ptr<std::atomic<bool>> m_cancelled;
+    MicrophoneSession *m_session = nullptr; ///< lives on MicrophoneSession::audioThread()
+    quint64 m_generation = 0;
+};
 
 Recognizer::Recognizer(QObject *parent)
     : QObject(parent)
+    , d(std::make_unique<RecognizerPrivate>(this))
 { }
+
+void Recognizer::setLanguage(const QString &locale)
+{
+    d->m_language = locale;
+}
+
+void Recognizer::setGrammarFile(const QString &path)
+{
+    d->m_grammarFile = path;
+}
+
+bool Recognizer::isRunning() const
+{
+    return d->m_running;
+}
 
 Recognizer::~Recognizer()
 {
@@ -23,12 +60,12 @@ Recognizer::~Recognizer()
 void Recognizer::startFromFile(const QString &path)
 {
     cancel();
-    m_running = true;
-    const quint64 generation = ++m_generation;
+    d->m_running = true;
+    const quint64 generation = ++d->m_generation;
     auto cancelled = std::make_shared<std::atomic<bool>>(false);
-    m_cancelled = cancelled;
-    const QString language = m_language;
-    const QString grammar = m_grammarFile;
+    d->m_cancelled = cancelled;
+    const QString language = d->m_language;
+    const QString grammar = d->m_grammarFile;
     QPointer<Recognizer> self(this);
     // Results travel back through the event loop; a cancelled or newer run drops them.
     const auto post = [self, generation, cancelled](auto deliver) {
@@ -39,7 +76,7 @@ void Recognizer::startFromFile(const QString &path)
         QMetaObject::invokeMethod(
             QCoreApplication::instance(),
             [self, generation, cancelled, deliver] {
-                if (self && !*cancelled && self->m_generation == generation) {
+                if (self && !*cancelled && self->d->m_generation == generation) {
                     deliver(self.data());
                 }
             },
@@ -49,7 +86,7 @@ void Recognizer::startFromFile(const QString &path)
         QString error;
         const auto fail = [&](const QString &reason) {
             post([reason](Recognizer *r) {
-                r->m_running = false;
+                r->d->m_running = false;
                 Q_EMIT r->failed(reason);
             });
         };
@@ -87,7 +124,7 @@ void Recognizer::startFromFile(const QString &path)
             return fail(error);
         }
         post([text = *text](Recognizer *r) {
-            r->m_running = false;
+            r->d->m_running = false;
             Q_EMIT r->finalResult(text);
         });
     });
@@ -98,36 +135,36 @@ void Recognizer::startFromFile(const QString &path)
 void Recognizer::startFromMicrophone()
 {
     cancel();
-    ++m_generation;
-    m_running = true;
-    m_session = new MicrophoneSession(m_language, m_grammarFile);
-    m_session->moveToThread(MicrophoneSession::audioThread());
+    ++d->m_generation;
+    d->m_running = true;
+    d->m_session = new MicrophoneSession(d->m_language, d->m_grammarFile);
+    d->m_session->moveToThread(MicrophoneSession::audioThread());
     // Queued: the session's signals come from the audio thread; once it is ended or cancelled it
     // is disconnected, so nothing it still sends arrives.
-    connect(m_session, &MicrophoneSession::listening, this, &Recognizer::listening);
-    connect(m_session, &MicrophoneSession::partialResult, this, &Recognizer::partialResult);
-    connect(m_session, &MicrophoneSession::finalResult, this, [this](const QString &text) {
-        endMicrophone();
+    connect(d->m_session, &MicrophoneSession::listening, this, &Recognizer::listening);
+    connect(d->m_session, &MicrophoneSession::partialResult, this, &Recognizer::partialResult);
+    connect(d->m_session, &MicrophoneSession::finalResult, this, [this](const QString &text) {
+        d->endMicrophone();
         Q_EMIT finalResult(text);
     });
-    connect(m_session, &MicrophoneSession::failed, this, [this](const QString &reason) {
-        endMicrophone();
+    connect(d->m_session, &MicrophoneSession::failed, this, [this](const QString &reason) {
+        d->endMicrophone();
         Q_EMIT failed(reason);
     });
-    QMetaObject::invokeMethod(m_session, &MicrophoneSession::start, Qt::QueuedConnection);
+    QMetaObject::invokeMethod(d->m_session, &MicrophoneSession::start, Qt::QueuedConnection);
 }
 
 void Recognizer::stop()
 {
-    if (m_session) {
-        QMetaObject::invokeMethod(m_session, &MicrophoneSession::finish, Qt::QueuedConnection);
+    if (d->m_session) {
+        QMetaObject::invokeMethod(d->m_session, &MicrophoneSession::finish, Qt::QueuedConnection);
     }
 }
 
-void Recognizer::endMicrophone()
+void RecognizerPrivate::endMicrophone()
 {
     if (m_session) {
-        disconnect(m_session, nullptr, this, nullptr);
+        QObject::disconnect(m_session, nullptr, q, nullptr);
         m_session->deleteLater(); // on its own thread
         m_session = nullptr;
     }
@@ -136,11 +173,11 @@ void Recognizer::endMicrophone()
 
 void Recognizer::cancel()
 {
-    if (m_cancelled) {
-        *m_cancelled = true;
-        m_cancelled.reset();
+    if (d->m_cancelled) {
+        *d->m_cancelled = true;
+        d->m_cancelled.reset();
     }
-    endMicrophone();
+    d->endMicrophone();
 }
 
 } // namespace Cadenza

@@ -7,12 +7,11 @@
 #include <QObject>
 #include <QString>
 
-#include <atomic>
 #include <memory>
 
 namespace Cadenza {
 
-class MicrophoneSession;
+class RecognizerPrivate;
 
 /**
  * Speech to text for applications. A recognition runs on a worker thread for files (the event loop
@@ -27,9 +26,9 @@ public:
     ~Recognizer() override;
 
     /// The installed recognizer of @p locale, or of the preferred dictation language when empty.
-    void setLanguage(const QString &locale) { m_language = locale; }
+    void setLanguage(const QString &locale);
     /// A JSGF grammar to recognise instead of free dictation; empty for free dictation.
-    void setGrammarFile(const QString &path) { m_grammarFile = path; }
+    void setGrammarFile(const QString &path);
 
     /// Transcribes the sound file @p path; finalResult() or failed() follows.
     void startFromFile(const QString &path);
@@ -43,7 +42,7 @@ public:
     void stop();
     /// Abandons the running recognition: neither finalResult() nor failed() follows.
     void cancel();
-    [[nodiscard]] bool isRunning() const { return m_running; }
+    [[nodiscard]] bool isRunning() const;
 
 Q_SIGNALS:
     /// The microphone is open: what is said from now on is recognised.
@@ -53,14 +52,8 @@ Q_SIGNALS:
     void failed(const QString &reason);
 
 private:
-    void endMicrophone();
-
-    QString m_language;
-    QString m_grammarFile;
-    bool m_running = false;
-    std::shared_ptr<std::atomic<bool>> m_cancelled;
-    MicrophoneSession *m_session = nullptr; ///< lives on MicrophoneSession::audioThread()
-    quint64 m_generation = 0;
+    friend class RecognizerPrivate;
+    std::unique_ptr<RecognizerPrivate> const d;
 };
 
 } // namespace Cadenza

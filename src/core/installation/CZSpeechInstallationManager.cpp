@@ -1,5 +1,6 @@
 #include "CZSpeechInstallationManager.h"
 
+#include "CZSpeechInstallationManager_p.h"
 #include "protocol/InstallerProtocol.h"
 #include "protocol/SecureArchiving.h"
 
@@ -24,30 +25,37 @@ CZSpeechInstallationManager *CZSpeechInstallationManager::sharedManager()
     return manager;
 }
 
-CZSpeechInstallationManager::CZSpeechInstallationManager(QObject *parent)
-    : QObject(parent)
+CZSpeechInstallationManagerPrivate::CZSpeechInstallationManagerPrivate(CZSpeechInstallationManager *q)
+    : q(q)
 { }
 
-CZSpeechInstallationManager::~CZSpeechInstallationManager()
+CZSpeechInstallationManagerPrivate::~CZSpeechInstallationManagerPrivate()
 {
     if (_serverPortRef) {
         _serverPortRef->invalidate();
     }
 }
 
+CZSpeechInstallationManager::CZSpeechInstallationManager(QObject *parent)
+    : QObject(parent)
+    , d(std::make_unique<CZSpeechInstallationManagerPrivate>(this))
+{ }
+
+CZSpeechInstallationManager::~CZSpeechInstallationManager() = default;
+
 std::shared_ptr<CZSpeechInstallationManagerDelegate> CZSpeechInstallationManager::delegate() const
 {
-    QMutexLocker locker(&m_delegateMutex);
-    return _delegate;
+    QMutexLocker locker(&d->m_delegateMutex);
+    return d->_delegate;
 }
 
 void CZSpeechInstallationManager::setDelegate(std::shared_ptr<CZSpeechInstallationManagerDelegate> delegate)
 {
-    QMutexLocker locker(&m_delegateMutex);
-    _delegate = std::move(delegate);
+    QMutexLocker locker(&d->m_delegateMutex);
+    d->_delegate = std::move(delegate);
 }
 
-bool CZSpeechInstallationManager::_serverIsRunning()
+bool CZSpeechInstallationManagerPrivate::_serverIsRunning()
 {
     auto probe = Platform::Services::messagePorts().createRemotePort(LivenessPortName);
     if (!probe) {
@@ -58,14 +66,14 @@ bool CZSpeechInstallationManager::_serverIsRunning()
     return valid;
 }
 
-bool CZSpeechInstallationManager::_serverIsReachable()
+bool CZSpeechInstallationManagerPrivate::_serverIsReachable()
 {
     // The request port accepts connections while a daemon or the service manager listens on it; a
     // socket left by a daemon that died refuses them.
     return _serverIsRunning() || _createServerPortIfNeeded();
 }
 
-bool CZSpeechInstallationManager::_createServerPortIfNeeded()
+bool CZSpeechInstallationManagerPrivate::_createServerPortIfNeeded()
 {
     if (_serverPortRef && !_serverPortRef->isValid()) {
         _serverPortRef.reset(); // the daemon went away; a new one may be listening
@@ -81,11 +89,11 @@ bool CZSpeechInstallationManager::_createServerPortIfNeeded()
     return true;
 }
 
-Platform::LocalMessagePort *CZSpeechInstallationManager::_createLocalPort()
+Platform::LocalMessagePort *CZSpeechInstallationManagerPrivate::_createLocalPort()
 {
     const quint32 number = QRandomGenerator::system()->generate() & 0xFFFF;
     const QString name = LocalPortNameFormat.arg(ServicePortName).arg(number);
-    QPointer<CZSpeechInstallationManager> self(this);
+    QPointer<CZSpeechInstallationManager> self(q);
     // The callback needs its own port; it is known once the port exists.
     auto slot = std::make_shared<Platform::LocalMessagePort *>(nullptr);
     std::unique_ptr<Platform::LocalMessagePort> port = Platform::Services::messagePorts().createLocalPort(
@@ -105,7 +113,7 @@ Platform::LocalMessagePort *CZSpeechInstallationManager::_createLocalPort()
     return raw;
 }
 
-std::optional<QByteArray> CZSpeechInstallationManager::_sendMessage(
+std::optional<QByteArray> CZSpeechInstallationManagerPrivate::_sendMessage(
     qint32 messageId, const QByteArray &withData, bool withReply)
 {
     m_lastSendStatus = Platform::MessagePortStatus::IsInvalid;
@@ -129,12 +137,12 @@ std::optional<QByteArray> CZSpeechInstallationManager::_sendMessage(
 QVariantList CZSpeechInstallationManager::activeInstallations()
 {
     QVariantList records;
-    if (!_serverIsRunning()) {
+    if (!d->_serverIsRunning()) {
         return records;
     }
     const QByteArray request = CZEncodeSecureObject(
         QVariantMap {{ClientProcessIDKey, qint64(QCoreApplication::applicationPid())}});
-    const auto reply = _sendMessage(ActiveInstallationsMessage, request, true);
+    const auto reply = d->_sendMessage(ActiveInstallationsMessage, request, true);
     if (!reply) {
         return records;
     }
@@ -151,20 +159,20 @@ QVariantList CZSpeechInstallationManager::activeVoiceInstallations()
 
 void CZSpeechInstallationManager::showProgressWindow()
 {
-    if (!_serverIsRunning()) {
+    if (!d->_serverIsRunning()) {
         return;
     }
-    (void)_sendMessage(ShowProgressWindowMessage,
+    (void)d->_sendMessage(ShowProgressWindowMessage,
         CZEncodeSecureObject(QVariantMap {{ClientProcessIDKey, qint64(QCoreApplication::applicationPid())}}),
         false);
 }
 
 void CZSpeechInstallationManager::cancelAllInstallations()
 {
-    (void)_sendMessage(CancelAllMessage, QByteArray(), false);
+    (void)d->_sendMessage(CancelAllMessage, QByteArray(), false);
 }
 
-bool CZSpeechInstallationManager::_requestInstallation(const QString &tagName, const QString &itemName,
+bool CZSpeechInstallationManagerPrivate::_requestInstallation(const QString &tagName, const QString &itemName,
     quint64 byteSize, const QString &objectIdentifier, qint64 userInteractionMode)
 {
     if (tagName.isEmpty() || objectIdentifier.isEmpty() || itemName.isEmpty()) {
@@ -182,25 +190,25 @@ bool CZSpeechInstallationManager::_requestInstallation(const QString &tagName, c
     if (m_lastSendStatus != Platform::MessagePortStatus::Success) {
         // Nobody will ever answer this port: close it, and let the user know.
         releaseLocalPort(port->name());
-        Q_EMIT installationRequestFailed(tagName, itemName, userInteractionMode);
+        Q_EMIT q->installationRequestFailed(tagName, itemName, userInteractionMode);
         return false;
     }
     return true;
 }
 
-QStringList CZSpeechInstallationManager::pendingLocalPortNames() const
+QStringList CZSpeechInstallationManagerPrivate::pendingLocalPortNames() const
 {
     return m_localPorts.keys();
 }
 
-void CZSpeechInstallationManager::releaseLocalPort(const QString &name)
+void CZSpeechInstallationManagerPrivate::releaseLocalPort(const QString &name)
 {
     // Kept alive until the callback that released it has returned.
     const auto port = m_localPorts.take(name);
     if (port) {
         port->invalidate();
         QMetaObject::invokeMethod(
-            this, [port] {}, Qt::QueuedConnection);
+            q, [port] {}, Qt::QueuedConnection);
     }
 }
 
@@ -219,7 +227,7 @@ std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port, qi
             delegate->speechItemTags({tag}, messageId);
         }
         Q_EMIT info->installationFinished(tag, messageId, record.value_or(QVariantMap()));
-        info->releaseLocalPort(port->name());
+        CZSpeechInstallationManagerPrivate::get(info)->releaseLocalPort(port->name());
     }
     return std::nullopt;
 }

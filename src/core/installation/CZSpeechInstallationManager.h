@@ -4,8 +4,6 @@
 #include "cadenzacore_export.h"
 
 #include <QByteArray>
-#include <QHash>
-#include <QMutex>
 #include <QObject>
 #include <QVariantList>
 
@@ -33,10 +31,7 @@ struct CADENZACORE_EXPORT SpeechBundle
 /// Something the user asked to remove: a voice or a recognition language.
 using RemovableSpeechItem = std::variant<CZVoiceObjectPtr, CZSRLanguageItemPtr>;
 
-namespace Platform {
-class LocalMessagePort;
-class RemoteMessagePort;
-} // namespace Platform
+class CZSpeechInstallationManagerPrivate;
 
 /// Told when the installer daemon has finished with a requested item.
 class CADENZACORE_EXPORT CZSpeechInstallationManagerDelegate
@@ -128,28 +123,6 @@ public:
     bool startDownloadingHighestQualityIfNecessaryForVoiceIdentifier(const QString &voiceIdentifier);
     [[nodiscard]] bool doesLanguageDataNeedToBeDownloadedForLocaleIdentifier(const QString &localeIdentifier);
 
-    /**
-     * Sends one installation request (message 1) with its own local port; false when none was sent.
-     * A request that cannot reach the daemon emits installationRequestFailed().
-     */
-    bool _requestInstallation(const QString &tagName, const QString &itemName, quint64 byteSize,
-        const QString &objectIdentifier, qint64 userInteractionMode);
-
-    [[nodiscard]] bool _serverIsRunning();
-    /**
-     * Whether a request would reach the daemon: it runs, or its request port is held for it by the
-     * service manager, which starts it on the first request (socket activation).
-     */
-    [[nodiscard]] bool _serverIsReachable();
-    [[nodiscard]] bool _createServerPortIfNeeded();
-    /// A new local port for one request's completion, owned by the manager until it completes.
-    [[nodiscard]] Platform::LocalMessagePort *_createLocalPort();
-    [[nodiscard]] std::optional<QByteArray> _sendMessage(
-        qint32 messageId, const QByteArray &withData, bool withReply);
-
-    /// Names of the local ports still waiting for their completion.
-    [[nodiscard]] QStringList pendingLocalPortNames() const;
-
 Q_SIGNALS:
     /// Emitted with each completion, after the delegate: the whole answer, which may carry
     /// "QLNDFailureReason".
@@ -160,27 +133,14 @@ Q_SIGNALS:
         const QString &tagName, const QString &itemName, qint64 userInteractionMode);
 
 private:
-    friend std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port, qint32 messageId,
-        const QByteArray &data, CZSpeechInstallationManager *info);
-    void releaseLocalPort(const QString &name);
-    void removeNow(const QList<RemovableSpeechItem> &items);
-    void logRemoval(const QString &tag);
-
-    mutable QMutex m_delegateMutex;
-    std::shared_ptr<CZSpeechInstallationManagerDelegate> _delegate;
-    std::unique_ptr<Platform::RemoteMessagePort> _serverPortRef;
-    QHash<QString, std::shared_ptr<Platform::LocalMessagePort>> m_localPorts;
-    int m_lastSendStatus = 0; ///< of the last _sendMessage()
+    friend class CZSpeechInstallationManagerPrivate;
+    std::unique_ptr<CZSpeechInstallationManagerPrivate> const d;
 };
 
 /// The exported entry point of the background policy: the shared manager's
 /// startDownloadingHighestQualityIfNecessaryForVoiceIdentifier().
 CADENZACORE_EXPORT bool StartDownloadingHighestQualityIfNecessaryForVoiceIdentifier(
     const QString &voiceIdentifier);
-
-/// A local port's callback: hands a completion to the manager's delegate and closes the port.
-CADENZACORE_EXPORT std::optional<QByteArray> QLNDLocalCallBack(Platform::LocalMessagePort *port,
-    qint32 messageId, const QByteArray &data, CZSpeechInstallationManager *info);
 
 } // namespace Cadenza
 

@@ -1,6 +1,7 @@
 // The installation manager's downloadable speech data: listing, requests, removal and the log.
 
 #include "CZSpeechInstallationManager.h"
+#include "CZSpeechInstallationManager_p.h"
 
 #include "protocol/InstallerProtocol.h"
 
@@ -291,7 +292,7 @@ bool CZSpeechInstallationManager::startInstallingDownloadableVoices(
             tag = voice->fullSizeTagName();
             size = voice->fullSizeByteSize();
         }
-        sent = _requestInstallation(tag, name, size, voice->identifier(), userInteractionMode) || sent;
+        sent = d->_requestInstallation(tag, name, size, voice->identifier(), userInteractionMode) || sent;
     }
     return sent;
 }
@@ -310,7 +311,8 @@ bool CZSpeechInstallationManager::startInstallingDownloadableSpeechItems(
         // As for voices, a language to be fetched at full size asks for the full-size package.
         const QString tag = item->downloadFullSize() ? item->fullSizeTagName() : item->tagName();
         const quint64 size = item->downloadFullSize() ? item->fullSizeByteSize() : item->byteSize();
-        sent = _requestInstallation(tag, name, size, item->localeIdentifier(), userInteractionMode) || sent;
+        sent
+            = d->_requestInstallation(tag, name, size, item->localeIdentifier(), userInteractionMode) || sent;
     }
     return sent;
 }
@@ -318,10 +320,10 @@ bool CZSpeechInstallationManager::startInstallingDownloadableSpeechItems(
 void CZSpeechInstallationManager::startRemovingDownloadedSpeechItems(const QList<RemovableSpeechItem> &items)
 {
     QMetaObject::invokeMethod(
-        this, [this, items] { removeNow(items); }, Qt::QueuedConnection);
+        this, [this, items] { d->removeNow(items); }, Qt::QueuedConnection);
 }
 
-void CZSpeechInstallationManager::removeNow(const QList<RemovableSpeechItem> &items)
+void CZSpeechInstallationManagerPrivate::removeNow(const QList<RemovableSpeechItem> &items)
 {
     Platform::AdministratorService &administrator = Services::administrator();
     if (!administrator.isAuthenticated()) {
@@ -335,9 +337,9 @@ void CZSpeechInstallationManager::removeNow(const QList<RemovableSpeechItem> &it
         QString tag;
         std::optional<SpeechBundle> bundle;
         if (const auto *voice = std::get_if<CZVoiceObjectPtr>(&item); voice && *voice) {
-            bundle = bundleForRemovableVoice(**voice, &tag);
+            bundle = q->bundleForRemovableVoice(**voice, &tag);
         } else if (const auto *language = std::get_if<CZSRLanguageItemPtr>(&item); language && *language) {
-            bundle = bundleForRemovableLanguage(**language, &tag);
+            bundle = q->bundleForRemovableLanguage(**language, &tag);
         }
         if (bundle
             && administrator.removeBundle(bundle->path) == Platform::AdministratorService::Removal::Refused) {
@@ -349,17 +351,17 @@ void CZSpeechInstallationManager::removeNow(const QList<RemovableSpeechItem> &it
     }
 }
 
-void CZSpeechInstallationManager::logRemoval(const QString &tag)
+void CZSpeechInstallationManagerPrivate::logRemoval(const QString &tag)
 {
     const QString domain = domainForTag(tag);
     Platform::PreferencesStore &preferences = Services::preferences();
     (void)preferences.synchronize(domain);
-    QVariantMap log = preferences.value(InstallationLogKey, domain).toMap();
+    QVariantMap log = preferences.value(CZSpeechInstallationManager::InstallationLogKey, domain).toMap();
     QVariantMap entry = log.value(tag).toMap();
     entry.insert(QStringLiteral("RemovalDate"),
         double(QDateTime::currentMSecsSinceEpoch()) / 1000.0 - ReferenceDateOffset);
     log.insert(tag, entry);
-    preferences.setValue(InstallationLogKey, log, domain);
+    preferences.setValue(CZSpeechInstallationManager::InstallationLogKey, log, domain);
     (void)preferences.synchronize(domain);
 }
 

@@ -83,17 +83,4 @@ AdministratorService::Removal PolkitAdministratorService::removeBundle(const QSt
     return Removal::Removed;
 }
 
-AdministratorService::Removal FakeAdministratorService::removeBundle(const QString &path)
-{
-    if (!m_authenticated) {
-        return Removal::Refused;
-    }
-    QString error;
-    if (!BundleRemoval::remove(path, &error)) {
-        return Removal::Failed;
-    }
-    m_removed.append(path);
-    return Removal::Removed;
-}
-
 } // namespace Cadenza::Platform

@@ -33,19 +33,6 @@ public:
     std::optional<QList<QVariantMap>> powerSources() override;
 };
 
-/// Power sources that a test sets.
-class CADENZACORE_EXPORT FakePowerSourcesInfo final : public PowerSourcesInfo
-{
-public:
-    std::optional<QList<QVariantMap>> powerSources() override { return m_sources; }
-    void setPowerSources(const std::optional<QList<QVariantMap>> &sources) { m_sources = sources; }
-    /// One source in @p state.
-    void setState(const QString &state) { m_sources = QList<QVariantMap> {{{StateKey, state}}}; }
-
-private:
-    std::optional<QList<QVariantMap>> m_sources;
-};
-
 } // namespace Cadenza::Platform
 
 #endif

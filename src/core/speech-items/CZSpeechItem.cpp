@@ -110,7 +110,7 @@ QString conversionDisplayName(const QString &key, const QString &code)
         qsizetype size = 0;
     };
     thread_local Cache cache;
-    const Platform::Locale locale = CZSpeechItem::_conversionLocale();
+    const Platform::Locale locale = _conversionLocale();
     if (cache.localeIdentifier != locale.identifier() || cache.size > 4096) {
         cache = {locale.identifier(), {}, 0};
     }
@@ -334,7 +334,7 @@ QVariantMap CZSpeechItem::installationDictionaryCache()
     return s.catalogue.value_or(QVariantMap());
 }
 
-Platform::Locale CZSpeechItem::_conversionLocale()
+Platform::Locale SpeechItemPrivate::_conversionLocale()
 {
     SharedState &s = shared();
     QMutexLocker locker(&s.mutex);
@@ -382,7 +382,7 @@ QString CZSpeechItem::languageDisplayString() const
     qCCritical(Platform::lcLocale, "%s",
         qPrintable(QStringLiteral("Language display name is nil for locale: %1, lang: %2, for curLocale: %3, "
                                   "autoCurLocale: %4, prefLangs: %5.")
-                       .arg(localeIdentifier(), language, _conversionLocale().identifier(),
+                       .arg(localeIdentifier(), language, SpeechItemPrivate::_conversionLocale().identifier(),
                            Platform::Services::userLocale().currentLocaleIdentifier(),
                            preferred.join(QStringLiteral(", ")))));
     std::abort();

@@ -3,8 +3,6 @@
 
 #include "cadenzacore_export.h"
 
-#include "core/formats/Locale.h"
-
 #include <QMutex>
 #include <QString>
 #include <QStringList>
@@ -62,8 +60,6 @@ public:
     [[nodiscard]] static QString displayStringForPercent(qint64 percent);
     /// The catalogue "SpeechDataDefaults", loaded once; empty when it cannot be read.
     [[nodiscard]] static QVariantMap installationDictionaryCache();
-    /// The locale that display names are given in: the language of the host's localisation.
-    [[nodiscard]] static Platform::Locale _conversionLocale();
 
     // The instance side.
     [[nodiscard]] QString displayTitle() const;

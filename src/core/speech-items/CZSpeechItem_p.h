@@ -2,6 +2,7 @@
 #define CADENZA_SPEECHITEMS_CZSPEECHITEM_P_H
 
 #include "cadenzacore_export.h"
+#include "core/formats/Locale.h"
 
 #include <QVariantMap>
 
@@ -9,6 +10,8 @@
 
 namespace Cadenza::SpeechItemPrivate {
 
+/// The locale that display names are given in: the language of the host's localisation.
+[[nodiscard]] CADENZACORE_EXPORT Platform::Locale _conversionLocale();
 /// Replaces the catalogue (tests); nothing goes back to the shipped one.
 CADENZACORE_EXPORT void setInstallationDictionary(const std::optional<QVariantMap> &catalogue);
 /// Forgets the conversion locale, so that it follows the current user locale service (tests).

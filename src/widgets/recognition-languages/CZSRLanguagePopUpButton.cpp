@@ -1,6 +1,7 @@
 #include "CZSRLanguagePopUpButton.h"
 
 #include "core/SpeechNames.h"
+#include "CZSRLanguagePopUpButton_p.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/locale/LocalizationTable.h"
 #include "core/services/DistributedNotificationCenter.h"
@@ -47,9 +48,16 @@ QList<CZSpeechItemPtr> asSpeechItems(const QList<CZSRLanguageItemPtr> &items)
 
 } // namespace
 
+CZSRLanguagePopUpButtonPrivate::CZSRLanguagePopUpButtonPrivate(CZSRLanguagePopUpButton *q)
+    : q(q)
+    , m_menu(new VoiceMenuModel(q))
+{ }
+
+CZSRLanguagePopUpButtonPrivate::~CZSRLanguagePopUpButtonPrivate() = default;
+
 CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
     : Platform::PopUpButton(parent)
-    , m_menu(new VoiceMenuModel(this))
+    , d(std::make_unique<CZSRLanguagePopUpButtonPrivate>(this))
 {
     DownloadStatusLine::Style style;
     style.tagPrefix = Protocol::RecognitionTagPrefix;
@@ -63,15 +71,14 @@ CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
     };
     // Installed is not usable yet: keep the line until the engine has loaded the language.
     style.installing = [this] {
-        delete m_preHeatTimer;
-        m_preHeatTimer = new QTimer(this);
-        m_preHeatTimer->setInterval(PreHeatWaitMilliseconds);
-        connect(m_preHeatTimer, &QTimer::timeout, this,
-            &CZSRLanguagePopUpButton::_clearDownloadStatusFieldAfterPreHeat);
-        m_preHeatTimer->start();
+        delete d->m_preHeatTimer;
+        d->m_preHeatTimer = new QTimer(this);
+        d->m_preHeatTimer->setInterval(PreHeatWaitMilliseconds);
+        connect(d->m_preHeatTimer, &QTimer::timeout, this, [this] { d->_clearDownloadStatusFieldAfterPreHeat(); });
+        d->m_preHeatTimer->start();
     };
     style.idleLine = [this] {
-        if (!m_preHeatTimer) {
+        if (!d->m_preHeatTimer) {
             return QString();
         }
         return QStringLiteral("%1\n%2").arg(
@@ -79,9 +86,9 @@ CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
                 {texts().text(QStringLiteral("EnhancedDictation"))}),
             CZSpeechItem::displayStringForTimeRemaining(1.0));
     };
-    m_statusLine = new DownloadStatusLine(style, this);
+    d->m_statusLine = new DownloadStatusLine(style, this);
     setObjectName(QStringLiteral("srLanguagePopUpButton"));
-    setModel(m_menu);
+    setModel(d->m_menu);
     setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
     setMinimumContentsLength(24);
     setEnabled(false); // the client enables it once it has built the menu
@@ -94,12 +101,12 @@ CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
                     || name == Protocol::StartedInstallationNotification
                     || name == SpeechNames::LanguagePreferencesChangedNotification
                     || name == SpeechNames::NumberPreferencesChangedNotification) {
-                    _startDelayedPopUpUpdate();
+                    d->_startDelayedPopUpUpdate();
                 } else if (name == Protocol::FinishedInstallationNotification) {
                     installationFinished(userInfo.value(Protocol::ObjectIDKey).toString());
                 } else if (name == WillStartListeningNotification
                     || name == RecognizerDidPreHeatNotification) {
-                    _clearDownloadStatusFieldAfterPreHeat();
+                    d->_clearDownloadStatusFieldAfterPreHeat();
                 }
             });
     }
@@ -108,14 +115,54 @@ CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
 
 CZSRLanguagePopUpButton::~CZSRLanguagePopUpButton() = default;
 
+QString CZSRLanguagePopUpButton::previouslyChosenLocaleIdentifier() const
+{
+    return d->m_previouslyChosenLocaleIdentifier;
+}
+
+void CZSRLanguagePopUpButton::setPreviouslyChosenLocaleIdentifier(const QString &locale)
+{
+    d->m_previouslyChosenLocaleIdentifier = locale;
+}
+
+std::optional<QStringList> CZSRLanguagePopUpButton::networkBasedLocaleIdentifiers() const
+{
+    return d->m_network;
+}
+
+void CZSRLanguagePopUpButton::setNetworkBasedLocaleIdentifiers(const std::optional<QStringList> &locales)
+{
+    d->m_network = locales;
+}
+
+std::optional<QStringList> CZSRLanguagePopUpButton::offlineBasedLocaleIdentifiers() const
+{
+    return d->m_offline;
+}
+
+void CZSRLanguagePopUpButton::setOfflineBasedLocaleIdentifiers(const std::optional<QStringList> &locales)
+{
+    d->m_offline = locales;
+}
+
+bool CZSRLanguagePopUpButton::languagesAreDownloadable() const
+{
+    return d->m_languagesAreDownloadable;
+}
+
+void CZSRLanguagePopUpButton::setLanguagesAreDownloadable(bool downloadable)
+{
+    d->m_languagesAreDownloadable = downloadable;
+}
+
 void CZSRLanguagePopUpButton::setDownloadStatusTextField(QLabel *textField)
 {
-    m_statusLine->setTextField(textField);
+    d->m_statusLine->setTextField(textField);
 }
 
 void CZSRLanguagePopUpButton::setDownloadStatusProgressIndicator(QProgressBar *indicator)
 {
-    m_statusLine->setProgressIndicator(
+    d->m_statusLine->setProgressIndicator(
         indicator, texts().text(QStringLiteral("LanguageDownloadProgressName")));
 }
 
@@ -126,10 +173,10 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
 {
     // A copy: rebuilds pass the remembered locale itself, which is cleared below.
     const QString localeIdentifier = requestedLocaleIdentifier;
-    m_network = networkSupportedLocaleIdentifiers;
-    m_offline = offlineSupportedLocaleIdentifiers;
-    const QList<CZSRLanguageItemPtr> candidates = m_network
-        ? CZSRLanguageItem::languageItemsFromLocaleIdentifiers(*m_network)
+    d->m_network = networkSupportedLocaleIdentifiers;
+    d->m_offline = offlineSupportedLocaleIdentifiers;
+    const QList<CZSRLanguageItemPtr> candidates = d->m_network
+        ? CZSRLanguageItem::languageItemsFromLocaleIdentifiers(*d->m_network)
         : CZSRLanguageItem::availableLocalRecognizerLanguageItems();
     QList<CZSRLanguageItemPtr> visible;
     for (const CZSpeechItemPtr &item :
@@ -137,7 +184,7 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
         visible.append(std::static_pointer_cast<CZSRLanguageItem>(item));
     }
     const QString system = CZSpeechItem::systemLocaleIdentifier();
-    const QStringList known = m_network ? *m_network : m_offline.value_or(QStringList());
+    const QStringList known = d->m_network ? *d->m_network : d->m_offline.value_or(QStringList());
     if (visible.isEmpty() && CZSpeechItem::isLocaleIdentifier(system, known)) {
         visible = CZSRLanguageItem::languageItemsFromLocaleIdentifiers({system});
     }
@@ -153,12 +200,12 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
         visible = CZSRLanguageItem::languageItemsFromLocaleIdentifiers({EnUS}); // never without a language
     }
 
-    m_rows = CZSRLanguageRow::arrangedRowsFromSRLanguageItems(visible, false, false, false);
+    d->m_rows = CZSRLanguageRow::arrangedRowsFromSRLanguageItems(visible, false, false, false);
     QList<Item> items;
     CZSRLanguageRowPtr matchRequested, matchSystem, matchSystemLanguage, matchEnUS;
     const QString downloadingFormat = texts().text(QStringLiteral("DownloadingItemFormat"));
-    for (qsizetype i = 0; i < m_rows.size(); ++i) {
-        const CZSRLanguageRowPtr &row = m_rows.at(i);
+    for (qsizetype i = 0; i < d->m_rows.size(); ++i) {
+        const CZSRLanguageRowPtr &row = d->m_rows.at(i);
         const CZSRLanguageItemPtr item = row->srLanguageItem();
         item->setShowCountryInDisplayTitle(true);
         Item entry;
@@ -181,48 +228,49 @@ void CZSRLanguagePopUpButton::buildPopUpButtonAndSelectLocaleIdentifier(
             matchEnUS = row;
         }
     }
-    m_numberOfFixedItemsAtEndOfMenu = 1;
+    d->m_numberOfFixedItemsAtEndOfMenu = 1;
     Item command;
     command.title = texts().text(QStringLiteral("CustomizeMenuItem"));
-    if (!m_rows.isEmpty()) {
+    if (!d->m_rows.isEmpty()) {
         items.append(Item::makeSeparator());
-        m_numberOfFixedItemsAtEndOfMenu = 2;
-        if (m_rows.size() == 1) {
+        d->m_numberOfFixedItemsAtEndOfMenu = 2;
+        if (d->m_rows.size() == 1) {
             command.title = texts().text(QStringLiteral("AddLanguageMenuItem"));
         }
     }
     items.append(command);
-    m_menu->setItems({}, items);
+    d->m_menu->setItems({}, items);
 
-    m_previouslyChosenLocaleIdentifier.clear();
+    d->m_previouslyChosenLocaleIdentifier.clear();
     if (matchRequested) {
         setCurrentIndex(int(matchRequested->tableIndex()));
-        m_previouslyChosenLocaleIdentifier = localeIdentifier;
+        d->m_previouslyChosenLocaleIdentifier = localeIdentifier;
     } else if (const CZSRLanguageRowPtr fallback
         = matchSystem ? matchSystem : (matchSystemLanguage ? matchSystemLanguage : matchEnUS)) {
         setCurrentIndex(int(fallback->tableIndex()));
     }
-    _updateDownloadStatusFields();
+    d->_updateDownloadStatusFields();
 }
 
 CZSRLanguageItemPtr CZSRLanguagePopUpButton::selectedLanguageItem() const
 {
     const int index = currentIndex();
-    return index >= 0 && index < m_rows.size() ? m_rows.at(index)->srLanguageItem() : nullptr;
+    return index >= 0 && index < d->m_rows.size() ? d->m_rows.at(index)->srLanguageItem() : nullptr;
 }
 
 bool CZSRLanguagePopUpButton::sendAction()
 {
     const quint32 selected = quint32(currentIndex());
     const quint32 itemCount = quint32(count());
-    if (itemCount >= quint32(m_numberOfFixedItemsAtEndOfMenu) && selected == itemCount - 1) {
+    if (itemCount >= quint32(d->m_numberOfFixedItemsAtEndOfMenu) && selected == itemCount - 1) {
         CZSpeechInstallationManagerSheets::showSRLanguagesSelectionSheetForWindow(
-            window(), m_network, m_previouslyChosenLocaleIdentifier, m_languagesAreDownloadable);
-        buildPopUpButtonAndSelectLocaleIdentifier(m_previouslyChosenLocaleIdentifier, m_network, m_offline);
+            window(), d->m_network, d->m_previouslyChosenLocaleIdentifier, d->m_languagesAreDownloadable);
+        buildPopUpButtonAndSelectLocaleIdentifier(
+            d->m_previouslyChosenLocaleIdentifier, d->m_network, d->m_offline);
         return false;
     }
     const CZSRLanguageItemPtr item = selectedLanguageItem();
-    m_previouslyChosenLocaleIdentifier = item ? item->localeIdentifier() : QString();
+    d->m_previouslyChosenLocaleIdentifier = item ? item->localeIdentifier() : QString();
     Q_EMIT languageActivated(currentIndex());
     return true;
 }
@@ -232,38 +280,38 @@ void CZSRLanguagePopUpButton::installationFinished(const QString &objectIdentifi
     const CZSRLanguageItemPtr selected = selectedLanguageItem();
     if (!objectIdentifier.isEmpty() && selected
         && CZSpeechItem::isSameLangaugeFromLocaleIdentifier(selected->localeIdentifier(), objectIdentifier)) {
-        m_statusLine->stopRefreshing();
+        d->m_statusLine->stopRefreshing();
     }
-    _startDelayedPopUpUpdate();
+    d->_startDelayedPopUpUpdate();
 }
 
-void CZSRLanguagePopUpButton::_startDelayedPopUpUpdate()
+void CZSRLanguagePopUpButtonPrivate::_startDelayedPopUpUpdate()
 {
-    QTimer::singleShot(100, this, &CZSRLanguagePopUpButton::_updateSRLanguageMenu);
-    QTimer::singleShot(200, this, &CZSRLanguagePopUpButton::_updateDownloadStatusFields);
+    QTimer::singleShot(100, q, [this] { _updateSRLanguageMenu(); });
+    QTimer::singleShot(200, q, [this] { _updateDownloadStatusFields(); });
 }
 
-void CZSRLanguagePopUpButton::_updateSRLanguageMenu()
+void CZSRLanguagePopUpButtonPrivate::_updateSRLanguageMenu()
 {
-    buildPopUpButtonAndSelectLocaleIdentifier(m_previouslyChosenLocaleIdentifier, m_network, m_offline);
+    q->buildPopUpButtonAndSelectLocaleIdentifier(m_previouslyChosenLocaleIdentifier, m_network, m_offline);
 }
 
-QString CZSRLanguagePopUpButton::_statusStringForActiveDownloads()
+QString CZSRLanguagePopUpButtonPrivate::_statusStringForActiveDownloads()
 {
     return m_statusLine->statusForActiveDownloads();
 }
 
-void CZSRLanguagePopUpButton::_updateDownloadStatusFields()
+void CZSRLanguagePopUpButtonPrivate::_updateDownloadStatusFields()
 {
     m_statusLine->update();
 }
 
-bool CZSRLanguagePopUpButton::_hasDownloadStatusUpdateTimer() const
+bool CZSRLanguagePopUpButtonPrivate::_hasDownloadStatusUpdateTimer() const
 {
     return m_statusLine->isRefreshing();
 }
 
-void CZSRLanguagePopUpButton::_clearDownloadStatusFieldAfterPreHeat()
+void CZSRLanguagePopUpButtonPrivate::_clearDownloadStatusFieldAfterPreHeat()
 {
     if (!m_preHeatTimer) {
         return;

@@ -3,10 +3,7 @@
 
 #include "cadenza_export.h"
 #include "core/recognition-items/CZSRLanguageItem.h"
-#include "core/recognition-items/CZSRLanguageRow.h"
-
 #include "widgets/helpers/PopUpButton.h"
-#include <QPointer>
 #include <QStringList>
 
 #include <memory>
@@ -14,12 +11,10 @@
 
 class QLabel;
 class QProgressBar;
-class QTimer;
 
 namespace Cadenza {
 
-class DownloadStatusLine;
-class VoiceMenuModel;
+class CZSRLanguagePopUpButtonPrivate;
 
 /**
  * The dictation language chooser: the visible recognition languages with their countries, then a
@@ -63,50 +58,26 @@ public:
     /// The installer finished an item (@p objectIdentifier from the notification).
     void installationFinished(const QString &objectIdentifier);
 
-    [[nodiscard]] QString previouslyChosenLocaleIdentifier() const
-    {
-        return m_previouslyChosenLocaleIdentifier;
-    }
-    void setPreviouslyChosenLocaleIdentifier(const QString &locale)
-    {
-        m_previouslyChosenLocaleIdentifier = locale;
-    }
-    [[nodiscard]] std::optional<QStringList> networkBasedLocaleIdentifiers() const { return m_network; }
-    void setNetworkBasedLocaleIdentifiers(const std::optional<QStringList> &locales) { m_network = locales; }
-    [[nodiscard]] std::optional<QStringList> offlineBasedLocaleIdentifiers() const { return m_offline; }
-    void setOfflineBasedLocaleIdentifiers(const std::optional<QStringList> &locales) { m_offline = locales; }
-    [[nodiscard]] bool languagesAreDownloadable() const { return m_languagesAreDownloadable; }
-    void setLanguagesAreDownloadable(bool downloadable) { m_languagesAreDownloadable = downloadable; }
+    [[nodiscard]] QString previouslyChosenLocaleIdentifier() const;
+    void setPreviouslyChosenLocaleIdentifier(const QString &locale);
+    [[nodiscard]] std::optional<QStringList> networkBasedLocaleIdentifiers() const;
+    void setNetworkBasedLocaleIdentifiers(const std::optional<QStringList> &locales);
+    [[nodiscard]] std::optional<QStringList> offlineBasedLocaleIdentifiers() const;
+    void setOfflineBasedLocaleIdentifiers(const std::optional<QStringList> &locales);
+    [[nodiscard]] bool languagesAreDownloadable() const;
+    void setLanguagesAreDownloadable(bool downloadable);
 
     /// Where the download status and its busy indicator are shown; either may be null.
     void setDownloadStatusTextField(QLabel *textField);
     void setDownloadStatusProgressIndicator(QProgressBar *indicator);
-
-    void _startDelayedPopUpUpdate();
-    void _updateSRLanguageMenu();
-    void _updateDownloadStatusFields();
-    /// The status text, or null; starts or stops the 0.5-second refresh.
-    [[nodiscard]] QString _statusStringForActiveDownloads();
-    void _clearDownloadStatusFieldAfterPreHeat();
-    [[nodiscard]] int _numberOfFixedItemsAtEndOfMenu() const { return m_numberOfFixedItemsAtEndOfMenu; }
-    [[nodiscard]] bool _isWaitingForPreHeat() const { return m_preHeatTimer != nullptr; }
-    [[nodiscard]] bool _hasDownloadStatusUpdateTimer() const;
-    [[nodiscard]] QList<CZSRLanguageRowPtr> rows() const { return m_rows; }
 
 Q_SIGNALS:
     /// The user picked a language.
     void languageActivated(int index);
 
 private:
-    QString m_previouslyChosenLocaleIdentifier;
-    std::optional<QStringList> m_network;
-    std::optional<QStringList> m_offline;
-    int m_numberOfFixedItemsAtEndOfMenu = 1;
-    DownloadStatusLine *m_statusLine;
-    QTimer *m_preHeatTimer = nullptr;
-    bool m_languagesAreDownloadable = false;
-    VoiceMenuModel *m_menu;
-    QList<CZSRLanguageRowPtr> m_rows;
+    friend class CZSRLanguagePopUpButtonPrivate;
+    std::unique_ptr<CZSRLanguagePopUpButtonPrivate> const d;
 };
 
 } // namespace Cadenza

@@ -73,7 +73,7 @@ void registerProcessWideObservers()
             if (name == SpeechNames::DefaultVoiceChangedNotification
                 || name == SpeechNames::LanguagePreferencesChangedNotification
                 || name == SpeechNames::NumberPreferencesChangedNotification) {
-                CZVoicePopUpButton::_startDelayedForceAllVoicePopupsToUpdate();
+                CZVoicePopUpButtonPrivate::_startDelayedForceAllVoicePopupsToUpdate();
             }
         });
     state.watcher = new QFileSystemWatcher(qApp);
@@ -87,18 +87,25 @@ void registerProcessWideObservers()
         // Installers write a bundle in several steps; look once they are likely done.
         QTimer::singleShot(2000, qApp, [] {
             if (CZVoicePopUpButton *first = shared().firstPopUp) {
-                first->_handleSpeechDataInstallationNotification();
+                CZVoicePopUpButtonPrivate::get(first)->_handleSpeechDataInstallationNotification();
             }
         });
     });
 }
 } // namespace
 
+CZVoicePopUpButtonPrivate::CZVoicePopUpButtonPrivate(CZVoicePopUpButton *q)
+    : q(q)
+    , m_menu(new VoiceMenuModel(q))
+{ }
+
+CZVoicePopUpButtonPrivate::~CZVoicePopUpButtonPrivate() = default;
+
 CZVoicePopUpButton::CZVoicePopUpButton(QWidget *parent)
     : Platform::PopUpButton(parent)
-    , m_menu(new VoiceMenuModel(this))
+    , d(std::make_unique<CZVoicePopUpButtonPrivate>(this))
 {
-    m_statusLine = new DownloadStatusLine(
+    d->m_statusLine = new DownloadStatusLine(
         {Protocol::VoiceTagPrefix,
             [](const QString &itemLine, const QString &timeLeft) {
                 return Platform::LocalizationTable::fill(
@@ -107,7 +114,7 @@ CZVoicePopUpButton::CZVoicePopUpButton(QWidget *parent)
             {}, {}, {}},
         this);
     setObjectName(QStringLiteral("voicePopUpButton"));
-    setModel(m_menu);
+    setModel(d->m_menu);
     // Measuring 10,000 titles for the width would cost more than building the menu.
     setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
     setMinimumContentsLength(24);
@@ -115,8 +122,8 @@ CZVoicePopUpButton::CZVoicePopUpButton(QWidget *parent)
         list->setUniformItemSizes(true);
     }
     setEnabled(false); // the first build enables it
-    m_showIndividualVoiceQualities = QGuiApplication::desktopFileName() == LecternUtilityIdentifier;
-    m_systemVoiceLocalizedText = texts().text(QStringLiteral("Use System Voice"));
+    d->m_showIndividualVoiceQualities = QGuiApplication::desktopFileName() == LecternUtilityIdentifier;
+    d->m_systemVoiceLocalizedText = texts().text(QStringLiteral("Use System Voice"));
 
     SharedState &state = shared();
     if (!state.registered) {
@@ -128,7 +135,7 @@ CZVoicePopUpButton::CZVoicePopUpButton(QWidget *parent)
         &Platform::DistributedNotificationCenter::notificationPosted, this, [this](const QString &name) {
             if (name == Protocol::StartedInstallationNotification
                 || name == Protocol::FinishedInstallationNotification) {
-                _handleSpeechDataInstallationNotification();
+                d->_handleSpeechDataInstallationNotification();
             }
         });
     connect(this, &QComboBox::activated, this, [this] { (void)sendAction(); });
@@ -141,20 +148,45 @@ CZVoicePopUpButton::~CZVoicePopUpButton()
     shared().popUps.removeAll(this);
 }
 
+bool CZVoicePopUpButton::allowSystemVoiceChoice() const
+{
+    return d->m_allowSystemVoiceChoice;
+}
+
+void CZVoicePopUpButton::setAllowSystemVoiceChoice(bool allow)
+{
+    d->m_allowSystemVoiceChoice = allow;
+}
+
+bool CZVoicePopUpButton::showIndividualVoiceQualities() const
+{
+    return d->m_showIndividualVoiceQualities;
+}
+
+void CZVoicePopUpButton::setShowIndividualVoiceQualities(bool show)
+{
+    d->m_showIndividualVoiceQualities = show;
+}
+
+void CZVoicePopUpButton::addExcludedIdentifier(const QString &voiceIdentifier)
+{
+    addExcludedVoiceIdentifier(voiceIdentifier);
+}
+
 void CZVoicePopUpButton::setSystemVoiceLocalizedText(const QString &text, qint64 menuItemTag)
 {
-    m_systemVoiceLocalizedText = text;
-    m_systemVoiceMenuItemTag = menuItemTag;
+    d->m_systemVoiceLocalizedText = text;
+    d->m_systemVoiceMenuItemTag = menuItemTag;
 }
 
 void CZVoicePopUpButton::setDownloadStatusTextField(QLabel *textField)
 {
-    m_statusLine->setTextField(textField);
+    d->m_statusLine->setTextField(textField);
 }
 
 void CZVoicePopUpButton::setDownloadStatusProgressIndicator(QProgressBar *indicator)
 {
-    m_statusLine->setProgressIndicator(indicator, texts().text(QStringLiteral("VoiceDownloadProgressName")));
+    d->m_statusLine->setProgressIndicator(indicator, texts().text(QStringLiteral("VoiceDownloadProgressName")));
 }
 
 QString CZVoicePopUpButton::displayNameForGender(const QString &gender)
@@ -250,13 +282,13 @@ void CZVoicePopUpButton::buildSharedVoicesMenuShowingLTVoices(bool showingLTVoic
 void CZVoicePopUpButton::buildPopUpButtonWithSelectVoiceIdentifier(const QString &voiceIdentifier)
 {
     SharedState &state = shared();
-    const QStringList candidates = m_showIndividualVoiceQualities
+    const QStringList candidates = d->m_showIndividualVoiceQualities
         ? SpeechSynthesizer::allVoices()
         : SpeechSynthesizer::avaliableMainstreamVoices();
     QString resolved = SpeechSynthesizer::resolveVoiceIdentifier(voiceIdentifier, candidates);
-    if (resolved.isNull() && !m_allowSystemVoiceChoice) {
-        resolved = m_showIndividualVoiceQualities ? SpeechSynthesizer::defaultVoiceFromAllVoices()
-                                                  : SpeechSynthesizer::defaultVoiceFromMainstreamVoices();
+    if (resolved.isNull() && !d->m_allowSystemVoiceChoice) {
+        resolved = d->m_showIndividualVoiceQualities ? SpeechSynthesizer::defaultVoiceFromAllVoices()
+                                                     : SpeechSynthesizer::defaultVoiceFromMainstreamVoices();
     }
 
     bool rebuild = false;
@@ -276,21 +308,21 @@ void CZVoicePopUpButton::buildPopUpButtonWithSelectVoiceIdentifier(const QString
 
     // The voice shown stays listed; the one left stops being held.
     addRequiredVoiceIdentifier(resolved);
-    removeRequiredVoiceIdentifier(m_previouslyChosenVoiceIdentifier);
+    removeRequiredVoiceIdentifier(d->m_previouslyChosenVoiceIdentifier);
     if (rebuild) {
-        buildSharedVoicesMenuShowingLTVoices(m_showIndividualVoiceQualities);
+        buildSharedVoicesMenuShowingLTVoices(d->m_showIndividualVoiceQualities);
     }
 
     QList<Item> leading;
-    if (m_allowSystemVoiceChoice) {
+    if (d->m_allowSystemVoiceChoice) {
         Item system;
-        system.title = m_systemVoiceLocalizedText;
-        system.tag = m_systemVoiceMenuItemTag;
+        system.title = d->m_systemVoiceLocalizedText;
+        system.tag = d->m_systemVoiceMenuItemTag;
         leading = {system, Item::makeSeparator()};
     }
     {
         QMutexLocker menuLocker(&state.menuLock);
-        m_menu->setItems(leading, state.menu);
+        d->m_menu->setItems(leading, state.menu);
     }
 
     std::optional<qsizetype> position;
@@ -308,14 +340,14 @@ void CZVoicePopUpButton::buildPopUpButtonWithSelectVoiceIdentifier(const QString
             return std::nullopt;
         };
         if (resolved.isNull()) {
-            m_previouslyChosenVoiceIdentifier.clear();
+            d->m_previouslyChosenVoiceIdentifier.clear();
         } else if (const auto found = positionOf(resolved)) {
             position = found;
-            m_previouslyChosenVoiceIdentifier = resolved;
+            d->m_previouslyChosenVoiceIdentifier = resolved;
         } else if (const auto fallback
             = state.fallback.isNull() ? std::nullopt : positionOf(state.fallback)) {
             position = fallback;
-            m_previouslyChosenVoiceIdentifier = state.fallback;
+            d->m_previouslyChosenVoiceIdentifier = state.fallback;
         } else if (const auto ordinary = positionOf(Platform::Services::speechSynthesis().defaultVoice())) {
             position = ordinary;
         }
@@ -328,14 +360,14 @@ void CZVoicePopUpButton::buildPopUpButtonWithSelectVoiceIdentifier(const QString
     }
 
     if (!hasRows) {
-        setEnabled(m_allowSystemVoiceChoice);
+        setEnabled(d->m_allowSystemVoiceChoice);
         setCurrentIndex(-1);
     } else {
         setEnabled(true);
         int index = -1;
         if (position) {
-            index = int(*position) + (m_allowSystemVoiceChoice ? 2 : 0);
-        } else if (m_allowSystemVoiceChoice) {
+            index = int(*position) + (d->m_allowSystemVoiceChoice ? 2 : 0);
+        } else if (d->m_allowSystemVoiceChoice) {
             index = 0;
         } else if (firstVoicePosition) {
             index = int(*firstVoicePosition);
@@ -345,8 +377,8 @@ void CZVoicePopUpButton::buildPopUpButtonWithSelectVoiceIdentifier(const QString
 
     if (rebuild) {
         QTimer::singleShot(0, this, [this] {
-            _forcePopupsToAdoptCachedMenuExceptPopUp(this);
-            _updateDownloadStatusFields();
+            forcePopupsToAdoptCachedMenuExceptPopUp(this);
+            d->_updateDownloadStatusFields();
         });
     }
 }
@@ -357,7 +389,7 @@ std::optional<QVariantMap> CZVoicePopUpButton::selectedVoiceAttributes() const
     SharedState &state = shared();
     QMutexLocker rowsLocker(&state.rowsLock);
     for (const VoiceTableRowPtr &row : std::as_const(state.rows)) {
-        if (quint32(row->tableIndex() + (m_allowSystemVoiceChoice ? 2 : 0)) == selected) {
+        if (quint32(row->tableIndex() + (d->m_allowSystemVoiceChoice ? 2 : 0)) == selected) {
             if (!row->voiceObject()) {
                 return std::nullopt;
             }
@@ -371,8 +403,8 @@ bool CZVoicePopUpButton::isSelectedVoiceAppropriateForCurrentLanguageWithUserCon
     bool withUserConfirmation, QWidget *parentWindowForSheet)
 {
     CZVoiceObjectPtr voice;
-    if (m_allowSystemVoiceChoice && currentIndex() == 0) {
-        voice = CZVoiceObject::initWithVoiceIdentifier(m_showIndividualVoiceQualities
+    if (d->m_allowSystemVoiceChoice && currentIndex() == 0) {
+        voice = CZVoiceObject::initWithVoiceIdentifier(d->m_showIndividualVoiceQualities
                 ? SpeechSynthesizer::defaultVoiceFromAllVoices()
                 : SpeechSynthesizer::defaultVoiceFromMainstreamVoices());
     } else {
@@ -381,7 +413,7 @@ bool CZVoicePopUpButton::isSelectedVoiceAppropriateForCurrentLanguageWithUserCon
         QMutexLocker rowsLocker(&state.rowsLock);
         bool matched = false;
         for (const VoiceTableRowPtr &row : std::as_const(state.rows)) {
-            if (quint32(row->tableIndex() + (m_allowSystemVoiceChoice ? 2 : 0)) == selected) {
+            if (quint32(row->tableIndex() + (d->m_allowSystemVoiceChoice ? 2 : 0)) == selected) {
                 voice = row->voiceObject();
                 matched = true;
                 break;
@@ -421,11 +453,11 @@ bool CZVoicePopUpButton::sendAction()
         }
         if (selected == itemCount - 1) {
             CZSpeechInstallationManagerSheets::showVoiceSelectionSheetForWindow(
-                window(), m_showIndividualVoiceQualities);
+                window(), d->m_showIndividualVoiceQualities);
         } else {
             CZSpeechInstallationManager::sharedManager()->showProgressWindow();
         }
-        buildPopUpButtonWithSelectVoiceIdentifier(m_previouslyChosenVoiceIdentifier);
+        buildPopUpButtonWithSelectVoiceIdentifier(d->m_previouslyChosenVoiceIdentifier);
         return false;
     }
     if (selected != 0) {
@@ -434,11 +466,11 @@ bool CZVoicePopUpButton::sendAction()
                                        .value(Platform::VoiceAttribute::Identifier)
                                        .toString();
         addRequiredVoiceIdentifier(identifier);
-        removeRequiredVoiceIdentifier(m_previouslyChosenVoiceIdentifier);
-        m_previouslyChosenVoiceIdentifier = identifier;
+        removeRequiredVoiceIdentifier(d->m_previouslyChosenVoiceIdentifier);
+        d->m_previouslyChosenVoiceIdentifier = identifier;
     } else {
-        removeRequiredVoiceIdentifier(m_previouslyChosenVoiceIdentifier);
-        m_previouslyChosenVoiceIdentifier.clear();
+        removeRequiredVoiceIdentifier(d->m_previouslyChosenVoiceIdentifier);
+        d->m_previouslyChosenVoiceIdentifier.clear();
     }
     Q_EMIT voiceActivated(currentIndex());
     return true;
@@ -449,7 +481,7 @@ void CZVoicePopUpButton::forcePopupsToAdoptCachedMenuExceptPopUp(CZVoicePopUpBut
     const QList<QPointer<CZVoicePopUpButton>> popUps = shared().popUps;
     for (const QPointer<CZVoicePopUpButton> &each : popUps) {
         if (each && each != popUp) {
-            each->buildPopUpButtonWithSelectVoiceIdentifier(each->m_previouslyChosenVoiceIdentifier);
+            each->buildPopUpButtonWithSelectVoiceIdentifier(each->d->m_previouslyChosenVoiceIdentifier);
         }
     }
 }
@@ -505,13 +537,13 @@ void CZVoicePopUpButton::setFallbackVoiceIdentifier(const QString &voiceIdentifi
     shared().fallback = voiceIdentifier;
 }
 
-void CZVoicePopUpButton::_startDelayedForceAllVoicePopupsToUpdate()
+void CZVoicePopUpButtonPrivate::_startDelayedForceAllVoicePopupsToUpdate()
 {
     QMetaObject::invokeMethod(
         qApp, [] { _forceAllVoicePopupsToUpdate(); }, Qt::QueuedConnection);
 }
 
-void CZVoicePopUpButton::_forceAllVoicePopupsToUpdate()
+void CZVoicePopUpButtonPrivate::_forceAllVoicePopupsToUpdate()
 {
     SharedState &state = shared();
     if (state.updatingAll) {
@@ -522,36 +554,36 @@ void CZVoicePopUpButton::_forceAllVoicePopupsToUpdate()
         QMutexLocker menuLocker(&state.menuLock);
         state.menu.clear();
     }
-    forcePopupsToAdoptCachedMenuExceptPopUp(nullptr);
+    CZVoicePopUpButton::forcePopupsToAdoptCachedMenuExceptPopUp(nullptr);
     state.updatingAll = false;
 }
 
-void CZVoicePopUpButton::_forceAllVoicePopupsToUpdateNow()
+void CZVoicePopUpButtonPrivate::_forceAllVoicePopupsToUpdateNow()
 {
     {
         QMutexLocker menuLocker(&shared().menuLock);
         shared().menu.clear();
     }
-    forcePopupsToAdoptCachedMenuExceptPopUp(nullptr);
+    CZVoicePopUpButton::forcePopupsToAdoptCachedMenuExceptPopUp(nullptr);
 }
 
-void CZVoicePopUpButton::_handleSpeechDataInstallationNotification()
+void CZVoicePopUpButtonPrivate::_handleSpeechDataInstallationNotification()
 {
     _startDelayedForceAllVoicePopupsToUpdate();
-    QTimer::singleShot(200, this, [this] { _updateDownloadStatusFields(); });
+    QTimer::singleShot(200, q, [this] { _updateDownloadStatusFields(); });
 }
 
-QString CZVoicePopUpButton::_statusStringForActiveDownloads()
+QString CZVoicePopUpButtonPrivate::_statusStringForActiveDownloads()
 {
     return m_statusLine->statusForActiveDownloads();
 }
 
-void CZVoicePopUpButton::_updateDownloadStatusFields()
+void CZVoicePopUpButtonPrivate::_updateDownloadStatusFields()
 {
     m_statusLine->update();
 }
 
-bool CZVoicePopUpButton::_hasDownloadStatusUpdateTimer() const
+bool CZVoicePopUpButtonPrivate::_hasDownloadStatusUpdateTimer() const
 {
     return m_statusLine->isRefreshing();
 }

@@ -4,7 +4,6 @@
 #include "cadenza_export.h"
 
 #include "widgets/helpers/PopUpButton.h"
-#include <QPointer>
 #include <QVariantMap>
 
 #include <memory>
@@ -15,8 +14,7 @@ class QProgressBar;
 
 namespace Cadenza {
 
-class DownloadStatusLine;
-class VoiceMenuModel;
+class CZVoicePopUpButtonPrivate;
 
 /**
  * The voice chooser hosts place in their windows, in code or as a promoted widget in Qt Designer.
@@ -66,18 +64,15 @@ public:
     /// emits voiceActivated(). Returns whether the action was sent.
     bool sendAction();
 
-    [[nodiscard]] bool allowSystemVoiceChoice() const { return m_allowSystemVoiceChoice; }
+    [[nodiscard]] bool allowSystemVoiceChoice() const;
     /// Takes effect at the next build.
-    void setAllowSystemVoiceChoice(bool allow) { m_allowSystemVoiceChoice = allow; }
+    void setAllowSystemVoiceChoice(bool allow);
     /// Title and tag of the system voice item; take effect at the next build.
     void setSystemVoiceLocalizedText(const QString &text, qint64 menuItemTag);
-    [[nodiscard]] bool showIndividualVoiceQualities() const { return m_showIndividualVoiceQualities; }
+    [[nodiscard]] bool showIndividualVoiceQualities() const;
     /// List every quality of a voice under its full name; takes effect at the next build.
-    void setShowIndividualVoiceQualities(bool show) { m_showIndividualVoiceQualities = show; }
-    void addExcludedIdentifier(const QString &voiceIdentifier)
-    {
-        addExcludedVoiceIdentifier(voiceIdentifier);
-    }
+    void setShowIndividualVoiceQualities(bool show);
+    void addExcludedIdentifier(const QString &voiceIdentifier);
 
     /// Where the download status line and its busy indicator are shown; either may be null.
     void setDownloadStatusTextField(QLabel *textField);
@@ -98,46 +93,14 @@ public:
     [[nodiscard]] static bool isRequiredVoiceIdentifier(const QString &voiceIdentifier);
     /// The voice selected when the asked-for one is not listed.
     static void setFallbackVoiceIdentifier(const QString &voiceIdentifier);
-    static void _startDelayedForceAllVoicePopupsToUpdate();
-    static void _forceAllVoicePopupsToUpdate();
-
-    void _handleSpeechDataInstallationNotification();
-    /// The status line of running voice downloads; null when there is none. Starts or stops the
-    /// 0.5-second refresh.
-    [[nodiscard]] QString _statusStringForActiveDownloads();
-    void _updateDownloadStatusFields();
-    [[nodiscard]] QString _previouslyChosenVoiceIdentifier() const
-    {
-        return m_previouslyChosenVoiceIdentifier;
-    }
-    void _setPreviouslyChosenVoiceIdentifier(const QString &identifier)
-    {
-        m_previouslyChosenVoiceIdentifier = identifier;
-    }
-    void _forcePopupsToAdoptCachedMenuExceptPopUp(CZVoicePopUpButton *popUp)
-    {
-        forcePopupsToAdoptCachedMenuExceptPopUp(popUp);
-    }
-    /// Empties the shared menu and has every pop-up adopt it again.
-    void _forceAllVoicePopupsToUpdateNow();
-    /// Whether the status line's refresh timer runs.
-    [[nodiscard]] bool _hasDownloadStatusUpdateTimer() const;
 
 Q_SIGNALS:
     /// The user picked a voice (@p index > 0 or with no system item) or the system item (@p index 0).
     void voiceActivated(int index);
 
 private:
-    [[nodiscard]] int selectedIndexForRow(qsizetype tableIndex) const;
-
-    QStringList _fixedRateVoiceIdentifiers;
-    QString m_previouslyChosenVoiceIdentifier;
-    QString m_systemVoiceLocalizedText;
-    qint64 m_systemVoiceMenuItemTag = 0;
-    bool m_allowSystemVoiceChoice = false;
-    bool m_showIndividualVoiceQualities = false;
-    DownloadStatusLine *m_statusLine;
-    VoiceMenuModel *m_menu;
+    friend class CZVoicePopUpButtonPrivate;
+    std::unique_ptr<CZVoicePopUpButtonPrivate> const d;
 };
 
 } // namespace Cadenza

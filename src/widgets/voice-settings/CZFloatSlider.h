@@ -5,7 +5,11 @@
 
 #include <QSlider>
 
+#include <memory>
+
 namespace Cadenza {
+
+class CZFloatSliderPrivate;
 
 /**
  * A slider over a real range (0.0 to 1.0 unless set), in 1,000 steps. QSlider itself only knows
@@ -22,21 +26,21 @@ public:
 
     explicit CZFloatSlider(QWidget *parent = nullptr);
     explicit CZFloatSlider(Qt::Orientation orientation, QWidget *parent = nullptr);
+    ~CZFloatSlider() override;
 
     [[nodiscard]] double floatValue() const;
     /// Moves the knob to the step nearest @p value, held inside the range.
     void setFloatValue(double value);
-    [[nodiscard]] double minimumFloatValue() const { return m_minimum; }
-    void setMinimumFloatValue(double minimum) { m_minimum = minimum; }
-    [[nodiscard]] double maximumFloatValue() const { return m_maximum; }
-    void setMaximumFloatValue(double maximum) { m_maximum = maximum; }
+    [[nodiscard]] double minimumFloatValue() const;
+    void setMinimumFloatValue(double minimum);
+    [[nodiscard]] double maximumFloatValue() const;
+    void setMaximumFloatValue(double maximum);
 
 Q_SIGNALS:
     void floatValueChanged(double value);
 
 private:
-    double m_minimum = 0.0;
-    double m_maximum = 1.0;
+    std::unique_ptr<CZFloatSliderPrivate> const d;
 };
 
 } // namespace Cadenza

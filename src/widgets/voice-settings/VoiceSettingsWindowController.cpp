@@ -1,5 +1,6 @@
 #include "VoiceSettingsWindowController.h"
 
+#include "VoiceSettingsWindowController_p.h"
 #include "core/formats/VoiceDescription.h"
 #include "core/locale/LocalizationTable.h"
 #include "core/services/Services.h"
@@ -55,15 +56,21 @@ void setText(QDialog *window, const char *name, const char *key)
 }
 } // namespace
 
+VoiceSettingsWindowControllerPrivate::VoiceSettingsWindowControllerPrivate(
+    VoiceSettingsWindowController *q, std::function<QDialog *()> windowLoader)
+    : q(q)
+    , m_windowLoader(std::move(windowLoader))
+{ }
+
 VoiceSettingsWindowController::VoiceSettingsWindowController(
     std::function<QDialog *()> windowLoader, QObject *parent)
     : QObject(parent)
-    , m_windowLoader(std::move(windowLoader))
+    , d(std::make_unique<VoiceSettingsWindowControllerPrivate>(this, std::move(windowLoader)))
 {
-    loadWindow();
+    d->loadWindow();
 }
 
-void VoiceSettingsWindowController::loadWindow()
+void VoiceSettingsWindowControllerPrivate::loadWindow()
 {
     QDialog *window = m_windowLoader();
     m_window = window;
@@ -93,46 +100,83 @@ void VoiceSettingsWindowController::loadWindow()
     m_volumeQuietIcon->setAccessibleName(texts().text(QStringLiteral("VoiceSettingsQuietIcon")));
     m_volumeLoudIcon->setAccessibleName(texts().text(QStringLiteral("VoiceSettingsLoudIcon")));
 
-    connect(m_useCustomRateCheckbox, &QCheckBox::clicked, this,
-        &VoiceSettingsWindowController::rateCheckboxClicked);
-    connect(m_useCustomVolumeCheckbox, &QCheckBox::clicked, this,
+    QObject::connect(
+        m_useCustomRateCheckbox, &QCheckBox::clicked, q, &VoiceSettingsWindowController::rateCheckboxClicked);
+    QObject::connect(m_useCustomVolumeCheckbox, &QCheckBox::clicked, q,
         &VoiceSettingsWindowController::volumeCheckboxClicked);
-    connect(m_startStopSpeakingButton, &QPushButton::clicked, this,
+    QObject::connect(m_startStopSpeakingButton, &QPushButton::clicked, q,
         &VoiceSettingsWindowController::playStopVoiceSettings);
-    connect(m_rateSlider, &QSlider::valueChanged, this, &VoiceSettingsWindowController::rateSliderChanged);
-    connect(
-        m_volumeSlider, &QSlider::valueChanged, this, &VoiceSettingsWindowController::volumeSliderChanged);
-    connect(m_voicePopupMenu, &CZVoicePopUpButton::voiceActivated, this,
+    QObject::connect(
+        m_rateSlider, &QSlider::valueChanged, q, &VoiceSettingsWindowController::rateSliderChanged);
+    QObject::connect(
+        m_volumeSlider, &QSlider::valueChanged, q, &VoiceSettingsWindowController::volumeSliderChanged);
+    QObject::connect(m_voicePopupMenu, &CZVoicePopUpButton::voiceActivated, q,
         &VoiceSettingsWindowController::voicePopupMenuChanged);
     if (auto *ok = window->findChild<QPushButton *>(QStringLiteral("okButton"))) {
-        connect(ok, &QPushButton::clicked, this, &VoiceSettingsWindowController::saveVoiceSettings);
+        QObject::connect(ok, &QPushButton::clicked, q, &VoiceSettingsWindowController::saveVoiceSettings);
     }
     if (auto *cancel = window->findChild<QPushButton *>(QStringLiteral("cancelButton"))) {
-        connect(cancel, &QPushButton::clicked, this, &VoiceSettingsWindowController::cancelVoiceSettings);
+        QObject::connect(
+            cancel, &QPushButton::clicked, q, &VoiceSettingsWindowController::cancelVoiceSettings);
     }
     // Escape and the window's close button mean Cancel.
-    connect(m_window, &QDialog::rejected, this, [this] {
+    QObject::connect(m_window, &QDialog::rejected, q, [this] {
         if (!m_closing) {
-            cancelVoiceSettings();
+            q->cancelVoiceSettings();
         }
     });
 }
 
 VoiceSettingsWindowController::~VoiceSettingsWindowController()
 {
-    if (m_speechSynthesizer) {
-        m_speechSynthesizer->stopSpeaking();
+    if (d->m_speechSynthesizer) {
+        d->m_speechSynthesizer->stopSpeaking();
     }
-    delete m_window.data();
+    delete d->m_window.data();
+}
+
+SpeechSynthesizer *VoiceSettingsWindowController::speechSynthesizer() const
+{
+    return d->m_speechSynthesizer.get();
+}
+
+CZVoicePopUpButton *VoiceSettingsWindowController::voicePopupMenu() const
+{
+    return d->m_voicePopupMenu;
+}
+
+QSlider *VoiceSettingsWindowController::rateSlider() const
+{
+    return d->m_rateSlider;
+}
+
+CZFloatSlider *VoiceSettingsWindowController::volumeSlider() const
+{
+    return d->m_volumeSlider;
+}
+
+QCheckBox *VoiceSettingsWindowController::useCustomRateCheckbox() const
+{
+    return d->m_useCustomRateCheckbox;
+}
+
+QCheckBox *VoiceSettingsWindowController::useCustomVolumeCheckbox() const
+{
+    return d->m_useCustomVolumeCheckbox;
+}
+
+QPushButton *VoiceSettingsWindowController::startStopSpeakingButton() const
+{
+    return d->m_startStopSpeakingButton;
 }
 
 QDialog *VoiceSettingsWindowController::window()
 {
     // A sheet's window dies with a client window that is closed for good; make it again.
-    if (!m_window) {
-        loadWindow();
+    if (!d->m_window) {
+        d->loadWindow();
     }
-    return m_window;
+    return d->m_window;
 }
 
 // The shared controllers live until the process ends and are never deleted: a dialog deleted after the
@@ -157,11 +201,11 @@ VoiceSettingsSheetController *VoiceSettingsWindowController::defaultVoiceSetting
     return controller;
 }
 
-void VoiceSettingsWindowController::replaceSynthesizer(std::unique_ptr<SpeechSynthesizer> synthesizer)
+void VoiceSettingsWindowControllerPrivate::replaceSynthesizer(std::unique_ptr<SpeechSynthesizer> synthesizer)
 {
     m_speechSynthesizer = std::move(synthesizer);
     if (m_speechSynthesizer) {
-        connect(m_speechSynthesizer.get(), &SpeechSynthesizer::didFinishSpeaking, this,
+        QObject::connect(m_speechSynthesizer.get(), &SpeechSynthesizer::didFinishSpeaking, q,
             &VoiceSettingsWindowController::speechSynthesizerDidFinishSpeaking);
     }
 }
@@ -170,43 +214,43 @@ void VoiceSettingsWindowController::setUpWindowWithVoiceSettings(
     const QVariantMap &voiceSettings, QObject *modalDelegate)
 {
     (void)window();
-    replaceSynthesizer(SpeechSynthesizer::initWithVoiceSettings(voiceSettings));
-    m_modalDelegate = modalDelegate;
-    QStyle *style = m_window->style();
-    m_volumeQuietIcon->setPixmap(style->standardIcon(QStyle::SP_MediaVolumeMuted).pixmap(16, 16));
-    m_volumeLoudIcon->setPixmap(style->standardIcon(QStyle::SP_MediaVolume).pixmap(16, 16));
+    d->replaceSynthesizer(SpeechSynthesizer::initWithVoiceSettings(voiceSettings));
+    d->m_modalDelegate = modalDelegate;
+    QStyle *style = d->m_window->style();
+    d->m_volumeQuietIcon->setPixmap(style->standardIcon(QStyle::SP_MediaVolumeMuted).pixmap(16, 16));
+    d->m_volumeLoudIcon->setPixmap(style->standardIcon(QStyle::SP_MediaVolume).pixmap(16, 16));
 
-    m_voicePopupMenu->setAllowSystemVoiceChoice(true);
+    d->m_voicePopupMenu->setAllowSystemVoiceChoice(true);
     const QVariant voice = voiceSettings.value(kVoiceSettingsVoiceIdentifierKey);
-    m_voicePopupMenu->buildPopUpButtonWithSelectVoiceIdentifier(
+    d->m_voicePopupMenu->buildPopUpButtonWithSelectVoiceIdentifier(
         voice.typeId() == QMetaType::QString ? voice.toString() : QString());
 
-    const QSignalBlocker rateBlocker(m_rateSlider);
+    const QSignalBlocker rateBlocker(d->m_rateSlider);
     const QVariant rate = voiceSettings.value(kVoiceSettingsCustomRelativeRateKey);
     const bool customRate = SpeechItemPrivate::isNumber(rate);
-    setValueOfSliderUsingPercentOfNormal(m_rateSlider, customRate ? rate.toFloat() : 1.0f);
-    m_useCustomRateCheckbox->setChecked(customRate);
-    m_rateSlider->setEnabled(customRate);
+    setValueOfSliderUsingPercentOfNormal(d->m_rateSlider, customRate ? rate.toFloat() : 1.0f);
+    d->m_useCustomRateCheckbox->setChecked(customRate);
+    d->m_rateSlider->setEnabled(customRate);
 
-    const QSignalBlocker volumeBlocker(m_volumeSlider);
+    const QSignalBlocker volumeBlocker(d->m_volumeSlider);
     const QVariant volume = voiceSettings.value(kVoiceSettingsCustomVolumeKey);
     const bool customVolume = SpeechItemPrivate::isNumber(volume);
     if (customVolume) {
-        m_volumeSlider->setFloatValue(volume.toDouble());
+        d->m_volumeSlider->setFloatValue(volume.toDouble());
     } else {
-        const qint32 current = m_speechSynthesizer
+        const qint32 current = d->m_speechSynthesizer
             ? qint32(
-                m_speechSynthesizer
+                d->m_speechSynthesizer
                     ->objectForProperty(SpeechSynthesizer::VolumeProperty, 4, QMetaType::fromType<qint32>())
                     .toLongLong())
             : 0;
-        m_volumeSlider->setFloatValue(double(current) * 1.52587890625e-5);
+        d->m_volumeSlider->setFloatValue(double(current) * 1.52587890625e-5);
     }
-    m_useCustomVolumeCheckbox->setChecked(customVolume);
-    m_volumeSlider->setEnabled(customVolume);
+    d->m_useCustomVolumeCheckbox->setChecked(customVolume);
+    d->m_volumeSlider->setEnabled(customVolume);
 
-    if (m_playDisplayString.isNull()) {
-        m_playDisplayString = m_startStopSpeakingButton->text();
+    if (d->m_playDisplayString.isNull()) {
+        d->m_playDisplayString = d->m_startStopSpeakingButton->text();
     }
 }
 
@@ -214,34 +258,34 @@ void VoiceSettingsWindowController::showWindowWithVoiceSettings(
     const QVariantMap &voiceSettings, QObject *modalDelegate, const QString &windowTitle)
 {
     if (window()->isVisible()) {
-        m_window->raise();
-        m_window->activateWindow();
+        d->m_window->raise();
+        d->m_window->activateWindow();
         return;
     }
     setUpWindowWithVoiceSettings(voiceSettings, modalDelegate);
     if (!windowTitle.isEmpty()) {
-        m_window->setWindowTitle(windowTitle);
+        d->m_window->setWindowTitle(windowTitle);
     }
-    m_window->show();
+    d->m_window->show();
 }
 
 void VoiceSettingsWindowController::showSheetWithVoiceSettings(
     const QVariantMap &voiceSettings, QObject *modalDelegate, QWidget *modalForWindow)
 {
     if (window()->isVisible()) {
-        m_window->raise();
-        m_window->activateWindow();
+        d->m_window->raise();
+        d->m_window->activateWindow();
         return;
     }
     setUpWindowWithVoiceSettings(voiceSettings, modalDelegate);
     if (modalForWindow) {
-        m_window->setParent(modalForWindow->window(), m_window->windowFlags());
+        d->m_window->setParent(modalForWindow->window(), d->m_window->windowFlags());
     }
-    m_window->setWindowModality(modalForWindow ? Qt::WindowModal : Qt::ApplicationModal);
-    m_window->show();
+    d->m_window->setWindowModality(modalForWindow ? Qt::WindowModal : Qt::ApplicationModal);
+    d->m_window->show();
 }
 
-void VoiceSettingsWindowController::showPlayTitle()
+void VoiceSettingsWindowControllerPrivate::showPlayTitle()
 {
     m_startStopSpeakingButton->setText(
         m_playDisplayString.isNull() ? texts().text(QStringLiteral("PlayButtonName")) : m_playDisplayString);
@@ -249,38 +293,38 @@ void VoiceSettingsWindowController::showPlayTitle()
 
 void VoiceSettingsWindowController::closeWindow()
 {
-    if (m_speechSynthesizer) {
-        m_speechSynthesizer->stopSpeaking();
+    if (d->m_speechSynthesizer) {
+        d->m_speechSynthesizer->stopSpeaking();
     }
-    showPlayTitle();
-    if (!m_window) {
+    d->showPlayTitle();
+    if (!d->m_window) {
         return;
     }
-    m_closing = true;
-    m_window->hide();
-    if (m_window->parentWidget()) {
+    d->m_closing = true;
+    d->m_window->hide();
+    if (d->m_window->parentWidget()) {
         // Back to a window of its own, so the client's window can go without taking it along.
-        m_window->setParent(nullptr, m_window->windowFlags());
+        d->m_window->setParent(nullptr, d->m_window->windowFlags());
     }
-    m_closing = false;
+    d->m_closing = false;
 }
 
 QVariantMap VoiceSettingsWindowController::voiceSettingsFromWindow() const
 {
     QVariantMap settings;
-    if (m_voicePopupMenu->selectedVoiceAttributes() && m_speechSynthesizer) {
-        settings.insert(kVoiceSettingsVoiceIdentifierKey, m_speechSynthesizer->voice());
+    if (d->m_voicePopupMenu->selectedVoiceAttributes() && d->m_speechSynthesizer) {
+        settings.insert(kVoiceSettingsVoiceIdentifierKey, d->m_speechSynthesizer->voice());
     }
-    if (m_useCustomRateCheckbox->isChecked()) {
-        settings.insert(kVoiceSettingsCustomRelativeRateKey, percentOfNormalFromSlider(m_rateSlider));
+    if (d->m_useCustomRateCheckbox->isChecked()) {
+        settings.insert(kVoiceSettingsCustomRelativeRateKey, percentOfNormalFromSlider(d->m_rateSlider));
     }
-    if (m_useCustomVolumeCheckbox->isChecked()) {
-        settings.insert(kVoiceSettingsCustomVolumeKey, float(m_volumeSlider->floatValue()));
+    if (d->m_useCustomVolumeCheckbox->isChecked()) {
+        settings.insert(kVoiceSettingsCustomVolumeKey, float(d->m_volumeSlider->floatValue()));
     }
     return settings;
 }
 
-void VoiceSettingsWindowController::tellDelegate(const QVariant &settings)
+void VoiceSettingsWindowControllerPrivate::tellDelegate(const QVariant &settings)
 {
     QObject *delegate = m_modalDelegate;
     if (!delegate || delegate->metaObject()->indexOfMethod("didEndWithVoiceSettings(QVariant)") < 0) {
@@ -293,55 +337,56 @@ void VoiceSettingsWindowController::tellDelegate(const QVariant &settings)
 void VoiceSettingsWindowController::saveVoiceSettings()
 {
     const QVariantMap settings = voiceSettingsFromWindow();
-    const bool ok
-        = m_voicePopupMenu->isSelectedVoiceAppropriateForCurrentLanguageWithUserConfirmation(true, nullptr);
+    const bool ok = d->m_voicePopupMenu->isSelectedVoiceAppropriateForCurrentLanguageWithUserConfirmation(
+        true, nullptr);
     if (ok) {
         closeWindow();
     }
     // Told even when the user keeps the dialog open to choose again: nil, then.
-    tellDelegate(ok ? QVariant(settings) : QVariant());
+    d->tellDelegate(ok ? QVariant(settings) : QVariant());
 }
 
 void VoiceSettingsWindowController::cancelVoiceSettings()
 {
     closeWindow();
-    tellDelegate(QVariant());
+    d->tellDelegate(QVariant());
 }
 
 void VoiceSettingsWindowController::playStopVoiceSettings()
 {
-    if (!m_speechSynthesizer) {
+    if (!d->m_speechSynthesizer) {
         return;
     }
-    if (m_speechSynthesizer->isSpeaking()) {
-        m_speechSynthesizer->stopSpeaking();
-        showPlayTitle();
+    if (d->m_speechSynthesizer->isSpeaking()) {
+        d->m_speechSynthesizer->stopSpeaking();
+        d->showPlayTitle();
         return;
     }
     const QString demoText = Platform::Services::speechSynthesis()
-                                 .attributesForVoice(m_speechSynthesizer->voice())
+                                 .attributesForVoice(d->m_speechSynthesizer->voice())
                                  .value(Platform::VoiceAttribute::DemoText)
                                  .toString();
-    if (m_speechSynthesizer->startSpeakingString(demoText)) {
-        m_startStopSpeakingButton->setText(m_startStopSpeakingButton->property("alternateTitle").toString());
+    if (d->m_speechSynthesizer->startSpeakingString(demoText)) {
+        d->m_startStopSpeakingButton->setText(
+            d->m_startStopSpeakingButton->property("alternateTitle").toString());
     }
 }
 
 void VoiceSettingsWindowController::voicePopupMenuChanged()
 {
-    const bool wasSpeaking = m_speechSynthesizer && m_speechSynthesizer->isSpeaking();
-    if (m_speechSynthesizer) {
-        m_speechSynthesizer->stopSpeaking();
+    const bool wasSpeaking = d->m_speechSynthesizer && d->m_speechSynthesizer->isSpeaking();
+    if (d->m_speechSynthesizer) {
+        d->m_speechSynthesizer->stopSpeaking();
     }
-    showPlayTitle();
-    const auto attributes = m_voicePopupMenu->selectedVoiceAttributes();
-    replaceSynthesizer(SpeechSynthesizer::initWithVoice(
+    d->showPlayTitle();
+    const auto attributes = d->m_voicePopupMenu->selectedVoiceAttributes();
+    d->replaceSynthesizer(SpeechSynthesizer::initWithVoice(
         attributes ? attributes->value(Platform::VoiceAttribute::Identifier).toString() : QString()));
-    if (m_speechSynthesizer && m_useCustomRateCheckbox->isChecked()) {
-        m_speechSynthesizer->setSpeechRate(wordsPerMinuteFromSlider(m_rateSlider));
+    if (d->m_speechSynthesizer && d->m_useCustomRateCheckbox->isChecked()) {
+        d->m_speechSynthesizer->setSpeechRate(wordsPerMinuteFromSlider(d->m_rateSlider));
     }
-    if (m_useCustomVolumeCheckbox->isChecked()) {
-        writeVolumeFromSlider();
+    if (d->m_useCustomVolumeCheckbox->isChecked()) {
+        d->writeVolumeFromSlider();
     }
     if (wasSpeaking) {
         playStopVoiceSettings();
@@ -350,24 +395,24 @@ void VoiceSettingsWindowController::voicePopupMenuChanged()
 
 void VoiceSettingsWindowController::rateSliderChanged()
 {
-    const bool wasSpeaking = m_speechSynthesizer && m_speechSynthesizer->isSpeaking();
+    const bool wasSpeaking = d->m_speechSynthesizer && d->m_speechSynthesizer->isSpeaking();
     if (wasSpeaking) {
-        m_speechSynthesizer->stopSpeaking();
-        showPlayTitle();
+        d->m_speechSynthesizer->stopSpeaking();
+        d->showPlayTitle();
     }
-    if (m_speechSynthesizer) {
-        m_speechSynthesizer->setSpeechRate(wordsPerMinuteFromSlider(m_rateSlider));
+    if (d->m_speechSynthesizer) {
+        d->m_speechSynthesizer->setSpeechRate(wordsPerMinuteFromSlider(d->m_rateSlider));
     }
     if (wasSpeaking) {
         // A speech channel can take a moment to fall silent; restarting before would be refused.
-        for (int attempt = 0; attempt < 19 && m_speechSynthesizer->isSpeaking(); ++attempt) {
+        for (int attempt = 0; attempt < 19 && d->m_speechSynthesizer->isSpeaking(); ++attempt) {
             QThread::msleep(100);
         }
         playStopVoiceSettings();
     }
 }
 
-void VoiceSettingsWindowController::writeVolumeFromSlider()
+void VoiceSettingsWindowControllerPrivate::writeVolumeFromSlider()
 {
     if (m_speechSynthesizer) {
         m_speechSynthesizer->setObject(qint64(double(float(m_volumeSlider->floatValue())) * FixedOne),
@@ -377,23 +422,23 @@ void VoiceSettingsWindowController::writeVolumeFromSlider()
 
 void VoiceSettingsWindowController::volumeSliderChanged()
 {
-    writeVolumeFromSlider();
+    d->writeVolumeFromSlider();
 }
 
 void VoiceSettingsWindowController::rateCheckboxClicked()
 {
-    m_rateSlider->setEnabled(m_useCustomRateCheckbox->isChecked());
+    d->m_rateSlider->setEnabled(d->m_useCustomRateCheckbox->isChecked());
 }
 
 void VoiceSettingsWindowController::volumeCheckboxClicked()
 {
-    m_volumeSlider->setEnabled(m_useCustomVolumeCheckbox->isChecked());
+    d->m_volumeSlider->setEnabled(d->m_useCustomVolumeCheckbox->isChecked());
 }
 
 void VoiceSettingsWindowController::speechSynthesizerDidFinishSpeaking(bool finishedSpeaking)
 {
-    if (finishedSpeaking && m_speechSynthesizer && !m_speechSynthesizer->isSpeaking()) {
-        showPlayTitle();
+    if (finishedSpeaking && d->m_speechSynthesizer && !d->m_speechSynthesizer->isSpeaking()) {
+        d->showPlayTitle();
     }
 }
 
@@ -415,8 +460,9 @@ void VoiceSettingsWindowController::setValueOfSliderUsingPercentOfNormal(
 
 void VoiceSettingsWindowController::setValueOfSliderUsingWordsPerMinute(QSlider *slider, float wordsPerMinute)
 {
-    const float normal = m_speechSynthesizer ? float(std::trunc(m_speechSynthesizer->_normalSpeakingRate()))
-                                             : DefaultWordsPerMinute;
+    const float normal = d->m_speechSynthesizer
+        ? float(std::trunc(d->m_speechSynthesizer->_normalSpeakingRate()))
+        : DefaultWordsPerMinute;
     setValueOfSliderUsingPercentOfNormal(slider, wordsPerMinute / normal);
 }
 
@@ -438,8 +484,9 @@ float VoiceSettingsWindowController::percentOfNormalFromSlider(const QSlider *sl
 
 float VoiceSettingsWindowController::wordsPerMinuteFromSlider(const QSlider *slider) const
 {
-    const float normal = m_speechSynthesizer ? float(std::trunc(m_speechSynthesizer->_normalSpeakingRate()))
-                                             : DefaultWordsPerMinute;
+    const float normal = d->m_speechSynthesizer
+        ? float(std::trunc(d->m_speechSynthesizer->_normalSpeakingRate()))
+        : DefaultWordsPerMinute;
     return percentOfNormalFromSlider(slider) * normal;
 }
 

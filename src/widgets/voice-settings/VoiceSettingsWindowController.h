@@ -4,7 +4,6 @@
 #include "cadenza_export.h"
 
 #include <QObject>
-#include <QPointer>
 #include <QVariantMap>
 
 #include <functional>
@@ -12,7 +11,6 @@
 
 class QCheckBox;
 class QDialog;
-class QLabel;
 class QPushButton;
 class QSlider;
 
@@ -23,6 +21,7 @@ class CZVoicePopUpButton;
 class SpeechSynthesizer;
 class VoiceSettingsAlertController;
 class VoiceSettingsSheetController;
+class VoiceSettingsWindowControllerPrivate;
 
 /**
  * The voice settings dialog: a voice, optionally a custom speaking rate and volume, and a Play button
@@ -79,13 +78,13 @@ public:
     [[nodiscard]] float percentOfNormalFromSlider(const QSlider *slider) const;
     [[nodiscard]] float wordsPerMinuteFromSlider(const QSlider *slider) const;
 
-    [[nodiscard]] SpeechSynthesizer *speechSynthesizer() const { return m_speechSynthesizer.get(); }
-    [[nodiscard]] CZVoicePopUpButton *voicePopupMenu() const { return m_voicePopupMenu; }
-    [[nodiscard]] QSlider *rateSlider() const { return m_rateSlider; }
-    [[nodiscard]] CZFloatSlider *volumeSlider() const { return m_volumeSlider; }
-    [[nodiscard]] QCheckBox *useCustomRateCheckbox() const { return m_useCustomRateCheckbox; }
-    [[nodiscard]] QCheckBox *useCustomVolumeCheckbox() const { return m_useCustomVolumeCheckbox; }
-    [[nodiscard]] QPushButton *startStopSpeakingButton() const { return m_startStopSpeakingButton; }
+    [[nodiscard]] SpeechSynthesizer *speechSynthesizer() const;
+    [[nodiscard]] CZVoicePopUpButton *voicePopupMenu() const;
+    [[nodiscard]] QSlider *rateSlider() const;
+    [[nodiscard]] CZFloatSlider *volumeSlider() const;
+    [[nodiscard]] QCheckBox *useCustomRateCheckbox() const;
+    [[nodiscard]] QCheckBox *useCustomVolumeCheckbox() const;
+    [[nodiscard]] QPushButton *startStopSpeakingButton() const;
 
 protected:
     /// @p windowLoader makes the dialog from an interface file with the outlets' object names.
@@ -93,26 +92,8 @@ protected:
         std::function<QDialog *()> windowLoader, QObject *parent = nullptr);
 
 private:
-    void loadWindow();
-    void replaceSynthesizer(std::unique_ptr<SpeechSynthesizer> synthesizer);
-    void writeVolumeFromSlider();
-    void tellDelegate(const QVariant &settings);
-    void showPlayTitle();
-
-    std::function<QDialog *()> m_windowLoader;
-    QPointer<QDialog> m_window;
-    QCheckBox *m_useCustomRateCheckbox = nullptr;
-    QCheckBox *m_useCustomVolumeCheckbox = nullptr;
-    QPushButton *m_startStopSpeakingButton = nullptr;
-    QSlider *m_rateSlider = nullptr;
-    CZFloatSlider *m_volumeSlider = nullptr;
-    QLabel *m_volumeQuietIcon = nullptr;
-    QLabel *m_volumeLoudIcon = nullptr;
-    CZVoicePopUpButton *m_voicePopupMenu = nullptr;
-    std::unique_ptr<SpeechSynthesizer> m_speechSynthesizer;
-    QPointer<QObject> m_modalDelegate;
-    QString m_playDisplayString;
-    bool m_closing = false;
+    friend class VoiceSettingsWindowControllerPrivate;
+    std::unique_ptr<VoiceSettingsWindowControllerPrivate> const d;
 };
 
 } // namespace Cadenza

@@ -14,6 +14,7 @@
 #include "widgets/installation/CZSpeechInstallationManagerSheets.h"
 #include "widgets/recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "widgets/recognition-languages/CZSRLanguagePopUpButton.h"
+#include "widgets/recognition-languages/CZSRLanguagePopUpButton_p.h"
 
 #include <QDBusConnection>
 #include <QDBusConnectionInterface>
@@ -156,7 +157,7 @@ private Q_SLOTS:
         QElapsedTimer wait;
         wait.start();
         while (wait.elapsed() < 120000 && !QDir(bundle).exists()) {
-            popUp->_updateDownloadStatusFields();
+            CZSRLanguagePopUpButtonPrivate::get(popUp)->_updateDownloadStatusFields();
             sawInstalling = sawInstalling || !status->text().isEmpty();
             QTest::qWait(20);
         }

@@ -1,8 +1,8 @@
 #include "TestEnvironment.h"
 
+#include "FakeUserLocaleService.h"
 #include "core/formats/Locale.h"
 #include "core/services/EnvironmentUserLocaleService.h"
-#include "core/services/FakeUserLocaleService.h"
 
 #include <QTest>
 

@@ -1,10 +1,10 @@
 #include "TestEnvironment.h"
 
+#include "FakeUserLocaleService.h"
 #include "core/Assertion.h"
 #include "core/locale/LocaleDisplayName.h"
 #include "core/locale/LocaleDisplayName_p.h"
 #include "core/locale/LocalizationTable.h"
-#include "core/services/FakeUserLocaleService.h"
 #include "core/services/Services.h"
 
 #include <QTest>

@@ -1,7 +1,7 @@
 #include "TestEnvironment.h"
 
+#include "FakeUserLocaleService.h"
 #include "core/locale/LocalizationTable.h"
-#include "core/services/FakeUserLocaleService.h"
 #include "core/services/Services.h"
 
 #include <QFile>

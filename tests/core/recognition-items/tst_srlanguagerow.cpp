@@ -1,9 +1,10 @@
+#include "FakeRecognitionService.h"
 #include "TestEnvironment.h"
 
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "MemoryPreferencesStore.h"
 #include "core/recognition-items/CZSRLanguageRow.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/MemoryPreferencesStore.h"
 #include "core/services/RecognitionService.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem_p.h"

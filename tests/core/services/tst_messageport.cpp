@@ -1,7 +1,7 @@
 #include "TestEnvironment.h"
 
+#include "FakeMessagePortService.h"
 #include "core/files/Paths.h"
-#include "core/services/FakeMessagePortService.h"
 #include "core/services/UnixMessagePortService.h"
 #include "protocol/MessageFrame.h"
 

@@ -1,8 +1,8 @@
 #include "TestEnvironment.h"
 
 #include "core/SpeechNames.h"
+#include "InProcessNotificationCenter.h"
 #include "core/services/DBusNotificationCenter.h"
-#include "core/services/InProcessNotificationCenter.h"
 
 #include <QDBusConnection>
 #include <QDBusMessage>

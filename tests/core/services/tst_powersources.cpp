@@ -1,3 +1,4 @@
+#include "FakePowerSourcesInfo.h"
 #include "TestEnvironment.h"
 
 #include "core/files/Paths.h"

@@ -1,8 +1,8 @@
 #include "TestEnvironment.h"
 
 #include "core/SpeechNames.h"
+#include "MemoryPreferencesStore.h"
 #include "core/services/FilePreferencesStore.h"
-#include "core/services/MemoryPreferencesStore.h"
 
 #include <QDir>
 #include <QFile>

@@ -1,7 +1,7 @@
 // Sound playback never holds up the caller's event loop, whatever the media backend does.
 #include "TestEnvironment.h"
 
-#include "core/services/FakeSoundService.h"
+#include "FakeSoundService.h"
 #include "core/services/MediaSoundService.h"
 
 #include <QFile>

@@ -1,12 +1,12 @@
 #include "TestEnvironment.h"
 
 #include "core/SpeechNames.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/formats/WaveFile.h"
 #include "core/services/BundleSpeechSynthesisService.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
 #include "core/services/PreferencesStore.h"
 #include "core/services/Services.h"
 

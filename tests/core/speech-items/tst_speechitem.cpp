@@ -1,9 +1,9 @@
 #include "TestEnvironment.h"
 
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "MemoryPreferencesStore.h"
 #include "core/locale/LocalizationTable.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/MemoryPreferencesStore.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem.h"
 #include "core/speech-items/CZSpeechItem_p.h"
@@ -216,7 +216,7 @@ private Q_SLOTS:
         m_locale->setPreferredLanguages({QStringLiteral("de_CH")});
         LocalizationTable::resetShared();
         SpeechItemPrivate::resetConversionLocale();
-        QCOMPARE(CZSpeechItem::_conversionLocale().identifier(), QStringLiteral("de"));
+        QCOMPARE(SpeechItemPrivate::_conversionLocale().identifier(), QStringLiteral("de"));
         QCOMPARE(item(QStringLiteral("fr_CA"))->countryDisplayString(), QStringLiteral("Kanada"));
     }
 

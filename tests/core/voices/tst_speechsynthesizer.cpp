@@ -1,9 +1,9 @@
 #include "TestEnvironment.h"
 
 #include "core/SpeechNames.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/MemoryPreferencesStore.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "MemoryPreferencesStore.h"
 #include "core/services/Services.h"
 #include "core/voices/SpeechSynthesizer.h"
 

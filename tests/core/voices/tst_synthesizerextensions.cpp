@@ -1,10 +1,10 @@
 #include "TestEnvironment.h"
 
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "MemoryPreferencesStore.h"
 #include "core/formats/WaveFile.h"
 #include "core/services/BundleSpeechSynthesisService.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/MemoryPreferencesStore.h"
 #include "core/services/Services.h"
 #include "core/voices/SpeechSynthesizer.h"
 

@@ -2,6 +2,7 @@
 #include "TestEnvironment.h"
 
 #include "core/installation/CZSpeechInstallationManager.h"
+#include "core/installation/CZSpeechInstallationManager_p.h"
 #include "core/voices/CZVoiceObject.h"
 #include "core/voices/DownloadableVoice.h"
 #include "widgets/customize-voices/CZVoiceRowCheckboxButton.h"
@@ -76,7 +77,9 @@ private Q_SLOTS:
             }
         }
         QCOMPARE(unreachable, 1);
-        QVERIFY(CZSpeechInstallationManager::sharedManager()->pendingLocalPortNames().isEmpty());
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(CZSpeechInstallationManager::sharedManager())
+                    ->pendingLocalPortNames()
+                    .isEmpty());
     }
 
     void aBackgroundFetchDoesNotAlert()

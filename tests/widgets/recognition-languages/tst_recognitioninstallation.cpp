@@ -11,6 +11,7 @@
 #include "widgets/installation/CZSpeechInstallationManagerSheets.h"
 #include "widgets/recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "widgets/recognition-languages/CZSRLanguagePopUpButton.h"
+#include "widgets/recognition-languages/CZSRLanguagePopUpButton_p.h"
 
 #include <QCryptographicHash>
 #include <QDialog>
@@ -118,8 +119,10 @@ private Q_SLOTS:
         QStringList seen;
         QElapsedTimer clock;
         clock.start();
-        while (clock.elapsed() < 60000 && !(QDir(bundle).exists() && popUp->_isWaitingForPreHeat())) {
-            popUp->_updateDownloadStatusFields();
+        while (clock.elapsed() < 60000
+            && !(QDir(bundle).exists()
+                && CZSRLanguagePopUpButtonPrivate::get(popUp)->_isWaitingForPreHeat())) {
+            CZSRLanguagePopUpButtonPrivate::get(popUp)->_updateDownloadStatusFields();
             if (!status->text().isEmpty() && (seen.isEmpty() || seen.constLast() != status->text())) {
                 seen.append(status->text());
             }

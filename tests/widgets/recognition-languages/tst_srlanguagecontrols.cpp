@@ -1,12 +1,13 @@
 #include "FakeInstallerDaemon.h"
+#include "FakeRecognitionService.h"
 #include "TestEnvironment.h"
 
+#include "FakeMessagePortService.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "InProcessNotificationCenter.h"
+#include "MemoryPreferencesStore.h"
 #include "core/files/Paths.h"
-#include "core/services/FakeMessagePortService.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/InProcessNotificationCenter.h"
-#include "core/services/MemoryPreferencesStore.h"
 #include "core/services/RecognitionService.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem_p.h"
@@ -15,6 +16,7 @@
 #include "widgets/installation/CZSpeechInstallationManagerSheets.h"
 #include "widgets/recognition-languages/CZCustomizeSRLanguagesWindowController.h"
 #include "widgets/recognition-languages/CZSRLanguagePopUpButton.h"
+#include "widgets/recognition-languages/CZSRLanguagePopUpButton_p.h"
 #include "widgets/recognition-languages/CZSRLanguageRowCheckboxButton.h"
 #include "widgets/recognition-languages/CZSRLanguageRowTextView.h"
 #include "widgets/recognition-languages/CZSRLanguageTableCellView.h"
@@ -127,7 +129,7 @@ private Q_SLOTS:
         QCOMPARE(m_popUp->count(), 3);
         QCOMPARE(m_popUp->itemText(0), QStringLiteral("English (United States)"));
         QCOMPARE(m_popUp->itemText(2), QStringLiteral("Add Language…"));
-        QCOMPARE(m_popUp->_numberOfFixedItemsAtEndOfMenu(), 2);
+        QCOMPARE(CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_numberOfFixedItemsAtEndOfMenu(), 2);
         QCOMPARE(m_popUp->previouslyChosenLocaleIdentifier(), QStringLiteral("en_US"));
 
         // Only the languages the user shows, and the one asked for, are listed.
@@ -177,28 +179,28 @@ private Q_SLOTS:
         m_popUp->buildPopUpButtonAndSelectLocaleIdentifier(
             QStringLiteral("en_US"), std::nullopt, std::nullopt);
         m_daemon->setActiveRecords({record(QStringLiteral("SRCLANGID:de_DE"), 2, QStringLiteral("German"))});
-        m_popUp->_updateDownloadStatusFields();
+        CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_updateDownloadStatusFields();
         QCOMPARE(
             m_status->text(), QStringLiteral("Downloading Enhanced Dictation\nLess than a minute remaining"));
         QVERIFY(m_spinner->isVisible());
         // A voice first: the language waits.
         m_daemon->setActiveRecords({record(QStringLiteral("VOICEID:v"), 2),
             record(QStringLiteral("SRCLANGID:de_DE"), 2, QStringLiteral("German"))});
-        m_popUp->_updateDownloadStatusFields();
+        CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_updateDownloadStatusFields();
         QCOMPARE(m_status->text(), QStringLiteral("Waiting to download…"));
         // Installing starts the pre-heat wait, which outlives the installer's records.
         m_daemon->setActiveRecords({record(QStringLiteral("SRCLANGID:de_DE"), 3, QStringLiteral("German"))});
-        m_popUp->_updateDownloadStatusFields();
-        QVERIFY(m_popUp->_isWaitingForPreHeat());
+        CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_updateDownloadStatusFields();
+        QVERIFY(CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_isWaitingForPreHeat());
         m_daemon->setActiveRecords({});
-        m_popUp->_updateDownloadStatusFields();
+        CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_updateDownloadStatusFields();
         QVERIFY(m_status->text().startsWith(QStringLiteral("Installing Enhanced Dictation\n")));
         // The dictation engine says it has loaded the language.
         m_notifications->postNotification(QStringLiteral("DictationIMNotificationRecognizerDidPreHeat"));
         QTRY_VERIFY(m_status->text().isEmpty());
         QVERIFY(!m_spinner->isVisible());
-        QVERIFY(!m_popUp->_isWaitingForPreHeat());
-        QVERIFY(!m_popUp->_hasDownloadStatusUpdateTimer());
+        QVERIFY(!CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_isWaitingForPreHeat());
+        QVERIFY(!CZSRLanguagePopUpButtonPrivate::get(m_popUp)->_hasDownloadStatusUpdateTimer());
     }
 
     void onlyTheFirstPopUpFollowsNotifications()

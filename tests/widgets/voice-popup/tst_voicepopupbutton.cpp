@@ -2,12 +2,12 @@
 #include "TestEnvironment.h"
 
 #include "core/SpeechNames.h"
+#include "FakeMessagePortService.h"
+#include "FakeSpeechSynthesisService.h"
+#include "FakeUserLocaleService.h"
+#include "InProcessNotificationCenter.h"
+#include "MemoryPreferencesStore.h"
 #include "core/services/DBusNotificationCenter.h"
-#include "core/services/FakeMessagePortService.h"
-#include "core/services/FakeSpeechSynthesisService.h"
-#include "core/services/FakeUserLocaleService.h"
-#include "core/services/InProcessNotificationCenter.h"
-#include "core/services/MemoryPreferencesStore.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem_p.h"
 #include "protocol/InstallerProtocol.h"
@@ -153,7 +153,8 @@ private Q_SLOTS:
                 QStringLiteral("Tobias"), QStringLiteral("---"), QStringLiteral("German"),
                 QStringLiteral("Liesel"), QStringLiteral("---"), QStringLiteral("Customize…")}));
         QCOMPARE(popUp.currentText(), QStringLiteral("Tobias"));
-        QCOMPARE(popUp._previouslyChosenVoiceIdentifier(), P + QStringLiteral("tobias.compact"));
+        QCOMPARE(CZVoicePopUpButtonPrivate::get(&popUp)->_previouslyChosenVoiceIdentifier(),
+            P + QStringLiteral("tobias.compact"));
         QCOMPARE(popUp.selectedVoiceAttributes()->value(QStringLiteral("VoiceIdentifier")).toString(),
             P + QStringLiteral("tobias.compact"));
         // Headings and separators cannot be chosen.
@@ -180,7 +181,7 @@ private Q_SLOTS:
         QCOMPARE(popUp.itemText(0), QStringLiteral("System"));
         QCOMPARE(popUp.itemData(0, VoiceMenuModel::TagRole).toLongLong(), 42);
         QCOMPARE(popUp.currentIndex(), 0);
-        QVERIFY(popUp._previouslyChosenVoiceIdentifier().isNull());
+        QVERIFY(CZVoicePopUpButtonPrivate::get(&popUp)->_previouslyChosenVoiceIdentifier().isNull());
         QVERIFY(!popUp.selectedVoiceAttributes());
         // A voice's index is its place in the shared menu plus the two leading items.
         popUp.buildPopUpButtonWithSelectVoiceIdentifier(P + QStringLiteral("amelie.compact"));
@@ -191,7 +192,8 @@ private Q_SLOTS:
         CZVoicePopUpButton plain;
         plain.buildPopUpButtonWithSelectVoiceIdentifier(QString());
         QCOMPARE(plain.currentText(), QStringLiteral("Maren"));
-        QCOMPARE(plain._previouslyChosenVoiceIdentifier(), P + QStringLiteral("maren.compact"));
+        QCOMPARE(CZVoicePopUpButtonPrivate::get(&plain)->_previouslyChosenVoiceIdentifier(),
+            P + QStringLiteral("maren.compact"));
     }
 
     void longIdentifierPrefixResolves()
@@ -201,7 +203,8 @@ private Q_SLOTS:
         QVERIFY(prefix.size() >= 36);
         popUp.buildPopUpButtonWithSelectVoiceIdentifier(prefix);
         QCOMPARE(popUp.currentText(), QStringLiteral("Tobias"));
-        QCOMPARE(popUp._previouslyChosenVoiceIdentifier(), P + QStringLiteral("tobias.compact"));
+        QCOMPARE(CZVoicePopUpButtonPrivate::get(&popUp)->_previouslyChosenVoiceIdentifier(),
+            P + QStringLiteral("tobias.compact"));
     }
 
     void requiredVoicesStayListed()
@@ -227,7 +230,7 @@ private Q_SLOTS:
         holder.setCurrentIndex(titles(holder).indexOf(QStringLiteral("Tobias")));
         QVERIFY(holder.sendAction());
         QVERIFY(!CZVoicePopUpButton::isRequiredVoiceIdentifier(P + QStringLiteral("liesel.compact")));
-        CZVoicePopUpButton::_forceAllVoicePopupsToUpdate();
+        CZVoicePopUpButtonPrivate::_forceAllVoicePopupsToUpdate();
         QVERIFY(!titles(other).contains(QStringLiteral("Liesel")));
         QVERIFY(!titles(holder).contains(QStringLiteral("Liesel")));
     }
@@ -290,7 +293,8 @@ private Q_SLOTS:
         QTest::keyClick(popUp->view(), Qt::Key_Return);
         QTRY_COMPARE(popUp->currentText(), QStringLiteral("Tobias"));
         QCOMPARE(sent.size(), 1);
-        QCOMPARE(popUp->_previouslyChosenVoiceIdentifier(), P + QStringLiteral("tobias.compact"));
+        QCOMPARE(CZVoicePopUpButtonPrivate::get(popUp)->_previouslyChosenVoiceIdentifier(),
+            P + QStringLiteral("tobias.compact"));
         QVERIFY(CZVoicePopUpButton::isRequiredVoiceIdentifier(P + QStringLiteral("tobias.compact")));
         QVERIFY(!CZVoicePopUpButton::isRequiredVoiceIdentifier(P + QStringLiteral("amelie.compact")));
     }
@@ -312,11 +316,11 @@ private Q_SLOTS:
             {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("maren.premium"))},
                 {InstallerProtocol::TagNameKey, QStringLiteral("VOICEID:Maren Premium")},
                 {InstallerProtocol::ItemDownloadStatusKey, qint64(InstallerProtocol::WaitingStatus)}}});
-        CZVoicePopUpButton::_forceAllVoicePopupsToUpdate();
+        CZVoicePopUpButtonPrivate::_forceAllVoicePopupsToUpdate();
         QCOMPARE(titles(popUp).filter(QStringLiteral("Maren")), QStringList {QStringLiteral("Maren")});
         // Listing every quality shows it, disabled, under its full name.
         popUp.setShowIndividualVoiceQualities(true);
-        CZVoicePopUpButton::_forceAllVoicePopupsToUpdate();
+        CZVoicePopUpButtonPrivate::_forceAllVoicePopupsToUpdate();
         QVERIFY(titles(popUp).contains(QStringLiteral("Maren Premium (Waiting)")));
     }
 
@@ -353,7 +357,7 @@ private Q_SLOTS:
         popUp->setDownloadStatusProgressIndicator(spinner);
         window.show();
         popUp->buildPopUpButtonWithSelectVoiceIdentifier(P + QStringLiteral("maren.compact"));
-        QTRY_VERIFY(!popUp->_hasDownloadStatusUpdateTimer());
+        QTRY_VERIFY(!CZVoicePopUpButtonPrivate::get(popUp)->_hasDownloadStatusUpdateTimer());
 
         m_daemon->setActiveRecords(
             {QVariantMap {{InstallerProtocol::ObjectIDKey, QString(P + QStringLiteral("nora.premium"))},
@@ -367,7 +371,7 @@ private Q_SLOTS:
         m_notifications->postNotification(InstallerProtocol::StartedInstallationNotification);
         QTRY_COMPARE(text->text(), QStringLiteral("Downloading Nora — Less than a minute remaining"));
         QVERIFY(spinner->isVisible());
-        QVERIFY(popUp->_hasDownloadStatusUpdateTimer());
+        QVERIFY(CZVoicePopUpButtonPrivate::get(popUp)->_hasDownloadStatusUpdateTimer());
 
         // Voices waiting behind another kind of item.
         m_daemon->setActiveRecords(
@@ -379,7 +383,7 @@ private Q_SLOTS:
         m_daemon->setActiveRecords({});
         QTRY_VERIFY(text->text().isEmpty());
         QVERIFY(!spinner->isVisible());
-        QVERIFY(!popUp->_hasDownloadStatusUpdateTimer());
+        QVERIFY(!CZVoicePopUpButtonPrivate::get(popUp)->_hasDownloadStatusUpdateTimer());
     }
 
     void anotherProcessMakesMenusRebuild()

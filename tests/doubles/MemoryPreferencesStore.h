@@ -1,7 +1,7 @@
-#ifndef CADENZA_PLATFORM_MEMORYPREFERENCESSTORE_H
-#define CADENZA_PLATFORM_MEMORYPREFERENCESSTORE_H
+#ifndef CADENZA_TESTS_MEMORYPREFERENCESSTORE_H
+#define CADENZA_TESTS_MEMORYPREFERENCESSTORE_H
 
-#include "PreferencesStore.h"
+#include "core/services/PreferencesStore.h"
 
 #include <QHash>
 #include <QVariantMap>
@@ -12,7 +12,7 @@ namespace Cadenza::Platform {
  * In-memory preferences for tests. Several stores made from one shared backing stand for several
  * processes: each keeps its own unsynchronised changes until synchronize().
  */
-class CADENZACORE_EXPORT MemoryPreferencesStore final : public PreferencesStore
+class MemoryPreferencesStore final : public PreferencesStore
 {
 public:
     using Backing = QHash<QString, QVariantMap>;

@@ -1,12 +1,12 @@
-#ifndef CADENZA_PLATFORM_INPROCESSNOTIFICATIONCENTER_H
-#define CADENZA_PLATFORM_INPROCESSNOTIFICATIONCENTER_H
+#ifndef CADENZA_TESTS_INPROCESSNOTIFICATIONCENTER_H
+#define CADENZA_TESTS_INPROCESSNOTIFICATIONCENTER_H
 
-#include "DistributedNotificationCenter.h"
+#include "core/services/DistributedNotificationCenter.h"
 
 namespace Cadenza::Platform {
 
 /// Notifications within this process only, for tests; it remembers what was posted.
-class CADENZACORE_EXPORT InProcessNotificationCenter final : public DistributedNotificationCenter
+class InProcessNotificationCenter final : public DistributedNotificationCenter
 {
     Q_OBJECT
 public:

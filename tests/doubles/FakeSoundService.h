@@ -1,14 +1,14 @@
-#ifndef CADENZA_PLATFORM_FAKESOUNDSERVICE_H
-#define CADENZA_PLATFORM_FAKESOUNDSERVICE_H
+#ifndef CADENZA_TESTS_FAKESOUNDSERVICE_H
+#define CADENZA_TESTS_FAKESOUNDSERVICE_H
 
-#include "SoundService.h"
+#include "core/services/SoundService.h"
 
 #include <QList>
 
 namespace Cadenza::Platform {
 
 /// Sounds that a test plays: they start, fail or never answer, as the test says, one event-loop turn later.
-class CADENZACORE_EXPORT FakeSoundService final : public SoundService
+class FakeSoundService final : public SoundService
 {
     Q_OBJECT
 public:

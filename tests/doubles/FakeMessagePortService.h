@@ -1,7 +1,7 @@
-#ifndef CADENZA_PLATFORM_FAKEMESSAGEPORTSERVICE_H
-#define CADENZA_PLATFORM_FAKEMESSAGEPORTSERVICE_H
+#ifndef CADENZA_TESTS_FAKEMESSAGEPORTSERVICE_H
+#define CADENZA_TESTS_FAKEMESSAGEPORTSERVICE_H
 
-#include "MessagePort.h"
+#include "core/services/MessagePort.h"
 
 #include <QHash>
 #include <QList>
@@ -12,7 +12,7 @@ namespace Cadenza::Platform {
  * Message ports within one process, for tests: a remote port calls the named local port's handler
  * directly, on the sender's thread. A test can make sends fail and read every message sent.
  */
-class CADENZACORE_EXPORT FakeMessagePortService final : public MessagePortService
+class FakeMessagePortService final : public MessagePortService
 {
 public:
     struct SentMessage

@@ -1,12 +1,12 @@
-#ifndef CADENZA_PLATFORM_FAKEUSERLOCALESERVICE_H
-#define CADENZA_PLATFORM_FAKEUSERLOCALESERVICE_H
+#ifndef CADENZA_TESTS_FAKEUSERLOCALESERVICE_H
+#define CADENZA_TESTS_FAKEUSERLOCALESERVICE_H
 
-#include "UserLocaleService.h"
+#include "core/services/UserLocaleService.h"
 
 namespace Cadenza::Platform {
 
 /// Language and region settings that a test sets.
-class CADENZACORE_EXPORT FakeUserLocaleService final : public UserLocaleService
+class FakeUserLocaleService final : public UserLocaleService
 {
 public:
     explicit FakeUserLocaleService(QStringList preferredLanguages = {QStringLiteral("en_US")},

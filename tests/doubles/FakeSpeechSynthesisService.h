@@ -1,7 +1,7 @@
-#ifndef CADENZA_PLATFORM_FAKESPEECHSYNTHESISSERVICE_H
-#define CADENZA_PLATFORM_FAKESPEECHSYNTHESISSERVICE_H
+#ifndef CADENZA_TESTS_FAKESPEECHSYNTHESISSERVICE_H
+#define CADENZA_TESTS_FAKESPEECHSYNTHESISSERVICE_H
 
-#include "SpeechSynthesisService.h"
+#include "core/services/SpeechSynthesisService.h"
 
 namespace Cadenza::Platform {
 
@@ -11,7 +11,7 @@ namespace Cadenza::Platform {
  * Speaking "renders" a tone of 60 ms per character; requests finish on the next turn of the event
  * loop unless the test holds them (setHoldsSpeaking()) or makes them fail.
  */
-class CADENZACORE_EXPORT FakeSpeechSynthesisService final : public SpeechSynthesisService
+class FakeSpeechSynthesisService final : public SpeechSynthesisService
 {
     Q_OBJECT
 public:

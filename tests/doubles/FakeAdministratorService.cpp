@@ -1,0 +1,20 @@
+#include "FakeAdministratorService.h"
+
+#include "core/services/BundleRemoval.h"
+
+namespace Cadenza::Platform {
+
+AdministratorService::Removal FakeAdministratorService::removeBundle(const QString &path)
+{
+    if (!m_authenticated) {
+        return Removal::Refused;
+    }
+    QString error;
+    if (!BundleRemoval::remove(path, &error)) {
+        return Removal::Failed;
+    }
+    m_removed.append(path);
+    return Removal::Removed;
+}
+
+} // namespace Cadenza::Platform
