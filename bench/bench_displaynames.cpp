@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Display-name lookups per second: with the kept ICU handles and answers, and with a fresh ICU handle
 // per call (what every lookup costs without the caches), in one run.
 

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Voice enumeration over a generated root of N voice bundles (default 1,000 and 10,000):
 // the first scan beside the floor of reading the same Info.plist files, the cached calls beside the
 // floor of checking the three folders, and 'cadenza voices' as a whole process beside

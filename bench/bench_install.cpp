@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Installing a large bundle from a file:// repository with the real daemon, beside cp, sha256sum
 // and tar -x of the same archive, in the same run.
 

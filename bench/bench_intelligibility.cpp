@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 // How well a recogniser understands each English sample voice, and how fast each engine speaks.
 //

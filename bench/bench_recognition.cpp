@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 // Recognition with the US English pocketsphinx model: pre-heat (model load) time, real-time factor
 // (decode time / audio length) and word error rate of free dictation on speech from each English

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // activeInstallations round trip against the real daemon with 0, 10 and 100 active records, beside a
 // bare Unix-socket ping-pong that moves the same number of bytes, in the same run.
 

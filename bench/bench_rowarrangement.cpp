@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Arranging voice rows (the customise sheet's and the voice menu's lists) for 1,000 and 10,000 voices
 // in 40 languages, beside sorting the same display names with the locale's collator, in one run.
 

@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 // speech-dispatcher's view of speaking: from SPEAK to the first audio block and to END, for one
 // sentence, through sd_cadenza beside speech-dispatcher's own espeak-ng module in the same run.

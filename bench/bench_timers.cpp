@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Memory of a long-lived target that schedules many power-savvy timers: 100,000 one-shot timers that
 // fire, and 100,000 repeating ones invalidated after their first firing, beside the same number of
 // plain QTimer::singleShot calls (which keep nothing once fired), in the same run. The figure is the

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The voice-menu filter and voice search over 1,000 and 10,000 voices in 40 languages, beside
 // sorting the same display names with the locale's collator, in the same run.
 

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The voice controls with many voices, in one run beside their floors:
 //  - building the shared voice menu (and adopting it into a pop-up) beside filling a plain QComboBox
 //    with the same titles sorted by the locale's collator;

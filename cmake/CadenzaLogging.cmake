@@ -1,3 +1,5 @@
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 # cadenza_logging_categories(<target>
 #     HEADER <file name> [NAMESPACE <C++ namespace>] [FILE_NAME <name of the .categories file>]
 #     CATEGORIES <identifier> <category name> <description> [<identifier> <name> <description> ...])

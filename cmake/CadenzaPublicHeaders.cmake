@@ -1,3 +1,5 @@
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 # The public API of a Cadenza library is a chosen list of headers. Applications include each public
 # class by its name, `#include <Cadenza/CZVoicePopUpButton>`: a forwarding header made here that
 # includes the real header. Everything not named here is private and is not installed.

@@ -1,3 +1,4 @@
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
 # SPDX-License-Identifier: LGPL-2.1-or-later
 # Copies voice bundles and completes the flite ones: a bundle whose Engine names "flite" gets the
 # .flitevox file its Engine/Voice names (written out at build time from the Debian flite package) in

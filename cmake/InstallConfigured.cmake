@@ -1,3 +1,5 @@
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 # Installs a file made from a template whose @CMAKE_INSTALL_FULL_BINDIR@ and
 # @CMAKE_INSTALL_FULL_LIBEXECDIR@ name where the programs land. The template is filled when installing,
 # not when configuring, so `cmake --install BUILD --prefix DIR` puts both the file and the paths it

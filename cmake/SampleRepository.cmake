@@ -1,3 +1,5 @@
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 # Builds the sample repository: one .tar.gz per bundle, and the catalogue with each archive's size
 # and SHA-256 filled in. Bundles are completed in a staging folder first: flite voices get their voice
 # files, and recognizer bundles whose Info.plist names the pocketsphinx engine get the US English model

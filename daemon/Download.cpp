@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: GPL-3.0-or-later
 #include "Download.h"
 
 #include "quillond_logging.h"

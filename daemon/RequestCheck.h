@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: GPL-3.0-or-later
 #ifndef QUILLOND_REQUESTCHECK_H
 #define QUILLOND_REQUESTCHECK_H
 

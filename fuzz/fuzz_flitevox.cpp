@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 // A .flitevox voice file as the flite plugin reads it before handing it to flite: any bytes may sit in
 // a bundle somebody copied into a voice folder.

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Message-port streams: frames cut at arbitrary places, with a small size limit.
 #include "protocol/MessageFrame.h"
 

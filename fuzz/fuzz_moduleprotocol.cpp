@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 // speech-dispatcher's commands to sd_cadenza: the line protocol, the settings lines and the messages
 // (SSML or not, any bytes) must never crash the module.

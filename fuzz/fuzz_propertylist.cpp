@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Property lists: Info.plist of every bundle, the catalogue, the preference files.
 #include "core/formats/PropertyList.h"
 

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Info.plist of a recognizer bundle, as the list of installed dictation languages reads it: any bytes
 // may sit in a bundle somebody copied into the recognizer folder.
 #include "core/formats/Locale.h"

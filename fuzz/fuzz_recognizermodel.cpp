@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 // The files of a pocketsphinx model as the quick check reads them before a language counts as
 // installed: any bytes may sit in a bundle somebody copied into a recognizer folder. The first byte
@@ -54,7 +55,10 @@ struct Bundle
             {QStringLiteral("LanguageModel"), QStringLiteral("Resources/language.lm.bin")},
             {QStringLiteral("Dictionary"), QStringLiteral("Resources/pronunciation.dict")}};
     }
-    QString path(const char *file) const { return folder.filePath(QStringLiteral("Resources/") + QLatin1String(file)); }
+    QString path(const char *file) const
+    {
+        return folder.filePath(QStringLiteral("Resources/") + QLatin1String(file));
+    }
     void reset()
     {
         write(path("acoustic/mdef"), "0.3\n0 n_base\n");

@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 // A sound file as "cadenza dictate" reads it: any bytes may be handed to it. The reader must refuse
 // with a reason or deliver blocks of bounded size until the end (compressed formats may hold far

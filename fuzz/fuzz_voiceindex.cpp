@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The voice index of the user's cache folder: any bytes may sit there (a disk error, another program,
 // another version). Half the inputs are taken as a whole file; the other half as the payload behind
 // a correct header, so that the checksum does not keep the fuzzer away from the decoder.

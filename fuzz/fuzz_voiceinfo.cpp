@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Info.plist of an installed voice bundle, as the voice list reads it: any bytes may sit in a bundle
 // somebody copied into a voice folder.
 #include "core/formats/Locale.h"

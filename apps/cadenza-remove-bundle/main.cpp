@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: GPL-3.0-or-later
 // cadenza-remove-bundle: removes exactly one voice or recognizer bundle, run through pkexec.
 //
 // It trusts nothing it is given: the path must name a ".SpeechVoice" or ".SpeechRecognition" folder

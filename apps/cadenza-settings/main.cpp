@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: GPL-3.0-or-later
 // cadenza-settings: a small speech settings application hosting Cadenza's controls.
 #include "SettingsWindow.h"
 

@@ -1,5 +1,7 @@
 <?xml version="1.0" encoding="utf-8"?>
 <!DOCTYPE TS>
+<!-- SPDX-FileCopyrightText: 2026 The Cadenza developers -->
+<!-- SPDX-License-Identifier: LGPL-2.1-or-later -->
 <TS version="2.1" language="de_DE">
 <context>
     <name></name>

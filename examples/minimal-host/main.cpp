@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // A window with Cadenza's voice pop-up, its download status line and the voice settings dialog.
 // Run with --check to build the window, print the chosen voice and exit.
 #include <Cadenza/CZVoicePopUpButton>

@@ -1,3 +1,5 @@
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 """Reading cadenza-settings over AT-SPI and typing into it with xdotool, for the accessibility tests."""
 import os
 import subprocess

@@ -1,4 +1,6 @@
 #!/usr/bin/python3
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 """The download journey by keyboard alone: from the main window open the customise voices sheet, search,
 tick a downloadable voice, choose its full size, confirm with Return and see it downloading in the voice
 pop-up. Only key events go in (xdotool); every result is read over AT-SPI."""

@@ -1,4 +1,6 @@
 #!/usr/bin/env bash
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 # Runs cadenza-settings under Xvfb with the accessibility bus, the real daemon and the sample repository
 # (served slowly over loopback HTTP, so a download stays in progress for a while), then runs a Python
 # script that reads the application over AT-SPI and drives it with xdotool key events.

@@ -1,4 +1,6 @@
 #!/usr/bin/python3
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 """What a screen reader finds in every window of cadenza-settings: roles, names and states, in the
 customise sheets before and after a tick and during a download with the real daemon."""
 import os

@@ -1,4 +1,6 @@
 #!/usr/bin/python3
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 """Serves a bundle repository on 127.0.0.1, slowly, so a download stays in progress long enough to be
 read over the accessibility bus. Prints the port on stdout once listening.
 

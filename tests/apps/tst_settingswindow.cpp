@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The host's window shows what the voice settings dialog returned in the user's words.
 #include "TestEnvironment.h"
 

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The settings window's button that offers the Cadenza voices to other apps through
 // speech-dispatcher: it installs the per-user module, then removes it, and says which it will do.
 

@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 // The settings app's "Try dictation" area: what it shows when recording cannot start.
 #include "PrivateSoundServer.h"

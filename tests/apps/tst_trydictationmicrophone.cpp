@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 // The settings app's "Try dictation" area recording from a microphone: the test's own sound server,
 // whose only input hears what the test plays, speech made by the project's flite voice.

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The names other processes and other programs spell on their own: they must never drift. Everything
 // else in the tree refers to the one definition, so these literals are the only check of its spelling.
 

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "QuillondProcess.h"
 #include "TestEnvironment.h"
 #include "TestHttpServer.h"
@@ -6,8 +8,8 @@
 #include "core/formats/PropertyList.h"
 #include "core/formats/WaveFile.h"
 #include "core/installation/CZSpeechInstallationManager.h"
-#include "core/services/BundleSpeechSynthesisService.h"
 #include "core/installation/CZSpeechInstallationManager_p.h"
+#include "core/services/BundleSpeechSynthesisService.h"
 #include "core/services/DistributedNotificationCenter.h"
 #include "core/services/Services.h"
 #include "core/services/UnixMessagePortService.h"
@@ -79,8 +81,9 @@ private Q_SLOTS:
         QSignalSpy notifications(&Platform::Services::notifications(),
             &Platform::DistributedNotificationCenter::notificationPosted);
         const QString voice = QStringLiteral("com.vendra.speech.synthesis.voice.tobias.premium");
-        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_requestInstallation(
-            QStringLiteral("VOICEID:") + voice, QStringLiteral("Tobias"), 1, voice, 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                    ->_requestInstallation(
+                        QStringLiteral("VOICEID:") + voice, QStringLiteral("Tobias"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion));
         QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/TobiasPremium.SpeechVoice/Info.plist")));
         QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->pendingLocalPortNames().isEmpty());
@@ -102,8 +105,9 @@ private Q_SLOTS:
         QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
 
         // Installing again replaces the bundle in one step.
-        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_requestInstallation(
-            QStringLiteral("VOICEID:") + voice, QStringLiteral("Tobias"), 1, voice, 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                    ->_requestInstallation(
+                        QStringLiteral("VOICEID:") + voice, QStringLiteral("Tobias"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion));
         QVERIFY(QFile::exists(voicesFolder() + QStringLiteral("/TobiasPremium.SpeechVoice/Info.plist")));
         QVERIFY(Testing::QuillondProcess::leftovers().isEmpty());
@@ -224,8 +228,9 @@ private Q_SLOTS:
         server.dropNextTransferAfter(1024 * 1024 + 17);
         startDaemon({QStringLiteral("--repository"), server.baseUrl().toString()});
         const QString voice = Cadenza::SpeechNames::OrinIdentifier;
-        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())->_requestInstallation(
-            QStringLiteral("VOICEID:") + voice, QStringLiteral("Orin"), 1, voice, 0));
+        QVERIFY(CZSpeechInstallationManagerPrivate::get(m_manager.get())
+                    ->_requestInstallation(
+                        QStringLiteral("VOICEID:") + voice, QStringLiteral("Orin"), 1, voice, 0));
         QVERIFY(waitForCompletion(InstalledCompletion, 30000));
         QVERIFY(server.rangeRequestCount() >= 1);
         const QString voiceFile

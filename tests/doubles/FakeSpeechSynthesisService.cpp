@@ -1,8 +1,10 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "FakeSpeechSynthesisService.h"
 
-#include "cadenzacore_logging.h"
 #include "core/formats/WaveFile.h"
 
+#include <QLoggingCategory>
 #include <QTimer>
 
 #include <algorithm>
@@ -10,6 +12,9 @@
 #include <numbers>
 
 namespace Cadenza::Platform {
+
+// The double logs under its own name: the library keeps its categories to itself.
+Q_LOGGING_CATEGORY(lcFakeSpeech, "cadenza.speech.fake", QtInfoMsg)
 
 FakeSpeechSynthesisService::FakeSpeechSynthesisService(QObject *parent)
     : SpeechSynthesisService(parent)
@@ -45,7 +50,7 @@ quint64 FakeSpeechSynthesisService::startSpeaking(const SpeechRequest &request)
 {
     const QString identifier = request.voiceIdentifier.isEmpty() ? defaultVoice() : request.voiceIdentifier;
     if (!voice(identifier)) {
-        qCWarning(lcSpeech, "No installed voice '%s' to speak with", qPrintable(identifier));
+        qCWarning(lcFakeSpeech, "No installed voice '%s' to speak with", qPrintable(identifier));
         return 0;
     }
     stopSpeaking();

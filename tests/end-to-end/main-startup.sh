@@ -1,4 +1,6 @@
 #!/usr/bin/env bash
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 # The main job's start-up in a private world: with no daemon, scripts/start-quillond starts one
 # (decided by 'cadenza status' exiting with 3) and it answers; run again, it starts no second one.
 # Then cadenza-settings --screenshots, on that daemon, leaves a picture of a download in progress.

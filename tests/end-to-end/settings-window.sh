@@ -1,4 +1,6 @@
 #!/usr/bin/env bash
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 # cadenza-settings driven through real X input under Xvfb, with the real daemon on the sample
 # repository: open the voice pop-up, choose "Customize…", find and tick a downloadable voice, press OK;
 # the daemon installs it; the pop-up lists it and it becomes the system voice. A screenshot is taken

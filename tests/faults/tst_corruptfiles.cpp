@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Broken and type-confused files where Cadenza reads them: voice bundles' Info.plist, the daemon's
 // catalogue and the preference files. None may crash anything; each is named in a log line; nothing
 // that was good is lost.

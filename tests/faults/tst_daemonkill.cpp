@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // quillond killed with SIGKILL at each stage of an installation, then started again: the bundle is
 // wholly there or absent, nothing temporary is left, and the client carries on.
 #include "QuillondProcess.h"

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Hostile clients against the real daemon: 100 idle connections, a client that never reads its
 // replies, garbage bytes and an oversized frame, while a good client keeps asking for the status.
 // Every one of its questions must be answered; the medians with and without the load are printed.

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Four processes write 1,000 keys each into one preference domain at the same time, each key
 // synchronised on its own: no update may be lost, and the file must parse whenever anyone reads it.
 #include "TestEnvironment.h"

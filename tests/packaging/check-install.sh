@@ -1,4 +1,6 @@
 #!/usr/bin/env bash
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 # Installs the build into a temporary prefix (and staged into a DESTDIR), checks that nothing lands
 # outside it and that the units and the policy name the programs there, validates the desktop entry
 # and the AppStream metadata, checks that the installed headers are the public ones and name no test

@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 #ifndef CADENZA_TESTS_MODULEDRIVER_H
 #define CADENZA_TESTS_MODULEDRIVER_H

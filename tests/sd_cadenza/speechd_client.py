@@ -1,4 +1,5 @@
 #!/usr/bin/python3
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
 # SPDX-License-Identifier: GPL-3.0-or-later
 # A speech-dispatcher client for the tests, on python3-speechd. Prints one JSON object.
 #

@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 // The speech-dispatcher output module: its parts, and whole sessions driven on its standard input.
 

@@ -1,4 +1,6 @@
 #!/usr/bin/env python3
+# SPDX-FileCopyrightText: 2026 The Cadenza developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
 """Rules of the tree that no compiler checks, over the C++ sources of the libraries, the daemon, the
 applications and the plugins:
 

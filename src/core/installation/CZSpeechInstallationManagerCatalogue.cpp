@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The installation manager's downloadable speech data: listing, requests, removal and the log.
 
 #include "CZSpeechInstallationManager.h"

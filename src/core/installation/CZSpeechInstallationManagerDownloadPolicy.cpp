@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The installation manager's background download policy: fetch the best quality of a voice on
 // mains power, within the attempt limits and the user's prohibitions.
 

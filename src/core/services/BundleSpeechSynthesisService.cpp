@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "BundleSpeechSynthesisService.h"
 
 #include "PreferencesStore.h"
@@ -303,7 +305,8 @@ quint64 BundleSpeechSynthesisService::voicesGeneration() const
 std::optional<QString> BundleSpeechSynthesisService::speechLanguageLocale()
 {
     // value() reads the domain again when its file changed.
-    const QVariant stored = Services::preferences().value(SpeechLanguageKey, SpeechNames::VoicePreferencesDomain);
+    const QVariant stored
+        = Services::preferences().value(SpeechLanguageKey, SpeechNames::VoicePreferencesDomain);
     if (stored.typeId() != QMetaType::QString) {
         return std::nullopt;
     }

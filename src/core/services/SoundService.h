@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #ifndef CADENZA_PLATFORM_SOUNDSERVICE_H
 #define CADENZA_PLATFORM_SOUNDSERVICE_H
 

@@ -1,7 +1,9 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "CZSRLanguagePopUpButton.h"
 
-#include "core/SpeechNames.h"
 #include "CZSRLanguagePopUpButton_p.h"
+#include "core/SpeechNames.h"
 #include "core/installation/CZSpeechInstallationManager.h"
 #include "core/locale/LocalizationTable.h"
 #include "core/services/DistributedNotificationCenter.h"
@@ -74,7 +76,8 @@ CZSRLanguagePopUpButton::CZSRLanguagePopUpButton(QWidget *parent)
         delete d->m_preHeatTimer;
         d->m_preHeatTimer = new QTimer(this);
         d->m_preHeatTimer->setInterval(PreHeatWaitMilliseconds);
-        connect(d->m_preHeatTimer, &QTimer::timeout, this, [this] { d->_clearDownloadStatusFieldAfterPreHeat(); });
+        connect(d->m_preHeatTimer, &QTimer::timeout, this,
+            [this] { d->_clearDownloadStatusFieldAfterPreHeat(); });
         d->m_preHeatTimer->start();
     };
     style.idleLine = [this] {

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "CZVoicePopUpButton.h"
 
 #include "CZVoicePopUpButton_p.h"
@@ -186,7 +188,8 @@ void CZVoicePopUpButton::setDownloadStatusTextField(QLabel *textField)
 
 void CZVoicePopUpButton::setDownloadStatusProgressIndicator(QProgressBar *indicator)
 {
-    d->m_statusLine->setProgressIndicator(indicator, texts().text(QStringLiteral("VoiceDownloadProgressName")));
+    d->m_statusLine->setProgressIndicator(
+        indicator, texts().text(QStringLiteral("VoiceDownloadProgressName")));
 }
 
 QString CZVoicePopUpButton::displayNameForGender(const QString &gender)

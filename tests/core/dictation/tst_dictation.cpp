@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 // Recognition with the pocketsphinx engine: which recognizer bundles count as installed, and
 // "cadenza dictate" on speech made by the project's own voices and on bad sound files.

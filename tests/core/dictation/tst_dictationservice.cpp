@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: GPL-3.0-or-later
 // The dictation engine cadenza-dictation as its own process beside the real installer daemon: it loads
 // a language once the daemon has installed it (and the pop-up's installing line clears then), and

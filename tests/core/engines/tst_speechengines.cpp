@@ -1,3 +1,4 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 #include "TestEnvironment.h"
 

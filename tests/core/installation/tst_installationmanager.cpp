@@ -1,15 +1,17 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "FakeAdministratorService.h"
 #include "FakeInstallerDaemon.h"
 #include "FakePowerSourcesInfo.h"
 #include "FakeRecognitionService.h"
 #include "TestEnvironment.h"
 
-#include "core/SpeechNames.h"
 #include "FakeMessagePortService.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/installation/CZSpeechInstallationManager.h"

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The sample repository's catalogue tells the truth: every size is the real size of its archive, and a
 // full size or premium quality is a better voice, never its compact twin packed again under a new name.
 #include "TestEnvironment.h"

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The OK decision of the customise sheets, on plain rows: no sheet, no widgets, no daemon.
 
 #include "core/installation/SelectionChanges.h"

@@ -1,12 +1,14 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "FakeRecognitionService.h"
 #include "RecognizerFixture.h"
 #include "TestEnvironment.h"
 
-#include "core/SpeechNames.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/recognition-items/CZSRLanguageItem.h"

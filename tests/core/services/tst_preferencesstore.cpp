@@ -1,7 +1,9 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "TestEnvironment.h"
 
-#include "core/SpeechNames.h"
 #include "MemoryPreferencesStore.h"
+#include "core/SpeechNames.h"
 #include "core/services/FilePreferencesStore.h"
 
 #include <QDir>

@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Sound playback never holds up the caller's event loop, whatever the media backend does.
 #include "TestEnvironment.h"
 

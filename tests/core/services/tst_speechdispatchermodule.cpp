@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // Installing speech-dispatcher's module for the current user, and removing it, leaves everything
 // that is not Cadenza's alone.
 

@@ -1,8 +1,10 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "TestEnvironment.h"
 
-#include "core/SpeechNames.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/formats/WaveFile.h"

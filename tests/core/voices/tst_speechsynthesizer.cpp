@@ -1,9 +1,11 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "TestEnvironment.h"
 
-#include "core/SpeechNames.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "MemoryPreferencesStore.h"
+#include "core/SpeechNames.h"
 #include "core/services/Services.h"
 #include "core/voices/SpeechSynthesizer.h"
 

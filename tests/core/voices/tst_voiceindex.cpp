@@ -1,5 +1,8 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "TestEnvironment.h"
 
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/formats/PropertyList.h"
 #include "core/formats/VoiceIndex.h"
@@ -284,14 +287,14 @@ private Q_SLOTS:
         writeVoice(system, QStringLiteral("Bruno"), QStringLiteral("fr_FR"));
         PreferencesStore &preferences = Services::preferences();
         preferences.setValue(SpeechSynthesisService::SpeechLanguageKey, QStringLiteral("fr_FR"),
-            SpeechSynthesisService::PreferencesDomain);
-        QVERIFY(preferences.synchronize(SpeechSynthesisService::PreferencesDomain));
+            Cadenza::SpeechNames::VoicePreferencesDomain);
+        QVERIFY(preferences.synchronize(Cadenza::SpeechNames::VoicePreferencesDomain));
         QCOMPARE(Cadenza::SpeechSynthesizer::defaultVoiceFromAllVoices(), P + QStringLiteral("Bruno"));
         QCOMPARE(Cadenza::SpeechSynthesizer::defaultVoiceFromAllVoices(), P + QStringLiteral("Bruno"));
         // The preference changes: so does the answer.
         preferences.setValue(SpeechSynthesisService::SpeechLanguageKey, QStringLiteral("en_GB"),
-            SpeechSynthesisService::PreferencesDomain);
-        QVERIFY(preferences.synchronize(SpeechSynthesisService::PreferencesDomain));
+            Cadenza::SpeechNames::VoicePreferencesDomain);
+        QVERIFY(preferences.synchronize(Cadenza::SpeechNames::VoicePreferencesDomain));
         QCOMPARE(Cadenza::SpeechSynthesizer::defaultVoiceFromAllVoices(), P + QStringLiteral("Alba"));
         // A bundle is replaced by one of another language; the folder's time moves on as any
         // installation's rename moves it.

@@ -1,14 +1,16 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // What a screen reader and a keyboard user meet in the customise voices sheet and in alerts: the rows
 // as check boxes with names and states, headings, Tab leaving the table, arrows passing over headings,
 // Escape as Cancel, focus and status changes reported.
 #include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
-#include "core/SpeechNames.h"
 #include "FakeMessagePortService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
+#include "core/SpeechNames.h"
 #include "core/files/Paths.h"
 #include "core/services/BundleSpeechSynthesisService.h"
 #include "core/services/Services.h"

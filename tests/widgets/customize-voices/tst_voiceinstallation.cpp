@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // From the voice pop-up to an installed voice, with the real daemon on the sample repository.
 #include "QuillondProcess.h"
 #include "TestEnvironment.h"

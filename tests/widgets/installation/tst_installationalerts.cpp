@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // The customise voices sheet's OK when no installer daemon can be reached: the user is told.
 #include "TestEnvironment.h"
 

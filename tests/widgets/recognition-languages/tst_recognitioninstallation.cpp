@@ -1,3 +1,5 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 // A dictation language from the pop-up's sheet to the menu, with the real daemon, the session bus and a
 // second process that plays the dictation engine.
 #include "QuillondProcess.h"

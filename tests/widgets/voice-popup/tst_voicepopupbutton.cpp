@@ -1,12 +1,14 @@
+// SPDX-FileCopyrightText: 2026 The Cadenza developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
 #include "FakeInstallerDaemon.h"
 #include "TestEnvironment.h"
 
-#include "core/SpeechNames.h"
 #include "FakeMessagePortService.h"
 #include "FakeSpeechSynthesisService.h"
 #include "FakeUserLocaleService.h"
 #include "InProcessNotificationCenter.h"
 #include "MemoryPreferencesStore.h"
+#include "core/SpeechNames.h"
 #include "core/services/DBusNotificationCenter.h"
 #include "core/services/Services.h"
 #include "core/speech-items/CZSpeechItem_p.h"
