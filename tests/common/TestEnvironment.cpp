@@ -129,4 +129,20 @@ void TestEnvironment::installSampleVoices() const
     }
 }
 
+QVariantMap TestEnvironment::downloadableVoiceEntry(
+    const QString &name, const QString &locale, const QString &fullSizeIdentifier)
+{
+    return {{QStringLiteral("VoiceAttributes"),
+                QVariantMap {{QStringLiteral("VoiceName"), name},
+                    {QStringLiteral("VoiceLocaleIdentifier"), locale},
+                    {QStringLiteral("VoiceGender"), QStringLiteral("VoiceGenderFemale")}}},
+        {QStringLiteral("VoiceByteSize"), qint64(2'000'000)},
+        {QStringLiteral("VoiceVersion"), QStringLiteral("1.0")},
+        {QStringLiteral("VoiceTag"), QString(QStringLiteral("VOICEID:") + name)},
+        {QStringLiteral("FullSizeByteSize"), qint64(9'000'000)},
+        {QStringLiteral("FullSizeTagName"), QString(QStringLiteral("VOICEID:full.") + name)},
+        {QStringLiteral("FullSizeBundleIdentifier"), fullSizeIdentifier},
+        {QStringLiteral("FullSizeVersion"), QStringLiteral("1.0")}};
+}
+
 } // namespace Cadenza::Testing

@@ -39,6 +39,13 @@ public:
     static QVariantMap voiceAttributes(const QString &identifier, const QString &name, const QString &locale,
         const QString &gender = QStringLiteral("VoiceGenderFemale"));
 
+    /**
+     * A downloadable voice of the catalogue as the customise voices sheet lists it: compact 2 MB,
+     * full size 9 MB (whose installed voice is @p fullSizeIdentifier, if any), tagged by @p name.
+     */
+    static QVariantMap downloadableVoiceEntry(
+        const QString &name, const QString &locale, const QString &fullSizeIdentifier = QString());
+
     /// Copies the sample voices, as the build completed them, into the system voice folder of this world.
     void installSampleVoices() const;
 

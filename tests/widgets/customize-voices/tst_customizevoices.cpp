@@ -49,21 +49,6 @@ namespace {
 const QString P = QStringLiteral("com.vendra.speech.synthesis.voice.");
 const QString Domain = Cadenza::SpeechNames::VoicePreferencesDomain;
 
-QVariantMap downloadable(
-    const QString &name, const QString &locale, const QString &fullSizeIdentifier = QString())
-{
-    return {{QStringLiteral("VoiceAttributes"),
-                QVariantMap {{QStringLiteral("VoiceName"), name},
-                    {QStringLiteral("VoiceLocaleIdentifier"), locale},
-                    {QStringLiteral("VoiceGender"), QStringLiteral("VoiceGenderFemale")}}},
-        {QStringLiteral("VoiceByteSize"), qint64(2'000'000)},
-        {QStringLiteral("VoiceVersion"), QStringLiteral("1.0")},
-        {QStringLiteral("VoiceTag"), QString(QStringLiteral("VOICEID:") + name)},
-        {QStringLiteral("FullSizeByteSize"), qint64(9'000'000)},
-        {QStringLiteral("FullSizeTagName"), QString(QStringLiteral("VOICEID:full.") + name)},
-        {QStringLiteral("FullSizeBundleIdentifier"), fullSizeIdentifier},
-        {QStringLiteral("FullSizeVersion"), QStringLiteral("1.0")}};
-}
 } // namespace
 
 class CustomizeVoicesTest : public QObject
@@ -83,12 +68,14 @@ private Q_SLOTS:
         m_daemon = std::make_unique<Testing::FakeInstallerDaemon>(*m_ports);
         SpeechItemPrivate::setInstallationDictionary(QVariantMap {{QStringLiteral("DownloadableVoices"),
             QVariantMap {{P + QStringLiteral("nora.premium"),
-                             downloadable(QStringLiteral("Nora Premium"), QStringLiteral("en_US"))},
+                             TestEnvironment::downloadableVoiceEntry(
+                                 QStringLiteral("Nora Premium"), QStringLiteral("en_US"))},
                 {P + QStringLiteral("iris.premium"),
-                    downloadable(QStringLiteral("Iris Premium"), QStringLiteral("en_US"),
-                        P + QStringLiteral("iris.full"))},
+                    TestEnvironment::downloadableVoiceEntry(QStringLiteral("Iris Premium"),
+                        QStringLiteral("en_US"), P + QStringLiteral("iris.full"))},
                 {P + QStringLiteral("femke.compact"),
-                    downloadable(QStringLiteral("Femke Compact"), QStringLiteral("nl_NL"))}}}});
+                    TestEnvironment::downloadableVoiceEntry(
+                        QStringLiteral("Femke Compact"), QStringLiteral("nl_NL"))}}}});
         // Maren and Tobias come with the system; Nora was downloaded into the user's folder.
         install(Paths::systemVoicesFolder(), QStringLiteral("maren.compact"), QStringLiteral("Maren Compact"),
             QStringLiteral("en_US"));
@@ -334,7 +321,8 @@ private Q_SLOTS:
         // Voices of the sample repository come with a recorded sample.
         const DownloadableVoicePtr recorded
             = DownloadableVoice::initWithVoiceID(P + QStringLiteral("femke.compact"),
-                downloadable(QStringLiteral("Femke Compact"), QStringLiteral("nl_NL")));
+                TestEnvironment::downloadableVoiceEntry(
+                    QStringLiteral("Femke Compact"), QStringLiteral("nl_NL")));
         QVERIFY(CustomizeVoicesWindowControllerPrivate::get(m_controller.get())
                     ->_isSampleAvailableForVoiceObject(recorded));
         QVERIFY(!CustomizeVoicesWindowControllerPrivate::get(m_controller.get())

@@ -44,22 +44,6 @@ namespace {
 const QString P = QStringLiteral("com.vendra.speech.synthesis.voice.");
 const QString Domain = Cadenza::SpeechNames::VoicePreferencesDomain;
 
-QVariantMap downloadable(
-    const QString &name, const QString &locale, const QString &fullSizeIdentifier = QString())
-{
-    return {{QStringLiteral("VoiceAttributes"),
-                QVariantMap {{QStringLiteral("VoiceName"), name},
-                    {QStringLiteral("VoiceLocaleIdentifier"), locale},
-                    {QStringLiteral("VoiceGender"), QStringLiteral("VoiceGenderFemale")}}},
-        {QStringLiteral("VoiceByteSize"), qint64(2'000'000)},
-        {QStringLiteral("VoiceVersion"), QStringLiteral("1.0")},
-        {QStringLiteral("VoiceTag"), QString(QStringLiteral("VOICEID:") + name)},
-        {QStringLiteral("FullSizeByteSize"), qint64(9'000'000)},
-        {QStringLiteral("FullSizeTagName"), QString(QStringLiteral("VOICEID:full.") + name)},
-        {QStringLiteral("FullSizeBundleIdentifier"), fullSizeIdentifier},
-        {QStringLiteral("FullSizeVersion"), QStringLiteral("1.0")}};
-}
-
 } // namespace
 
 class SheetAccessibilityTest : public QObject
@@ -78,10 +62,11 @@ private Q_SLOTS:
         m_daemon = std::make_unique<Testing::FakeInstallerDaemon>(*m_ports);
         SpeechItemPrivate::setInstallationDictionary(QVariantMap {{QStringLiteral("DownloadableVoices"),
             QVariantMap {{P + QStringLiteral("iris.premium"),
-                             downloadable(QStringLiteral("Iris Premium"), QStringLiteral("en_US"),
-                                 P + QStringLiteral("iris.full"))},
+                             TestEnvironment::downloadableVoiceEntry(QStringLiteral("Iris Premium"),
+                                 QStringLiteral("en_US"), P + QStringLiteral("iris.full"))},
                 {P + QStringLiteral("femke.premium"),
-                    downloadable(QStringLiteral("Femke Premium"), QStringLiteral("nl_NL"))}}}});
+                    TestEnvironment::downloadableVoiceEntry(
+                        QStringLiteral("Femke Premium"), QStringLiteral("nl_NL"))}}}});
         install(QStringLiteral("maren.compact"), QStringLiteral("Maren Compact"), QStringLiteral("en_US"));
         install(QStringLiteral("tobias.compact"), QStringLiteral("Tobias Compact"), QStringLiteral("en_US"));
         install(QStringLiteral("liesel.compact"), QStringLiteral("Liesel Compact"), QStringLiteral("de_DE"));
